@@ -1,0 +1,30 @@
+// Most-significant-bit-first reader over a byte buffer. It never reads outside
+// the buffer: reads past the end return 0 bits and set the status byte to 1.
+#ifndef RAVEL_CBITINPUTSTREAM_H
+#define RAVEL_CBITINPUTSTREAM_H
+
+class RavelCBitInputStream {
+ public:
+  RavelCBitInputStream(const unsigned char* buffer, unsigned int length, unsigned char flag);
+  ~RavelCBitInputStream();
+
+  unsigned char ReadBit(unsigned char& status);
+  unsigned char ReadByte(int bitCount, unsigned char& status);
+  unsigned short ReadShort(int bitCount, unsigned char& status);
+  unsigned int ReadInt(int bitCount, unsigned char& status);
+  void Skip(int bitCount);
+  // Copies the next whole bytes (starting at the current byte index) and advances.
+  void GetByteArray(unsigned char* destination, int byteCount);
+
+  // Index of the byte that holds the next bit.
+  unsigned int GetByteIndex() const;
+
+ private:
+  unsigned int ReadBits(int bitCount, unsigned char& status);
+
+  const unsigned char* pBuffer;
+  unsigned int iLength;
+  unsigned int iBitPosition;
+};
+
+#endif

@@ -1,0 +1,54 @@
+// Common header of every descriptor: descriptor_tag 8 | descriptor_length 8 | body.
+//
+// Each descriptor class describes itself once with a RavelCDescriptorKind (tag,
+// display name, wrong-tag message, Show banner) and lets the base do what every
+// class does alike: the header copy, the null and tag checks with their traces,
+// the naming, the banner and the base dump line.
+#ifndef RAVEL_CDESCRIPTORBASE_H
+#define RAVEL_CDESCRIPTORBASE_H
+
+#include "Ravel_CString.h"
+
+struct RavelCDescriptorKind {
+  unsigned char iTag;
+  const char* szDisplayName;     // stored as the name once the tag matches
+  const char* szWrongTagFormat;  // "This Descriptor isn't ... Descriptor Tag=[0x%x]\n"
+  const char* szBanner;          // first line of Show
+  unsigned int iWrongTagMask;    // trace mask of the wrong-tag message
+  bool bTraceNullArgument;       // "Invalid Argument!\n" before refusing a null descriptor
+};
+
+// The mask of almost every wrong-tag message.
+#define RAVEL_WRONG_TAG_MASK 0x40000020u
+
+class RavelCDescriptorBase {
+ public:
+  RavelCDescriptorBase();
+  RavelCDescriptorBase(const RavelCDescriptorBase& other);
+  RavelCDescriptorBase& operator=(const RavelCDescriptorBase& other);
+  virtual ~RavelCDescriptorBase();
+
+  // Copies tag and length and names the descriptor "Unknown Descriptor";
+  // null gives -8 with tag and length 0.
+  virtual int ParseRawData(unsigned char* raw);
+  // "\tDescriptor Tag=[0x%x], Descriptor Length=[%d], Name=[%s]\n"
+  virtual void Show();
+
+  unsigned char GetDescriptorTag() const { return iDescriptorTag; }
+  unsigned char GetDescriptorLength() const { return iDescriptorLength; }
+  const char* GetDescriptorName() const { return sDescriptorName.GetString(); }
+
+  unsigned char iDescriptorTag;
+  unsigned char iDescriptorLength;
+  RavelCString sDescriptorName;
+
+ protected:
+  // The shared first steps of a class's ParseRawData, after it has released its
+  // previous parse: base parse, null check, tag check, naming. Gives 0 when the
+  // class is to decode its body, or the result code it is to return.
+  int ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind);
+  // The banner, then the base line, at `mask`.
+  void ShowHeader(const RavelCDescriptorKind& kind, unsigned int mask = 0x10000020u);
+};
+
+#endif

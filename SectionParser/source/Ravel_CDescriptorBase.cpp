@@ -1,0 +1,60 @@
+#include "Ravel_CDescriptorBase.h"
+
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorBase");
+
+RavelCDescriptorBase::RavelCDescriptorBase() : iDescriptorTag(0), iDescriptorLength(0), sDescriptorName() {
+  RavelCDescriptorBase::ParseRawData(0);
+}
+
+RavelCDescriptorBase::RavelCDescriptorBase(const RavelCDescriptorBase& other)
+    : iDescriptorTag(other.iDescriptorTag),
+      iDescriptorLength(other.iDescriptorLength),
+      sDescriptorName(other.sDescriptorName) {}
+
+RavelCDescriptorBase& RavelCDescriptorBase::operator=(const RavelCDescriptorBase& other) {
+  iDescriptorTag = other.iDescriptorTag;
+  iDescriptorLength = other.iDescriptorLength;
+  sDescriptorName = other.sDescriptorName;
+  return *this;
+}
+
+RavelCDescriptorBase::~RavelCDescriptorBase() {}
+
+int RavelCDescriptorBase::ParseRawData(unsigned char* raw) {
+  if (raw == 0) {
+    iDescriptorTag = 0;
+    iDescriptorLength = 0;
+    return kRavelErrInvalidArgument;
+  }
+  iDescriptorTag = raw[0];
+  iDescriptorLength = raw[1];
+  sDescriptorName = "Unknown Descriptor";
+  return kRavelOk;
+}
+
+void RavelCDescriptorBase::Show() {
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tDescriptor Tag=[0x%x], Descriptor Length=[%d], Name=[%s]\n", iDescriptorTag,
+              iDescriptorLength, sDescriptorName.GetString());
+}
+
+int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind) {
+  RavelCDescriptorBase::ParseRawData(raw);
+  if (raw == 0) {
+    if (kind.bTraceNullArgument) RAVEL_TRACE(RAVEL_PARSER_ERROR, "Invalid Argument!\n");
+    return kRavelErrInvalidArgument;
+  }
+  if (iDescriptorTag != kind.iTag) {
+    RAVEL_TRACE(kind.iWrongTagMask, kind.szWrongTagFormat, iDescriptorTag);
+    return kRavelErrInvalidArgument;
+  }
+  sDescriptorName = kind.szDisplayName;
+  return kRavelOk;
+}
+
+void RavelCDescriptorBase::ShowHeader(const RavelCDescriptorKind& kind, unsigned int mask) {
+  RAVEL_TRACE(mask, "%s", kind.szBanner);
+  RavelCDescriptorBase::Show();
+}

@@ -1,0 +1,27 @@
+#!/usr/bin/env bash
+# Installs what the build needs from the system's packages, where it can.
+set -euo pipefail
+
+packages=(cmake g++ make libgtest-dev libgmock-dev nlohmann-json3-dev libcxxopts-dev)
+[ "${RAVEL_WITH_BENCH:-0}" = 1 ] && packages+=(libbenchmark-dev libdvbpsi-dev)
+[ "${RAVEL_WITH_SANITIZERS:-0}" = 1 ] && packages+=(clang libclang-rt-14-dev)
+[ "${RAVEL_WITH_CROSS:-0}" = 1 ] && packages+=(g++-arm-linux-gnueabihf g++-aarch64-linux-gnu qemu-user)
+
+missing=()
+for p in "${packages[@]}"; do
+  dpkg-query -W -f='${Status}' "$p" 2>/dev/null | grep -q "install ok installed" || missing+=("$p")
+done
+[ ${#missing[@]} -eq 0 ] && exit 0
+
+if command -v apt-get >/dev/null 2>&1; then
+  sudo=""
+  [ "$(id -u)" -ne 0 ] && command -v sudo >/dev/null 2>&1 && sudo="sudo"
+  if [ "$(id -u)" -eq 0 ] || [ -n "$sudo" ]; then
+    echo "Installing: ${missing[*]}" >&2
+    $sudo apt-get update -qq
+    DEBIAN_FRONTEND=noninteractive $sudo apt-get install -y -qq "${missing[@]}" >/dev/null
+    exit 0
+  fi
+fi
+echo "Please install these packages first: ${missing[*]}" >&2
+exit 1

@@ -1,0 +1,185 @@
+#include "StreamBuilder.h"
+
+#include <algorithm>
+
+#include "Ravel_Util.h"
+
+namespace sb {
+
+Bytes Cat(const std::vector<Bytes>& parts) {
+  Bytes all;
+  for (size_t i = 0; i < parts.size(); ++i) all.insert(all.end(), parts[i].begin(), parts[i].end());
+  return all;
+}
+
+void Append(Bytes& target, const Bytes& more) { target.insert(target.end(), more.begin(), more.end()); }
+
+Bytes U8(unsigned int value) { return Bytes{static_cast<uint8_t>(value)}; }
+Bytes U16(unsigned int value) { return Bytes{static_cast<uint8_t>(value >> 8), static_cast<uint8_t>(value)}; }
+Bytes U24(unsigned int value) {
+  return Bytes{static_cast<uint8_t>(value >> 16), static_cast<uint8_t>(value >> 8), static_cast<uint8_t>(value)};
+}
+Bytes U32(unsigned int value) {
+  return Bytes{static_cast<uint8_t>(value >> 24), static_cast<uint8_t>(value >> 16), static_cast<uint8_t>(value >> 8),
+               static_cast<uint8_t>(value)};
+}
+Bytes Text(const std::string& text) { return Bytes(text.begin(), text.end()); }
+
+Bytes Descriptor(uint8_t tag, const Bytes& body) {
+  Bytes d{tag, static_cast<uint8_t>(body.size())};
+  Append(d, body);
+  return d;
+}
+
+Bytes Length12(unsigned int length, uint8_t reserved) {
+  return Bytes{static_cast<uint8_t>((reserved << 4) | ((length >> 8) & 0x0F)), static_cast<uint8_t>(length)};
+}
+
+Bytes DescriptorLoop(const std::vector<Bytes>& descriptors, uint8_t reserved) {
+  Bytes body = Cat(descriptors);
+  Bytes loop = Length12(static_cast<unsigned int>(body.size()), reserved);
+  Append(loop, body);
+  return loop;
+}
+
+unsigned int Mjd(int year, int month, int day) {
+  // Days from the civil calendar (proleptic Gregorian), then the MJD epoch.
+  int y = year - (month <= 2 ? 1 : 0);
+  int era = (y >= 0 ? y : y - 399) / 400;
+  int yoe = y - era * 400;
+  int mp = (month + 9) % 12;
+  int doy = (153 * mp + 2) / 5 + day - 1;
+  int doe = yoe * 365 + yoe / 4 - yoe / 100 + doy;
+  long days = static_cast<long>(era) * 146097 + doe - 719468;  // days since 1970-01-01
+  return static_cast<unsigned int>(days + 40587);
+}
+
+uint8_t Bcd(int value) { return static_cast<uint8_t>(((value / 10) << 4) | (value % 10)); }
+
+Bytes UtcTime(int year, int month, int day, int hour, int minute, int second) {
+  Bytes t = U16(Mjd(year, month, day));
+  t.push_back(Bcd(hour));
+  t.push_back(Bcd(minute));
+  t.push_back(Bcd(second));
+  return t;
+}
+
+void FixCrc(Bytes& section) {
+  if (section.size() < 4) return;
+  unsigned int crc = RavelUtil_CRC32(0xFFFFFFFFu, section.data(), static_cast<unsigned int>(section.size() - 4));
+  section[section.size() - 4] = static_cast<uint8_t>(crc >> 24);
+  section[section.size() - 3] = static_cast<uint8_t>(crc >> 16);
+  section[section.size() - 2] = static_cast<uint8_t>(crc >> 8);
+  section[section.size() - 1] = static_cast<uint8_t>(crc);
+}
+
+Bytes LongSection(const SectionOptions& o, const Bytes& body) {
+  unsigned int sectionLength = 5 + static_cast<unsigned int>(body.size()) + 4;
+  Bytes s;
+  s.push_back(o.tableId);
+  s.push_back(static_cast<uint8_t>((o.syntaxIndicator ? 0x80 : 0) | (o.privateIndicator ? 0x40 : 0) | 0x30 |
+                                   ((sectionLength >> 8) & 0x0F)));
+  s.push_back(static_cast<uint8_t>(sectionLength));
+  Append(s, U16(o.tableIdExtension));
+  s.push_back(static_cast<uint8_t>(0xC0 | ((o.version & 0x1F) << 1) | (o.currentNext ? 1 : 0)));
+  s.push_back(o.sectionNumber);
+  s.push_back(o.lastSectionNumber);
+  Append(s, body);
+  Append(s, U32(0));
+  FixCrc(s);
+  if (o.corruptCrc) s.back() ^= 0x01;
+  return s;
+}
+
+Bytes ShortSection(uint8_t tableId, const Bytes& body, bool withCrc, bool corruptCrc) {
+  unsigned int sectionLength = static_cast<unsigned int>(body.size()) + (withCrc ? 4 : 0);
+  Bytes s{tableId, static_cast<uint8_t>(0x70 | ((sectionLength >> 8) & 0x0F)), static_cast<uint8_t>(sectionLength)};
+  Append(s, body);
+  if (withCrc) {
+    Append(s, U32(0));
+    FixCrc(s);
+    if (corruptCrc) s.back() ^= 0x01;
+  }
+  return s;
+}
+
+PacketWriter::PacketWriter(uint16_t pid, uint8_t firstCounter) : pid_(pid), counter_(firstCounter & 0x0F) {}
+
+Bytes PacketWriter::MakePacket(bool pusi, const Bytes& payload, uint8_t adaptationControl, const Bytes& adaptation) {
+  Bytes p;
+  p.push_back(0x47);
+  p.push_back(static_cast<uint8_t>((pusi ? 0x40 : 0) | ((pid_ >> 8) & 0x1F)));
+  p.push_back(static_cast<uint8_t>(pid_));
+  p.push_back(static_cast<uint8_t>(((adaptationControl & 3) << 4) | counter_));
+  if (adaptationControl & 2) {
+    p.push_back(static_cast<uint8_t>(adaptation.size()));
+    Append(p, adaptation);
+  }
+  if (adaptationControl & 1) Append(p, payload);
+  p.resize(188, 0xFF);
+  // Only packets with payload advance the continuity counter.
+  if (adaptationControl & 1) counter_ = (counter_ + 1) & 0x0F;
+  packets_.push_back(p);
+  return p;
+}
+
+void PacketWriter::AddSection(const Bytes& section) {
+  size_t offset = 0;
+  bool first = true;
+  while (offset < section.size() || first) {
+    Bytes payload;
+    if (first) payload.push_back(0x00);
+    size_t room = 184 - payload.size();
+    size_t take = std::min(room, section.size() - offset);
+    payload.insert(payload.end(), section.begin() + offset, section.begin() + offset + take);
+    offset += take;
+    MakePacket(first, payload);
+    first = false;
+  }
+}
+
+void PacketWriter::AddPackedSections(const std::vector<Bytes>& sections) {
+  Bytes data = Cat(sections);
+  std::vector<size_t> starts;
+  size_t at = 0;
+  for (size_t i = 0; i < sections.size(); ++i) {
+    starts.push_back(at);
+    at += sections[i].size();
+  }
+  size_t offset = 0;
+  size_t nextStart = 0;
+  while (offset < data.size()) {
+    // Does a section start inside the next 183 bytes?
+    while (nextStart < starts.size() && starts[nextStart] < offset) ++nextStart;
+    bool pusi = nextStart < starts.size() && starts[nextStart] < offset + 183;
+    Bytes payload;
+    if (pusi) payload.push_back(static_cast<uint8_t>(starts[nextStart] - offset));
+    size_t take = std::min(184 - payload.size(), data.size() - offset);
+    payload.insert(payload.end(), data.begin() + offset, data.begin() + offset + take);
+    offset += take;
+    MakePacket(pusi, payload);
+  }
+}
+
+void PacketWriter::AddSectionWithAdaptation(const Bytes& section, uint8_t adaptationLength) {
+  Bytes adaptation(adaptationLength, 0xFF);
+  if (adaptationLength > 0) adaptation[0] = 0x00;
+  Bytes payload{0x00};
+  size_t room = 188 - 4 - 1 - adaptationLength - 1;
+  size_t take = std::min(room, section.size());
+  payload.insert(payload.end(), section.begin(), section.begin() + take);
+  MakePacket(true, payload, 3, adaptation);
+  if (take < section.size()) {
+    Bytes rest(section.begin() + take, section.end());
+    size_t offset = 0;
+    while (offset < rest.size()) {
+      size_t n = std::min<size_t>(184, rest.size() - offset);
+      MakePacket(false, Bytes(rest.begin() + offset, rest.begin() + offset + n));
+      offset += n;
+    }
+  }
+}
+
+Bytes PacketWriter::Stream() const { return Cat(packets_); }
+
+}  // namespace sb

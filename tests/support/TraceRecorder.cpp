@@ -1,0 +1,50 @@
+#include "TraceRecorder.h"
+
+#include "Ravel_PGL.h"
+
+TraceRecorder::TraceRecorder() : panics_(0) {
+  RavelPGL_SetTraceHook(&TraceRecorder::OnTrace, this);
+  RavelPGL_SetPanicHook(&TraceRecorder::OnPanic, this);
+}
+
+TraceRecorder::~TraceRecorder() {
+  RavelPGL_SetTraceHook(0, 0);
+  RavelPGL_SetPanicHook(0, 0);
+}
+
+TraceLines TraceRecorder::Lines() const {
+  TraceLines lines;
+  for (size_t i = 0; i < records_.size(); ++i) lines.push_back(std::make_pair(records_[i].mask, records_[i].text));
+  return lines;
+}
+
+std::vector<std::string> TraceRecorder::TextsAt(unsigned int mask) const {
+  std::vector<std::string> texts;
+  for (size_t i = 0; i < records_.size(); ++i) {
+    if (records_[i].mask == mask) texts.push_back(records_[i].text);
+  }
+  return texts;
+}
+
+std::string TraceRecorder::Joined() const {
+  std::string all;
+  for (size_t i = 0; i < records_.size(); ++i) all += records_[i].text;
+  return all;
+}
+
+void TraceRecorder::Clear() {
+  records_.clear();
+  panics_ = 0;
+  panicFile_.clear();
+}
+
+void TraceRecorder::OnTrace(unsigned int mask, const char* file, int line, const char* text, void* context) {
+  TraceRecord record = {mask, file ? file : "", line, text ? text : ""};
+  static_cast<TraceRecorder*>(context)->records_.push_back(record);
+}
+
+void TraceRecorder::OnPanic(const char* file, int, void* context) {
+  TraceRecorder* self = static_cast<TraceRecorder*>(context);
+  ++self->panics_;
+  self->panicFile_ = file ? file : "";
+}

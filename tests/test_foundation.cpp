@@ -1,0 +1,253 @@
+// Support services, arrays and the broadcast date rules.
+#include <gtest/gtest.h>
+
+#include <cstring>
+
+#include "RavelSectionParser.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+TEST(SectionCrc, VerifiesBuiltSectionsAndRejectsAnyFlippedBit) {
+  Bytes section = sb::LongSection(sb::SectionOptions(), Bytes{1, 2, 3, 4, 5});
+  EXPECT_NE(0, RavelUtil_CheckSectionCRC32(section.data()));
+  for (size_t byte = 0; byte < section.size(); ++byte) {
+    for (int bit = 0; bit < 8; ++bit) {
+      Bytes damaged = section;
+      damaged[byte] ^= static_cast<uint8_t>(1 << bit);
+      // A flip in the length field changes what is summed; all others must fail.
+      if (byte == 1 || byte == 2) continue;
+      EXPECT_EQ(0, RavelUtil_CheckSectionCRC32(damaged.data())) << "byte " << byte << " bit " << bit;
+    }
+  }
+  EXPECT_EQ(0, RavelUtil_CheckSectionCRC32(nullptr));
+}
+
+TEST(SectionCrc, MatchesTheStandardCheckValue) {
+  // CRC-32/MPEG-2 of "123456789" is 0x0376E6E7.
+  const unsigned char text[] = "123456789";
+  EXPECT_EQ(0x0376E6E7u, RavelUtil_CRC32(0xFFFFFFFFu, text, 9));
+  for (unsigned int split = 0; split <= 9; ++split) {
+    unsigned int crc = RavelUtil_CRC32(RavelUtil_CRC32(0xFFFFFFFFu, text, split), text + split, 9 - split);
+    EXPECT_EQ(0x0376E6E7u, crc) << split;
+  }
+}
+
+TEST(MjdDateRule, ReproducesTheReceiversDates) {
+  struct Case {
+    unsigned int mjd;
+    int year, month, day;
+  } cases[] = {
+      {45218, 1982, 9, 6},    {49273, 1993, 10, 13}, {55986, 2012, 2, 29}, {56292, 2012, 12, 31},
+      {56293, 2012, 12, 32},  {56294, 2013, 1, 2},   {56352, 2013, 2, 32}, {56353, 2013, 3, 2},
+      {65535, 2038, 4, 22},   {0, 1859, -1, 19},
+  };
+  for (const Case& c : cases) {
+    int y = 0, m = 0, d = 0;
+    RavelDateCode_DecodeMJD(c.mjd, y, m, d);
+    EXPECT_EQ(c.year, y) << c.mjd;
+    EXPECT_EQ(c.month, m) << c.mjd;
+    EXPECT_EQ(c.day, d) << c.mjd;
+  }
+}
+
+TEST(MjdDateRule, FirstOfEveryMonthIsTheDayAfterThePreviousMonthsLast) {
+  // The day number the rule gives the 1st, counted on in the previous month.
+  const int dayInPreviousMonth[] = {32, 32, 32, 32, 31, 32, 31, 32, 32, 31, 32, 31};
+  for (int month = 1; month <= 12; ++month) {
+    int y = 0, m = 0, d = 0;
+    RavelDateCode_DecodeMJD(sb::Mjd(2013, month, 1), y, m, d);
+    EXPECT_EQ(month == 1 ? 2012 : 2013, y) << month;
+    EXPECT_EQ(month == 1 ? 12 : month - 1, m) << month;
+    EXPECT_EQ(dayInPreviousMonth[month - 1], d) << month;
+    RavelDateCode_DecodeMJD(sb::Mjd(2013, month, 15), y, m, d);
+    EXPECT_EQ(2013, y);
+    EXPECT_EQ(month, m);
+    EXPECT_EQ(15, d);
+  }
+}
+
+TEST(BcdRule, TakesNibblesUnchecked) {
+  struct Case {
+    unsigned char byte;
+    int value;
+  } cases[] = {{0x00, 0}, {0x59, 59}, {0x99, 99}, {0x9A, 100}, {0xFF, 165}};
+  for (const Case& c : cases) EXPECT_EQ(c.value, RavelBcd(c.byte)) << int(c.byte);
+  RavelCDateTime t;
+  Bytes utc = sb::UtcTime(2020, 5, 17, 23, 59, 58);
+  RavelDateCode_DecodeDateTime(utc.data(), t);
+  EXPECT_EQ(2020, t.iYear);
+  EXPECT_EQ(5, t.iMonth);
+  EXPECT_EQ(17, t.iDay);
+  EXPECT_EQ(23, t.iHour);
+  EXPECT_EQ(59, t.iMinute);
+  EXPECT_EQ(58, t.iSecond);
+}
+
+TEST(DateTime, OrdersInstantsTotally) {
+  RavelCDateTime a, b;
+  a.iYear = 2012; a.iMonth = 12; a.iDay = 32;
+  b.iYear = 2013; b.iMonth = 1; b.iDay = 2;
+  EXPECT_TRUE(a < b);
+  EXPECT_TRUE(a <= b);
+  EXPECT_FALSE(a > b);
+  EXPECT_FALSE(a >= b);
+  b = a;
+  b.iSecond = 1;
+  EXPECT_TRUE(a < b);
+  b = a;
+  EXPECT_FALSE(a < b);
+  EXPECT_TRUE(a <= b);
+  EXPECT_TRUE(a >= b);
+}
+
+TEST(BitInputStream, ReadsMsbFirstAndNeverPastItsBuffer) {
+  const unsigned char data[] = {0xA5, 0x3C, 0xFF};
+  RavelCBitInputStream reader(data, 2, 0);
+  unsigned char status = 0;
+  EXPECT_EQ(1, reader.ReadBit(status));
+  EXPECT_EQ(0x02, reader.ReadByte(3, status));
+  EXPECT_EQ(0x053Cu, reader.ReadShort(12, status));
+  EXPECT_EQ(0, status);
+  EXPECT_EQ(2u, reader.GetByteIndex());
+  // Past the 2-byte length: zeros, status raised, byte 3 never read.
+  EXPECT_EQ(0u, reader.ReadInt(32, status));
+  EXPECT_EQ(1, status);
+  unsigned char copy[4] = {9, 9, 9, 9};
+  RavelCBitInputStream bytes(data, 2, 0);
+  bytes.Skip(8);
+  bytes.GetByteArray(copy, 3);
+  EXPECT_EQ(0x3C, copy[0]);
+  EXPECT_EQ(0, copy[1]);
+  EXPECT_EQ(0, copy[2]);
+  EXPECT_EQ(9, copy[3]);
+}
+
+TEST(CString, OwnsAndCopiesItsText) {
+  RavelCString empty(nullptr);
+  EXPECT_STREQ("", empty.GetString());
+  RavelCString a("PAT");
+  RavelCString b(a);
+  a = "NIT";
+  EXPECT_STREQ("PAT", b.GetString());
+  char* adopted = new char[4];
+  std::memcpy(adopted, "SDT", 4);
+  b.SetMemAllocedString(adopted);
+  EXPECT_STREQ("SDT", b.GetString());
+  a = b;
+  EXPECT_STREQ("SDT", a.GetString());
+  EXPECT_EQ(0, RavelPGL_StrCaseCompare("Ginga", "gINGA"));
+  EXPECT_LT(RavelPGL_StrCaseCompare("a", "B"), 0);
+}
+
+namespace {
+int gReleased = 0;
+void CountRelease(void* element) {
+  ++gReleased;
+  delete static_cast<int*>(element);
+}
+}  // namespace
+
+TEST(List, KeepsOrderAndReleasesItsElements) {
+  list_head head;
+  list_initialize(&head);
+  list_set_release(&head, CountRelease);
+  for (int i = 0; i < 300; ++i) list_insert(&head, new int(i));
+  EXPECT_EQ(static_cast<unsigned char>(300 & 0xFF), head.count);  // the 8-bit count wraps
+  EXPECT_EQ(7, *static_cast<int*>(list_element(&head, 7)));
+  EXPECT_EQ(nullptr, list_element(&head, 300));
+  EXPECT_EQ(nullptr, list_element(&head, -1));
+  gReleased = 0;
+  list_removeAll(&head);
+  EXPECT_EQ(300, gReleased);
+  EXPECT_EQ(0, head.count);
+}
+
+TEST(Standard, DefaultsToBrazilAndCanBeSet) {
+  EXPECT_EQ(RAVEL_STANDARD_BRAZIL, RavelCfg_GetStandard());
+  RavelCfg_SetStandard(RAVEL_STANDARD_JAPAN);
+  EXPECT_EQ(1, RavelCfg_GetStandard());
+  RavelCfg_SetStandard(RAVEL_STANDARD_BRAZIL);
+}
+
+TEST(TraceSink, FormatsOnlyForListenersAndPassesLocation) {
+  TraceRecorder recorder;
+  gszRavelDbgFilePath = "SectionParser/source/Ravel_CTablePAT";
+  gRavelDbgLineNum = 42;
+  RavelPGL_TraceOut(0x10000020u, "x=[%d] %s\n", 5, "ok");
+  ASSERT_EQ(1u, recorder.Records().size());
+  EXPECT_EQ(0x10000020u, recorder.Records()[0].mask);
+  EXPECT_EQ("SectionParser/source/Ravel_CTablePAT", recorder.Records()[0].file);
+  EXPECT_EQ(42, recorder.Records()[0].line);
+  EXPECT_EQ("x=[5] ok\n", recorder.Records()[0].text);
+  std::string longText(3000, 'a');
+  RavelPGL_TraceOut(0x10000020u, "%s", longText.c_str());
+  EXPECT_EQ(longText, recorder.Records()[1].text);
+}
+
+struct Item {
+  int start;
+  int order;
+  int operator<(const Item& other) const { return start < other.start; }
+};
+
+TEST(CArray, GrowsByEightAndChecksItsBounds) {
+  TraceRecorder recorder;
+  RavelCArray<int> array;
+  EXPECT_EQ(8, array.iMaxCount);
+  EXPECT_EQ(8, array.iGrowSize);
+  int expectedCapacity[] = {8, 8, 8, 8, 8, 8, 8, 8, 16, 16, 16, 16, 16, 16, 16, 16, 24};
+  for (int i = 0; i < 17; ++i) {
+    array.Append(i);
+    EXPECT_EQ(expectedCapacity[i], array.iMaxCount) << i;
+  }
+  EXPECT_EQ(0, array.Insert(99, array.iCount));
+  EXPECT_EQ(99, array[17]);
+  EXPECT_EQ(0, array.Insert(-5, 0));
+  EXPECT_EQ(-5, array[0]);
+  EXPECT_EQ(0, array[1]);
+  EXPECT_TRUE(recorder.Records().empty());
+
+  struct BadCase {
+    int pos;
+  } inserts[] = {{-1}, {array.iCount + 1}};
+  for (const BadCase& c : inserts) {
+    recorder.Clear();
+    int count = array.iCount;
+    EXPECT_EQ(kRavelErrInvalidArgument, array.Insert(1, c.pos));
+    EXPECT_EQ(count, array.iCount);
+    ASSERT_EQ(1u, recorder.Records().size());
+    EXPECT_EQ(0x40000001u, recorder.Records()[0].mask);
+    EXPECT_EQ("Argument Invalid! aPos=[" + std::to_string(c.pos) + "], iCount=[" + std::to_string(count) + "]\n",
+              recorder.Records()[0].text);
+  }
+  for (int index : {-1, array.iCount}) {
+    recorder.Clear();
+    int value = array[index];
+    EXPECT_EQ(0, value);  // the zeroed scratch slot, not memory outside the array
+    ASSERT_EQ(1u, recorder.Records().size());
+    EXPECT_EQ(0x40000001u, recorder.Records()[0].mask);
+    EXPECT_EQ("Array Bound Overflow! anIndex=[" + std::to_string(index) + "], iCount=[19]\n",
+              recorder.Records()[0].text);
+    EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.Records()[0].file);
+    EXPECT_EQ(1, recorder.PanicCount());
+  }
+}
+
+TEST(CPointerArray, RemoveAllKeepsCapacityAndSortIsStable) {
+  RavelCPointerArray<Item> items;
+  const int starts[] = {5, 3, 5, 1, 3, 9, 0, 5, 2, 3};
+  for (int i = 0; i < 10; ++i) items.Append(new Item{starts[i], i});
+  items.Sort();
+  for (int i = 1; i < items.iCount; ++i) {
+    ASSERT_LE(items[i - 1]->start, items[i]->start);
+    if (items[i - 1]->start == items[i]->start) {
+      EXPECT_LT(items[i - 1]->order, items[i]->order);
+    }
+  }
+  EXPECT_EQ(16, items.iMaxCount);
+  EXPECT_EQ(0, items.RemoveAll());
+  EXPECT_EQ(0, items.iCount);
+  EXPECT_EQ(16, items.iMaxCount);
+  items.Append(new Item{1, 1});
+  EXPECT_EQ(1, items.iCount);
+}
