@@ -12,7 +12,10 @@
 struct RavelCDescriptorKind {
   unsigned char iTag;
   const char* szDisplayName;     // stored as the name once the tag matches
-  const char* szWrongTagFormat;  // "This Descriptor isn't ... Descriptor Tag=[0x%x]\n"
+  // "This Descriptor isn't ... Descriptor Tag=[0x%x]\n"; null for the classes
+  // that accept any tag (the application-loop descriptors, whose class the AIT
+  // picks by tag itself).
+  const char* szWrongTagFormat;
   const char* szBanner;          // first line of Show
   unsigned int iWrongTagMask;    // trace mask of the wrong-tag message
   bool bTraceNullArgument;       // "Invalid Argument!\n" before refusing a null descriptor
@@ -44,10 +47,11 @@ class RavelCDescriptorBase {
 
  protected:
   // The shared first steps of a class's ParseRawData, after it has released its
-  // previous parse: base parse, null check, tag check, naming. Gives 0 when the
-  // class is to decode its body, or the result code it is to return.
+  // previous parse: base parse, null check, tag check (skipped when the kind has
+  // no wrong-tag message), naming. Gives 0 when the class is to decode its body,
+  // or the result code it is to return.
   int ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind);
-  // The banner, then the base line, at `mask`.
+  // The banner at `mask`, then the base line, which keeps the dump level.
   void ShowHeader(const RavelCDescriptorKind& kind, unsigned int mask = 0x10000020u);
 };
 

@@ -46,7 +46,7 @@ int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptor
     if (kind.bTraceNullArgument) RAVEL_TRACE(RAVEL_PARSER_ERROR, "Invalid Argument!\n");
     return kRavelErrInvalidArgument;
   }
-  if (iDescriptorTag != kind.iTag) {
+  if (kind.szWrongTagFormat != 0 && iDescriptorTag != kind.iTag) {
     RAVEL_TRACE(kind.iWrongTagMask, kind.szWrongTagFormat, iDescriptorTag);
     return kRavelErrInvalidArgument;
   }

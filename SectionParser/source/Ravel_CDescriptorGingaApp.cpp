@@ -1,0 +1,44 @@
+#include "Ravel_CDescriptorGingaApp.h"
+
+#include <cstring>
+
+#include "Ravel_FixedText.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorGingaApp");
+
+// The application descriptors dump at the information level.
+static const unsigned int kShowMask = RAVEL_PARSER_WARNING;
+
+const RavelCDescriptorKind RavelCGingaAppDescriptor::kKind = {
+    0x06, "Ginga Application Descriptor", 0 /* any tag */,
+    "\t=================== Ginga Application Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+
+RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(unsigned char* raw) {
+  std::memset(szParameter, 0, sizeof(szParameter));
+  ParseRawData(raw);
+}
+
+RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(RavelCGingaAppDescriptor& other) : RavelCDescriptorBase(other) {
+  std::memset(szParameter, 0, sizeof(szParameter));
+  *this = other;
+}
+
+RavelCGingaAppDescriptor& RavelCGingaAppDescriptor::operator=(RavelCGingaAppDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  std::memcpy(szParameter, other.szParameter, sizeof(szParameter));
+  return *this;
+}
+
+RavelCGingaAppDescriptor::~RavelCGingaAppDescriptor() {}
+
+int RavelCGingaAppDescriptor::ParseRawData(unsigned char* raw) {
+  if (raw == 0) std::memset(szParameter, 0, sizeof(szParameter));
+  return ParseHeader(raw, kKind);
+}
+
+void RavelCGingaAppDescriptor::Show() {
+  ShowHeader(kKind, kShowMask);
+  RAVEL_TRACE(kShowMask, "\t iParameter %s \n", RavelFixedText_Print(szParameter).Get());
+}

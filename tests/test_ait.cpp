@@ -1,0 +1,442 @@
+// Application information table: application records, resolution codes, the
+// descriptor tag table, texts, failures, copies and merge, and real sections.
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <cstring>
+#include <map>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "Captures.h"
+#include "Ravel_CTableAIT.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kInfo = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+const char kProcess[] = "RavelCAIT::processDescriptors...\n";
+const char kUnsupportedResolution[] = "Document resolution not supported!!\n";
+
+std::string Field(const char* field, size_t size) { return std::string(field, strnlen(field, size)); }
+
+// organization_id, application_id, control code, the resolution nibble and the
+// application's descriptor loop.
+Bytes App(unsigned int org, unsigned int appId, unsigned int control, uint8_t resolution,
+          const std::vector<Bytes>& descriptors) {
+  return sb::Cat({sb::U32(org), sb::U16(appId), sb::U8(control), sb::DescriptorLoop(descriptors, resolution)});
+}
+
+Bytes AitBody(const std::vector<Bytes>& apps, const std::vector<Bytes>& common = {}) {
+  return sb::Cat({sb::DescriptorLoop(common), sb::DescriptorLoop(apps)});
+}
+
+Bytes Ait(const Bytes& body, uint8_t version = 3, bool corruptCrc = false, uint8_t tableId = 0x74) {
+  sb::SectionOptions o;
+  o.tableId = tableId;
+  o.tableIdExtension = 0x0010;  // application_type: Ginga-NCL
+  o.version = version;
+  o.corruptCrc = corruptCrc;
+  return sb::LongSection(o, body);
+}
+
+Bytes Name(const std::string& name) {
+  return sb::Descriptor(0x01, sb::Cat({sb::Text("por"), sb::U8(static_cast<unsigned int>(name.size())), sb::Text(name)}));
+}
+
+Bytes Location(const std::string& base, const std::string& classPath, const std::string& initial) {
+  return sb::Descriptor(0x07, sb::Cat({sb::U8(static_cast<unsigned int>(base.size())), sb::Text(base),
+                                       sb::U8(static_cast<unsigned int>(classPath.size())), sb::Text(classPath),
+                                       sb::Text(initial)}));
+}
+
+std::string ParseLine(const unsigned char* section) {
+  char text[64];
+  std::snprintf(text, sizeof(text), "RavelCAIT::ParseRawData... apRawData=[%p]\n",
+                static_cast<const void*>(section));
+  return text;
+}
+
+GingaAITApplicationType& At(RavelCAIT& ait, int index) { return (*ait.GetApplicationList())[index]; }
+
+}  // namespace
+
+TEST(AitParse, MapsTheResolutionNibbleAndKeepsUnsupportedApplications) {
+  struct Case {
+    uint8_t code;
+    int resolution;
+  } cases[] = {{0xC, 1}, {0xB, 2}, {0x0, 3}, {0xF, 0}, {0x1, 0}, {0xA, 0}, {0xD, 0}};
+  for (const Case& c : cases) {
+    Bytes section = Ait(AitBody({App(0x0000000B, 0x1AB5, 0x01, c.code, {})}));
+    RavelCAIT ait;
+    TraceRecorder recorder;
+    ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << int(c.code);
+    TraceLines expected = {{kInfo, ParseLine(section.data())}};
+    if (c.resolution == 0) expected.push_back({kError, kUnsupportedResolution});
+    EXPECT_EQ(expected, recorder.Lines()) << int(c.code);
+    ASSERT_EQ(1, ait.GetApplicationList()->iCount) << int(c.code);
+    EXPECT_EQ(c.resolution, At(ait, 0).iDocumentResolution) << int(c.code);
+    EXPECT_EQ(0x0Bu, At(ait, 0).iOrganizationId);
+    EXPECT_EQ(0x1AB5u, At(ait, 0).iApplicationId);
+    EXPECT_EQ(0x01u, At(ait, 0).iApplicationControlCode);
+  }
+}
+
+TEST(AitParse, ReportsEachDescriptorTagAsItsTableSays) {
+  const std::string invalid = "Detected an Invalid Descriptor";
+  struct Case {
+    uint8_t tag;
+    unsigned int mask;
+    std::string detected;
+  } cases[] = {
+      {0x00, kInfo, "Detected an APPLICATION_DESCRIPTOR"},
+      {0x02, kInfo, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"},
+      {0x03, kDump, invalid},
+      {0x04, kDump, invalid},
+      {0x05, kInfo, "Detected an APPLICATION_AUTH_EXT_DESCRIPTOR"},
+      {0x06, kInfo, "Detected an APPLICATION_GINGA_APP_DESCRIPTOR"},
+      {0x08, kDump, invalid},
+      {0x09, kDump, invalid},
+      {0x0A, kDump, invalid},
+      {0x0B, kInfo, "Detected an APPLICATION_ICON_DESCRIPTOR"},
+      {0x0C, kInfo, "Detected an APPLICATION_PREFETCH_DESCRIPTOR"},
+      {0x0D, kInfo, "Detected an APPLICATION_DII_LOCATION_DESCRIPTOR"},
+      {0x0E, kDump, invalid},
+      {0x40, kDump, invalid},
+      {0xFD, kInfo, "Detected an APPLICATION_DATA_COMPONENT_DESCRIPTOR"},
+      {0xFE, kDump, invalid},
+  };
+  for (const Case& c : cases) {
+    // A body that every class could read as text: nothing of it may reach the record.
+    Bytes descriptor =
+        sb::Descriptor(c.tag, sb::Cat({sb::U8(3), sb::Text("abc"), sb::U8(2), sb::Text("de"), sb::Text("fg")}));
+    Bytes section = Ait(AitBody({App(1, 2, 1, 0xC, {descriptor})}));
+    RavelCAIT ait;
+    TraceRecorder recorder;
+    ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
+    TraceLines expected = {{kInfo, ParseLine(section.data())}, {kInfo, kProcess}, {c.mask, c.detected}};
+    EXPECT_EQ(expected, recorder.Lines()) << int(c.tag);
+    ASSERT_EQ(1, ait.GetApplicationList()->iCount);
+    EXPECT_STREQ("", At(ait, 0).szAppName) << int(c.tag);
+    EXPECT_STREQ("", At(ait, 0).szAppFilePath) << int(c.tag);
+    EXPECT_STREQ("", At(ait, 0).szAppFileName) << int(c.tag);
+  }
+}
+
+TEST(AitParse, TakesNameAndLocationTextsAndOverwritesWithoutClearing) {
+  struct Case {
+    const char* label;
+    std::vector<Bytes> descriptors;
+    std::string name, path, file;
+    TraceLines descriptorTraces;
+  } cases[] = {
+      {"name and location",
+       {Name("Quiz"), Location("/quiz", "lib", "main.ncl")},
+       "Quiz",
+       "/quiz",
+       "main.ncl",
+       {{kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
+        {kInfo, "Application name = Quiz"},
+        {kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /quiz"},
+        {kInfo, "Application filename = main.ncl"}}},
+      {"neither", {}, "", "", "", {}},
+      // A shorter second text overwrites only its own length; the trace shows the record.
+      {"second texts shorter",
+       {Name("LongerName"), Name("Short"), Location("/a/long/dir", "", "initial.ncl"), Location("/b", "cp", "x")},
+       "Shortr" "Name",
+       "/b/long/dir",
+       "xnitial.ncl",
+       {{kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
+        {kInfo, "Application name = LongerName"},
+        {kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
+        {kInfo, "Application name = ShortrName"},
+        {kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /a/long/dir"},
+        {kInfo, "Application filename = initial.ncl"},
+        {kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /b/long/dir"},
+        {kInfo, "Application filename = xnitial.ncl"}}},
+  };
+  for (const Case& c : cases) {
+    Bytes section = Ait(AitBody({App(1, 2, 1, 0xC, c.descriptors)}));
+    RavelCAIT ait;
+    TraceRecorder recorder;
+    ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << c.label;
+    TraceLines expected = {{kInfo, ParseLine(section.data())}};
+    expected.insert(expected.end(), c.descriptorTraces.begin(), c.descriptorTraces.end());
+    EXPECT_EQ(expected, recorder.Lines()) << c.label;
+    ASSERT_EQ(1, ait.GetApplicationList()->iCount);
+    EXPECT_EQ(c.name, Field(At(ait, 0).szAppName, 255)) << c.label;
+    EXPECT_EQ(c.path, Field(At(ait, 0).szAppFilePath, 255)) << c.label;
+    EXPECT_EQ(c.file, Field(At(ait, 0).szAppFileName, 256)) << c.label;
+  }
+}
+
+TEST(AitParse, FullTextsStayInsideTheirFieldsAndPrintTerminated) {
+  // 255-byte base directory and initial class name: the location fields are full.
+  Bytes location = sb::Cat({Bytes{0x07, 0xFF, 0xFF}, Bytes(255, 'P'), Bytes{0xFF}, Bytes(255, 'C'), Bytes(255, 'F')});
+  Bytes descriptors = sb::Cat({Name("App"), location});
+  // The loop lengths cover the name and the location's first two bytes; the
+  // location's own length byte then carries the position past both loops.
+  Bytes app = sb::Cat({sb::U32(1), sb::U16(2), sb::U8(1), sb::Length12(9 + 2, 0xC), descriptors});
+  Bytes section = Ait(sb::Cat({sb::Length12(0), sb::Length12(9 + 9 + 2), app}));
+  RavelCAIT ait;
+  ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
+  ASSERT_EQ(1, ait.GetApplicationList()->iCount);
+  const GingaAITApplicationType& record = At(ait, 0);
+  EXPECT_EQ("App", Field(record.szAppName, 255));
+  EXPECT_EQ(std::string(255, 'P'), std::string(record.szAppFilePath, 255));
+  EXPECT_EQ(std::string(255, 'F'), Field(record.szAppFileName, 256));
+  EXPECT_EQ(0, record.szAppFileName[255]);  // the 256th byte keeps the file name terminated
+  EXPECT_EQ(1, record.iDocumentResolution);
+
+  TraceRecorder recorder;
+  ait.Show();
+  std::vector<std::string> dump = recorder.TextsAt(kDump);
+  ASSERT_EQ(17u, dump.size());
+  EXPECT_EQ("\t App Name.........: App", dump[10]);
+  EXPECT_EQ("\t App File Path....: " + std::string(255, 'P'), dump[11]);
+  EXPECT_EQ("\t App File Name....: " + std::string(255, 'F'), dump[12]);
+}
+
+TEST(AitParse, FailuresLeaveNoApplications) {
+  Bytes good = Ait(AitBody({App(1, 2, 1, 0xC, {Name("A")}), App(3, 4, 2, 0xB, {})}), 5);
+  struct Case {
+    const char* label;
+    Bytes section;
+    bool null;
+    int result;
+    std::string message;
+    int tableId;  // header afterwards
+  } cases[] = {
+      {"crc", Ait(AitBody({App(9, 9, 1, 0xC, {})}), 7, true), false, kRavelErrCorruptSection, "AIT Section: CRC Error!\n",
+       0x74},
+      {"null", Bytes(), true, kRavelErrCorruptSection, "AIT Section: CRC Error!\n", 0x74},
+      {"foreign table_id", Ait(AitBody({App(9, 9, 1, 0xC, {})}), 7, false, 0x73), false, kRavelErrInvalidArgument,
+       "Table ID isn't for AIT! Table ID=[0x73]\n", 0x73},
+  };
+  for (Case& c : cases) {
+    RavelCAIT ait;
+    ASSERT_EQ(kRavelOk, ait.ParseRawData(good.data()));
+    ASSERT_EQ(2, ait.GetApplicationList()->iCount);
+    unsigned char* section = c.null ? nullptr : c.section.data();
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, ait.ParseRawData(section)) << c.label;
+    EXPECT_EQ((TraceLines{{kInfo, ParseLine(section)}, {kError, c.message}}), recorder.Lines()) << c.label;
+    EXPECT_EQ(0, ait.GetApplicationList()->iCount) << c.label;
+    EXPECT_EQ(c.tableId, ait.iTableId) << c.label;
+    // CRC failures keep the previous header; a foreign table_id leaves the new one.
+    EXPECT_EQ(c.result == kRavelErrCorruptSection ? 5 : 7, ait.iVersionNumber) << c.label;
+  }
+}
+
+TEST(AitParse, ReadsTheLoopLengthsOneAfterTheOther) {
+  Bytes app1 = App(1, 1, 1, 0xC, {});
+  Bytes app2 = App(2, 2, 1, 0xC, {});
+  struct Case {
+    const char* label;
+    std::vector<Bytes> common;
+    std::vector<Bytes> apps;
+    int count;
+  } cases[] = {
+      {"empty loop", {}, {}, 0},
+      {"two applications", {}, {app1, app2}, 2},
+      // application_loop_length comes from bytes 10-11, the common descriptor's
+      // first two bytes: here 0x0 | 9, so only the first application is read.
+      {"common descriptor giving 9", {sb::Descriptor(0x00, Bytes(9, 0xEE))}, {app1, app2}, 1},
+      // ... and here 0x0 | 0: no application at all.
+      {"common descriptor giving 0", {sb::Descriptor(0x10, Bytes())}, {app1, app2}, 0},
+  };
+  for (const Case& c : cases) {
+    Bytes section = Ait(AitBody(c.apps, c.common));
+    RavelCAIT ait;
+    TraceRecorder recorder;
+    EXPECT_EQ(kRavelOk, ait.ParseRawData(section.data())) << c.label;
+    ASSERT_EQ(c.count, ait.GetApplicationList()->iCount) << c.label;
+    for (int i = 0; i < c.count; ++i) EXPECT_EQ(unsigned(i + 1), At(ait, i).iOrganizationId) << c.label;
+    EXPECT_EQ((TraceLines{{kInfo, ParseLine(section.data())}}), recorder.Lines()) << c.label;
+  }
+  // A section shorter than the two loop lengths reads them as 0.
+  Bytes tiny = Ait(Bytes{0xF0});
+  RavelCAIT ait;
+  EXPECT_EQ(kRavelOk, ait.ParseRawData(tiny.data()));
+  EXPECT_EQ(0, ait.GetApplicationList()->iCount);
+}
+
+TEST(AitParse, SecondSectionReplacesTheListInPlace) {
+  Bytes three = Ait(AitBody({App(1, 1, 1, 0xC, {Name("one")}), App(2, 2, 1, 0xC, {}), App(3, 3, 1, 0xC, {})}));
+  Bytes one = Ait(AitBody({App(7, 7, 2, 0xB, {})}), 4);
+  RavelCAIT ait;
+  RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
+  ASSERT_EQ(kRavelOk, ait.ParseRawData(three.data()));
+  EXPECT_EQ(3, list->iCount);
+  ASSERT_EQ(kRavelOk, ait.ParseRawData(one.data()));
+  EXPECT_EQ(list, ait.GetApplicationList());
+  ASSERT_EQ(1, list->iCount);
+  EXPECT_EQ(7u, (*list)[0].iOrganizationId);
+  EXPECT_STREQ("", (*list)[0].szAppName);  // each record starts cleared
+  EXPECT_EQ(2, (*list)[0].iDocumentResolution);
+  EXPECT_EQ(4, ait.iVersionNumber);
+}
+
+TEST(AitCopy, CopiesTheHeaderButNoApplicationsAndMergesNothing) {
+  Bytes three = Ait(AitBody({App(1, 1, 1, 0xC, {}), App(2, 2, 1, 0xC, {}), App(3, 3, 1, 0xC, {})}), 6);
+  Bytes two = Ait(AitBody({App(8, 8, 1, 0xC, {}), App(9, 9, 1, 0xC, {})}), 2);
+  RavelCAIT source;
+  ASSERT_EQ(kRavelOk, source.ParseRawData(three.data()));
+  source.iSession = 0x5A;
+  source.SetTableName("AIT");
+
+  RavelCAIT copy(source);
+  EXPECT_EQ(0, copy.GetApplicationList()->iCount);
+  EXPECT_EQ(8, copy.GetApplicationList()->iMaxCount);
+  EXPECT_EQ(0x74, copy.iTableId);
+  EXPECT_EQ(6, copy.iVersionNumber);
+  EXPECT_EQ(0x0010, copy.iTableIdExtension);
+  EXPECT_EQ(source.iSectionLength, copy.iSectionLength);
+  EXPECT_EQ(0x5A, copy.iSession);
+  EXPECT_STREQ("AIT", copy.sTableName.GetString());
+
+  // Assignment takes the header and leaves the target's own applications.
+  RavelCAIT target;
+  ASSERT_EQ(kRavelOk, target.ParseRawData(two.data()));
+  target = source;
+  EXPECT_EQ(6, target.iVersionNumber);
+  ASSERT_EQ(2, target.GetApplicationList()->iCount);
+  EXPECT_EQ(8u, At(target, 0).iOrganizationId);
+  EXPECT_EQ(9u, At(target, 1).iOrganizationId);
+
+  struct Merge {
+    const char* label;
+    uint8_t otherVersion;
+    TraceLines traces;
+  } merges[] = {
+      {"same version", 6, {}},
+      {"other version", 2, {{kError, "Two AIT Information have different information!\n"}}},
+  };
+  for (const Merge& m : merges) {
+    RavelCAIT other;
+    ASSERT_EQ(kRavelOk, other.ParseRawData(Ait(AitBody({App(5, 5, 1, 0xC, {})}), m.otherVersion).data()));
+    TraceRecorder recorder;
+    RavelCAIT& result = (source += other);
+    EXPECT_EQ(&source, &result) << m.label;
+    EXPECT_EQ(m.traces, recorder.Lines()) << m.label;
+    ASSERT_EQ(3, source.GetApplicationList()->iCount) << m.label;
+    EXPECT_EQ(3u, At(source, 2).iOrganizationId) << m.label;
+    EXPECT_EQ(6, source.iVersionNumber) << m.label;
+  }
+}
+
+TEST(AitShow, DumpsHeaderAndApplicationsWithoutLineEnds) {
+  Bytes section = Ait(AitBody({App(0x0B, 0x1AB5, 2, 0xC, {Name("Quiz"), Location("/q", "", "main.ncl")})}), 1);
+  RavelCAIT ait;
+  ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
+  TraceRecorder recorder;
+  ait.Show();
+  const std::string rule = "#################################################################\n";
+  TraceLines expected = {
+      {kDump, rule},
+      {kDump, "###################### AIT Table Information ######################\n"},
+      {kDump, rule},
+      {kDump, "####################### Header Information ########################\n"},
+      {kDump, "Session = [0x00], Talbe identifier=[0x74], Table Name=[Unknown]\n"},
+      {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
+                  "], Any Identifier(?)=[0x0010]\n"},
+      {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
+      {kDump, "####################### Body Information ########################\n"},
+      {kDump, rule},
+      {kDump, "- - - - - - - - - - - - - - - - Application Information - - - - - - - - - - - - "},
+      {kDump, "\t App Name.........: Quiz"},
+      {kDump, "\t App File Path....: /q"},
+      {kDump, "\t App File Name....: main.ncl"},
+      {kDump, "\t App orgId........: 11"},
+      {kDump, "\t App appId........: 6837"},
+      {kDump, "\t App control code.: 2"},
+      {kDump, "- - - - - - - - - - - - - - - End of Application Information - - - - - - - - - -"},
+  };
+  EXPECT_EQ(expected, recorder.Lines());
+}
+
+namespace {
+
+// The AIT sections of a transport stream: every PUSI packet whose section (after
+// the pointer_field) starts with table_id 0x74, completed from the PID's
+// following packets by its section_length.
+std::map<unsigned int, std::vector<Bytes>> AitSections(const Bytes& stream) {
+  std::map<unsigned int, std::vector<Bytes>> sections;
+  std::map<unsigned int, Bytes> pending;
+  for (size_t at = 0; at + 188 <= stream.size(); at += 188) {
+    const uint8_t* p = &stream[at];
+    if (p[0] != 0x47) continue;
+    unsigned int pid = ((p[1] & 0x1F) << 8) | p[2];
+    bool pusi = (p[1] & 0x40) != 0;
+    unsigned int control = (p[3] >> 4) & 0x3;
+    if (!(control & 0x1)) continue;
+    size_t offset = 4 + ((control & 0x2) ? 1 + p[4] : 0);
+    if (offset >= 188) continue;
+    Bytes payload(p + offset, p + 188);
+    Bytes& section = pending[pid];
+    if (pusi) {
+      size_t start = 1 + payload[0];
+      section.clear();
+      if (start < payload.size() && payload[start] == 0x74) section.assign(payload.begin() + start, payload.end());
+    } else if (!section.empty()) {
+      sb::Append(section, payload);
+    }
+    if (section.size() >= 3) {
+      size_t size = (((section[1] & 0x0F) << 8) | section[2]) + 3;
+      if (section.size() >= size) {
+        section.resize(size);
+        sections[pid].push_back(section);
+        section.clear();
+      }
+    }
+  }
+  return sections;
+}
+
+}  // namespace
+
+TEST(AitCapture, RealSectionsParseAndYieldApplications) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("ait.ts", stream);
+  std::map<unsigned int, std::vector<Bytes>> sections = AitSections(stream);
+  ASSERT_EQ(3u, sections.size());
+  std::set<std::string> names;
+  int applications = 0;
+  for (auto& pid : sections) {
+    for (Bytes& section : pid.second) {
+      RavelCAIT ait;
+      TraceRecorder recorder;
+      ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << "PID " << pid.first;
+      RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
+      EXPECT_GT(list->iCount, 0) << "PID " << pid.first;
+      applications += list->iCount;
+      for (int i = 0; i < list->iCount; ++i) {
+        const GingaAITApplicationType& app = (*list)[i];
+        names.insert(Field(app.szAppName, 255));
+        // DVB signalling: reserved bits all set, so no Ginga resolution.
+        EXPECT_EQ(0, app.iDocumentResolution);
+        EXPECT_LE(app.iApplicationId, 0xFFFFu);
+        EXPECT_LE(app.iApplicationControlCode, 0xFFu);
+      }
+      EXPECT_EQ(0, recorder.PanicCount());
+    }
+  }
+  EXPECT_GE(applications, 6);
+  EXPECT_EQ(1u, names.count("Programmi TV BB SAT"));
+  EXPECT_EQ(1u, names.count("Launcher SAT"));
+}
