@@ -13,19 +13,31 @@
 #include "Ravel_Util.h"
 
 // Foundation.
-#include "Ravel_ByteOrder.h"
 #include "Ravel_CArray.h"
-#include "Ravel_CDateCode.h"
 #include "Ravel_ResultCode.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CDateCode.h"
 #include "Ravel_Trace.h"
 
 // Transport stream layer.
 
 // Tables.
+#include "Ravel_CTableAIT.h"
 #include "Ravel_CTableBase.h"
 
+// DSM-CC data carousel.
+
 // Descriptors.
+#include "Ravel_CAdditionalGingaInfo.h"
+#include "Ravel_CDescriptorApplication.h"
+#include "Ravel_CDescriptorApplicationName.h"
 #include "Ravel_CDescriptorBase.h"
+#include "Ravel_CDescriptorGingaApp.h"
+#include "Ravel_CDescriptorGingaAppDataComponent.h"
+#include "Ravel_CDescriptorGingaAppLoc.h"
 #include "Ravel_CDescriptorNetworkName.h"
+#include "Ravel_CObjectCarouselTransmissionFormat.h"
+#include "Ravel_DescriptorText.h"
+#include "Ravel_FixedText.h"
 
 #endif
