@@ -1,4 +1,4 @@
-// Component descriptor (tag 0x50, ARIB STD-B10 Part 2, ABNT NBR 15603-2):
+// Component descriptor (tag 0x50, ARIB STD-B10, ABNT NBR 15603-2):
 //   reserved_future_use       4   // xxxx....
 //   stream_content            4   // ....xxxx
 //   component_type            8

@@ -1,4 +1,4 @@
-// Content descriptor (tag 0x54, ARIB STD-B10 Part 2, ABNT NBR 15603-2), a loop
+// Content descriptor (tag 0x54, ARIB STD-B10, ABNT NBR 15603-2), a loop
 // of 2-byte entries:
 //   content_nibble_level_1   4   // xxxx....
 //   content_nibble_level_2   4   // ....xxxx

@@ -1,4 +1,4 @@
-// Copyright descriptor (tag 0x0D, ISO/IEC 13818-1 2.6.24, ARIB STD-B10 Part 2):
+// Copyright descriptor (tag 0x0D, ISO/IEC 13818-1 2.6.24, ARIB STD-B10):
 //   copyright_identifier        32
 //   additional_copyright_info   descriptor_length - 4 bytes
 //

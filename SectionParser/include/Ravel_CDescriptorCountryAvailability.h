@@ -1,4 +1,4 @@
-// Country availability descriptor (tag 0x49, ARIB STD-B10 Part 2, ABNT NBR 15603-2):
+// Country availability descriptor (tag 0x49, ARIB STD-B10, ABNT NBR 15603-2):
 //   country_availability_flag   1   // x.......
 //   reserved_future_use         7   // .xxxxxxx
 //   country_code               24   (repeated to the end of the descriptor)

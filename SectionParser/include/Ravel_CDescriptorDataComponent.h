@@ -1,4 +1,4 @@
-// Data component descriptor (tag 0xFD, ARIB STD-B10 Part 2, ABNT NBR 15608):
+// Data component descriptor (tag 0xFD, ARIB STD-B10, ABNT NBR 15608):
 //   data_component_id                 16
 //   additional_data_component_info    (not read)
 #ifndef RAVEL_CDESCRIPTORDATACOMPONENT_H

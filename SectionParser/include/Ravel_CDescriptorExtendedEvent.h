@@ -1,4 +1,4 @@
-// Extended event descriptor (tag 0x4E, ARIB STD-B10 Part 2, ABNT NBR 15603-2):
+// Extended event descriptor (tag 0x4E, ARIB STD-B10, ABNT NBR 15603-2):
 //   descriptor_number          4   // xxxx....
 //   last_descriptor_number     4   // ....xxxx
 //   ISO_639_language_code     24

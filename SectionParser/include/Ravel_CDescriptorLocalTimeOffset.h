@@ -1,4 +1,4 @@
-// Local time offset descriptor (tag 0x58, ARIB STD-B10 Part 2, ABNT NBR 15603-2),
+// Local time offset descriptor (tag 0x58, ARIB STD-B10, ABNT NBR 15603-2),
 // a loop of 13-byte entries:
 //   country_code                 24
 //   country_region_id             6   // xxxxxx..

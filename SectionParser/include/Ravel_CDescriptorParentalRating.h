@@ -1,4 +1,4 @@
-// Parental rating descriptor (tag 0x55, ARIB STD-B10 Part 2, ABNT NBR 15603-2),
+// Parental rating descriptor (tag 0x55, ARIB STD-B10, ABNT NBR 15603-2),
 // a loop of 4-byte entries:
 //   country_code   24
 //   rating          8

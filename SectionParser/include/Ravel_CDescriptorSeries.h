@@ -1,4 +1,4 @@
-// Series descriptor (tag 0xD5, ARIB STD-B10 Part 2):
+// Series descriptor (tag 0xD5, ARIB STD-B10):
 //   series_id                16
 //   repeat_label              4   // xxxx....
 //   program_pattern           3   // ....xxx.

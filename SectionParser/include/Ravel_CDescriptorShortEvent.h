@@ -1,4 +1,4 @@
-// Short event descriptor (tag 0x4D, ARIB STD-B10 Part 2, ABNT NBR 15603-2):
+// Short event descriptor (tag 0x4D, ARIB STD-B10, ABNT NBR 15603-2):
 //   ISO_639_language_code   24
 //   event_name_length        8
 //   event_name_char          event_name_length bytes

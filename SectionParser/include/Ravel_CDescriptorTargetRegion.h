@@ -1,4 +1,4 @@
-// Target region descriptor (tag 0xC6, ARIB STD-B10 Part 2):
+// Target region descriptor (tag 0xC6, ARIB STD-B10):
 //   region_spec_type     8
 //   target_region_spec   descriptor_length - 1 bytes, kept as they are
 #ifndef RAVEL_CDESCRIPTORTARGETREGION_H
@@ -22,7 +22,7 @@ class RavelCTargetRegionDescriptor : public RavelCDescriptorBase {
   const char* GetRegionSpec() const { return pRegionSpec; }
   unsigned char GetRegionSpecType() const { return iRegionSpecType; }
 
-  // malloc'd, (length - 1) mod 256 + 1 bytes: the spec bytes and a closing 0.
+  // malloc'd, (length - 1) mod 256 + 1 bytes: the region bytes and a closing 0.
   char* pRegionSpec;
   unsigned char iRegionSpecType;
 
