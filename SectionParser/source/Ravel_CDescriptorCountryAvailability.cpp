@@ -1,0 +1,63 @@
+#include "Ravel_CDescriptorCountryAvailability.h"
+
+#include "Ravel_RecordList.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorCountryAvailability");
+
+const RavelCDescriptorKind RavelCCountryAvailabilityDescriptor::kKind = {
+    0x49, "Country Availabilty Descriptor",
+    "This Descriptor isn't Country Availability Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Country Availability Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+
+RavelCCountryAvailabilityDescriptor::RavelCCountryAvailabilityDescriptor(unsigned char* raw)
+    : iCountryAvailabilityFlag(0), aCountryCodes() {
+  ParseRawData(raw);
+}
+
+RavelCCountryAvailabilityDescriptor::RavelCCountryAvailabilityDescriptor(RavelCCountryAvailabilityDescriptor& other)
+    : RavelCDescriptorBase(other), iCountryAvailabilityFlag(0), aCountryCodes() {
+  *this = other;
+}
+
+RavelCCountryAvailabilityDescriptor& RavelCCountryAvailabilityDescriptor::operator=(
+    RavelCCountryAvailabilityDescriptor& other) {
+  if (this == &other) return *this;
+  Release();
+  RavelCDescriptorBase::operator=(other);
+  iCountryAvailabilityFlag = other.iCountryAvailabilityFlag;
+  RavelRecordList_AppendCopies(aCountryCodes, other.aCountryCodes);
+  return *this;
+}
+
+RavelCCountryAvailabilityDescriptor::~RavelCCountryAvailabilityDescriptor() { Release(); }
+
+void RavelCCountryAvailabilityDescriptor::Release() {
+  RavelRecordList_DeleteAll(aCountryCodes);
+  iCountryAvailabilityFlag = 0;
+}
+
+int RavelCCountryAvailabilityDescriptor::ParseRawData(unsigned char* raw) {
+  Release();
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) return result;
+  iCountryAvailabilityFlag = static_cast<unsigned char>(raw[2] >> 7);  // x.......
+  // Steps of 3 while the code starts inside the body; a code holding a 0 byte
+  // is shorter than 3 letters and leaves its record empty.
+  for (int position = 3; position < 2 + iDescriptorLength; position += 3) {
+    char code[4] = {static_cast<char>(raw[position]), static_cast<char>(raw[position + 1]),
+                    static_cast<char>(raw[position + 2]), '\0'};
+    aCountryCodes.Append(new RavelCCountryCode(code));
+  }
+  return kRavelOk;
+}
+
+void RavelCCountryAvailabilityDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Ability flag = %d\n", iCountryAvailabilityFlag);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Codes: \n");
+  for (int i = 0; i < aCountryCodes.iCount; ++i) {
+    RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t    %s\n", aCountryCodes.ipArray[i]->szCountryCode);
+  }
+}

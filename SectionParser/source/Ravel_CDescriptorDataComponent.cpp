@@ -1,0 +1,43 @@
+#include "Ravel_CDescriptorDataComponent.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorDataComponent");
+
+const RavelCDescriptorKind RavelCDataComponentDescriptor::kKind = {
+    0xFD, "Data Component Descriptor", "This Descriptor isn't Data Component Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Data Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+
+RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(unsigned char* raw) : iDataComponentId(0) {
+  ParseRawData(raw);
+}
+
+RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(RavelCDataComponentDescriptor& other)
+    : RavelCDescriptorBase(other), iDataComponentId(0) {
+  *this = other;
+}
+
+RavelCDataComponentDescriptor& RavelCDataComponentDescriptor::operator=(RavelCDataComponentDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iDataComponentId = other.iDataComponentId;
+  return *this;
+}
+
+RavelCDataComponentDescriptor::~RavelCDataComponentDescriptor() {}
+
+int RavelCDataComponentDescriptor::ParseRawData(unsigned char* raw) {
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) {
+    iDataComponentId = 0;
+    return result;
+  }
+  iDataComponentId = RavelRead16(raw + 2);
+  return kRavelOk;
+}
+
+void RavelCDataComponentDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiDataComponentId=[0x%04x]\n", iDataComponentId);
+}
