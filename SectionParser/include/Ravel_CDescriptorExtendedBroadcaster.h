@@ -1,4 +1,4 @@
-// Extended broadcaster descriptor (tag 0xCE, ARIB STD-B10 Part 2, extended_broadcaster_descriptor):
+// Extended broadcaster descriptor (tag 0xCE, ARIB STD-B10, extended_broadcaster_descriptor):
 //   broadcaster_type 4 | reserved 4
 //   broadcaster_type 1 or 2:
 //     terrestrial_broadcaster_id (or terrestrial_sound_broadcaster_id) 16

@@ -1,4 +1,4 @@
-// Linkage descriptor (tag 0x4A, ARIB STD-B10 Part 2 / ABNT NBR 15603-2, linkage_descriptor):
+// Linkage descriptor (tag 0x4A, ARIB STD-B10 / ABNT NBR 15603-2, linkage_descriptor):
 //   transport_stream_id 16 | original_network_id 16 | service_id 16 | linkage_type 8
 //   private_data_byte ... (ignored)
 #ifndef RAVEL_CDESCRIPTORLINKAGE_H

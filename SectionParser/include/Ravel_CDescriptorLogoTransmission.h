@@ -1,4 +1,4 @@
-// Logo transmission descriptor (tag 0xCF, ARIB STD-B10 Part 2 / ABNT NBR 15603-2,
+// Logo transmission descriptor (tag 0xCF, ARIB STD-B10 / ABNT NBR 15603-2,
 // logo_transmission_descriptor):
 //   logo_transmission_type 8
 //   type 1: reserved 7 | logo_id 9 | reserved 4 | logo_version 12 | download_data_id 16

@@ -1,4 +1,4 @@
-// Partial reception descriptor (tag 0xFB, ARIB STD-B10 Part 2 / ABNT NBR 15603-2,
+// Partial reception descriptor (tag 0xFB, ARIB STD-B10 / ABNT NBR 15603-2,
 // partial_reception_descriptor):
 //   { service_id 16 } ...
 // Only the high byte of each service_id is kept (see ParseRawData).

@@ -1,4 +1,4 @@
-// Service descriptor (tag 0x48, ARIB STD-B10 Part 2 / ABNT NBR 15603-2, service_descriptor):
+// Service descriptor (tag 0x48, ARIB STD-B10 / ABNT NBR 15603-2, service_descriptor):
 //   service_type 8 | service_provider_name_length 8 | provider name bytes
 //   service_name_length 8 | service name bytes
 #ifndef RAVEL_CDESCRIPTORSERVICE_H

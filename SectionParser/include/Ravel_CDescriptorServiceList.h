@@ -1,4 +1,4 @@
-// Service list descriptor (tag 0x41, ARIB STD-B10 Part 2 / ABNT NBR 15603-2, service_list_descriptor):
+// Service list descriptor (tag 0x41, ARIB STD-B10 / ABNT NBR 15603-2, service_list_descriptor):
 //   { service_id 16 | service_type 8 } repeated descriptor_length / 3 times
 #ifndef RAVEL_CDESCRIPTORSERVICELIST_H
 #define RAVEL_CDESCRIPTORSERVICELIST_H

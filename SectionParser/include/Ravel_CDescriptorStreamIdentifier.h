@@ -1,4 +1,4 @@
-// Stream identifier descriptor (tag 0x52, ARIB STD-B10 Part 2 / ABNT NBR 15603-2,
+// Stream identifier descriptor (tag 0x52, ARIB STD-B10 / ABNT NBR 15603-2,
 // stream_identifier_descriptor):
 //   component_tag 8
 #ifndef RAVEL_CDESCRIPTORSTREAMIDENTIFIER_H

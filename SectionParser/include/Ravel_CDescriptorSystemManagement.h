@@ -1,4 +1,4 @@
-// System management descriptor (tag 0xFE, ARIB STD-B10 Part 2 / ABNT NBR 15603-2,
+// System management descriptor (tag 0xFE, ARIB STD-B10 / ABNT NBR 15603-2,
 // system_management_descriptor):
 //   system_management_id 16 (broadcasting_flag 2 | broadcasting_identifier 6 |
 //   additional_broadcasting_identification 8) | additional_identification_info ... (ignored)

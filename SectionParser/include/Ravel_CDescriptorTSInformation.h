@@ -1,4 +1,4 @@
-// TS information descriptor (tag 0xCD, ARIB STD-B10 Part 2 / ABNT NBR 15603-2,
+// TS information descriptor (tag 0xCD, ARIB STD-B10 / ABNT NBR 15603-2,
 // ts_information_descriptor):
 //   remote_control_key_id 8 | length_of_ts_name 6 | transmission_type_count 2
 //   ts_name_char ... | transmission type records (see RavelCTxType), back to back

@@ -1,4 +1,4 @@
-// Terrestrial delivery system descriptor (tag 0xFA, ARIB STD-B10 Part 2 / ABNT NBR 15603-2,
+// Terrestrial delivery system descriptor (tag 0xFA, ARIB STD-B10 / ABNT NBR 15603-2,
 // terrestrial_delivery_system_descriptor):
 //   area_code 12 | guard_interval 2 | transmission_mode 2 | { frequency 16 } ...
 // Under the Brazilian rules the upper five bits of the area code are the state

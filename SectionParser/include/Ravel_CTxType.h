@@ -1,4 +1,4 @@
-// One transmission-type record of the TS information descriptor (ARIB STD-B10 Part 2,
+// One transmission-type record of the TS information descriptor (ARIB STD-B10,
 // ts_information_descriptor loop):
 //   transmission_type_info 8 | num_of_service 8 | { service_id 16 } num_of_service times
 // The next record follows right after the last service_id.
