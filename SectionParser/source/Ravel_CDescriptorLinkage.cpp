@@ -1,0 +1,55 @@
+#include "Ravel_CDescriptorLinkage.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorLinkage");
+
+const RavelCDescriptorKind RavelCLinkageDescriptor::kKind = {
+    0x4A, "Linkage Descriptor", "This Descriptor isn't Linkage Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Linkage Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+
+RavelCLinkageDescriptor::RavelCLinkageDescriptor(unsigned char* raw)
+    : iTransportStreamId(0), iOriginalNetworkId(0), iServiceId(0), iLinkageType(0) {
+  ParseRawData(raw);
+}
+
+RavelCLinkageDescriptor::RavelCLinkageDescriptor(RavelCLinkageDescriptor& other)
+    : RavelCDescriptorBase(other), iTransportStreamId(0), iOriginalNetworkId(0), iServiceId(0), iLinkageType(0) {
+  *this = other;
+}
+
+RavelCLinkageDescriptor& RavelCLinkageDescriptor::operator=(RavelCLinkageDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iTransportStreamId = other.iTransportStreamId;
+  iOriginalNetworkId = other.iOriginalNetworkId;
+  iServiceId = other.iServiceId;
+  iLinkageType = other.iLinkageType;
+  return *this;
+}
+
+RavelCLinkageDescriptor::~RavelCLinkageDescriptor() {}
+
+int RavelCLinkageDescriptor::ParseRawData(unsigned char* raw) {
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) {
+    iTransportStreamId = 0;
+    iOriginalNetworkId = 0;
+    iServiceId = 0;
+    iLinkageType = 0;
+    return result;
+  }
+  iTransportStreamId = RavelRead16(raw + 2);
+  iOriginalNetworkId = RavelRead16(raw + 4);
+  iServiceId = RavelRead16(raw + 6);
+  iLinkageType = raw[8];
+  return kRavelOk;
+}
+
+void RavelCLinkageDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP,
+              "\tTransportStreamId=[0x%04x], OrginalNetworkId=[0x%04x], ServiceId=[0x%04x], LinkageType=[0x%02x]\n",
+              iTransportStreamId, iOriginalNetworkId, iServiceId, iLinkageType);
+}

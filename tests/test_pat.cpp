@@ -1,0 +1,323 @@
+// Program association table.
+#include <gtest/gtest.h>
+
+#include <algorithm>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "Captures.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CTablePAT.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kWarning = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+typedef std::pair<unsigned int, unsigned int> Program;  // program_number, PID
+typedef std::vector<Program> Programs;
+
+Bytes PatBody(const Programs& programs) {
+  Bytes body;
+  for (const Program& p : programs) {
+    sb::Append(body, sb::U16(p.first));
+    sb::Append(body, sb::U16(0xE000 | p.second));  // reserved bits set, as broadcast
+  }
+  return body;
+}
+
+Bytes PatSection(const Programs& programs, uint16_t transportStreamId = 0x7ED0, uint8_t version = 1) {
+  sb::SectionOptions options;
+  options.tableId = 0x00;
+  options.tableIdExtension = transportStreamId;
+  options.version = version;
+  options.privateIndicator = false;
+  return sb::LongSection(options, PatBody(programs));
+}
+
+Programs ListOf(RavelCPAT& pat) {
+  Programs list;
+  for (int i = 0; i < pat.GetProgramCount(); ++i) {
+    RavelCPMTInfo* info = pat.GetPMTInfo(i);
+    list.push_back(Program(info->GetProgramNumber(), info->GetPID()));
+  }
+  return list;
+}
+
+}  // namespace
+
+TEST(PATProgramList, SortsByProgramNumberAndPutsTheFirstOneSegPMTLast) {
+  struct Case {
+    const char* label;
+    Programs section;
+    Programs list;
+    unsigned int networkPid;
+  } cases[] = {
+      {"sorted by program number", {{3, 0x103}, {1, 0x101}, {2, 0x102}}, {{1, 0x101}, {2, 0x102}, {3, 0x103}},
+       0xFFFF},
+      {"first one-seg PMT last, a later one sorted in",
+       {{5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}, {2, 0x1FCA}},
+       {{2, 0x1FCA}, {3, 0x0101}, {5, 0x0100}, {1, 0x1FC8}},
+       0xFFFF},
+      {"the one-seg range ends at 0x1FCF",
+       {{9, 0x1FC7}, {8, 0x1FD0}, {7, 0x1FCF}, {6, 0x0200}},
+       {{6, 0x0200}, {8, 0x1FD0}, {9, 0x1FC7}, {7, 0x1FCF}},
+       0xFFFF},
+      {"equal program numbers keep their arrival order",
+       {{4, 0x0100}, {2, 0x0200}, {4, 0x0101}, {4, 0x1FC9}, {4, 0x0102}},
+       {{2, 0x0200}, {4, 0x0100}, {4, 0x0101}, {4, 0x0102}, {4, 0x1FC9}},
+       0xFFFF},
+      {"program 0 gives the network PID and no entry",
+       {{0, 0x0010}, {0x4801, 0x03F0}, {0x4800, 0x01F0}},
+       {{0x4800, 0x01F0}, {0x4801, 0x03F0}},
+       0x0010},
+      {"only the network PID", {{0, 0x1FFF}}, {}, 0x1FFF},
+      {"a lone one-seg PMT", {{0x4980, 0x1FC8}}, {{0x4980, 0x1FC8}}, 0xFFFF},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = PatSection(c.section);
+    TraceRecorder recorder;
+    RavelCPAT pat(section.data());
+    EXPECT_TRUE(recorder.Lines().empty());
+    EXPECT_EQ(c.list, ListOf(pat));
+    EXPECT_EQ(c.networkPid, pat.GetNetworkPID());
+    EXPECT_STREQ("PAT", pat.sTableName.GetString());
+    EXPECT_EQ(0x7ED0, pat.iTableIdExtension);
+  }
+}
+
+TEST(PATParse, RefusesNullBadCrcAndForeignTableIds) {
+  Bytes good = PatSection({{1, 0x101}});
+  sb::SectionOptions corruptOptions;
+  corruptOptions.corruptCrc = true;
+  Bytes badCrc = sb::LongSection(corruptOptions, PatBody({{1, 0x101}}));
+  sb::SectionOptions pmtOptions;
+  pmtOptions.tableId = 0x02;
+  pmtOptions.tableIdExtension = 0x4800;
+  Bytes pmtId = sb::LongSection(pmtOptions, PatBody({{1, 0x101}}));
+  sb::SectionOptions nitOptions;
+  nitOptions.tableId = 0x40;
+  Bytes nitId = sb::LongSection(nitOptions, PatBody({{1, 0x101}}));
+  sb::SectionOptions bothOptions = pmtOptions;
+  bothOptions.corruptCrc = true;
+  Bytes bothBad = sb::LongSection(bothOptions, PatBody({{1, 0x101}}));
+
+  struct Case {
+    const char* label;
+    Bytes* section;
+    int result;
+    TraceLines traces;
+    unsigned char tableId;  // after the call
+    unsigned short tableIdExtension;
+  } cases[] = {
+      {"null", nullptr, kRavelErrInvalidArgument, {}, 0x00, 0x7ED0},  // the header is not looked at
+      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "PAT Section: CRC Error!\n"}}, 0x00, 0x7ED0},
+      {"PMT table_id, printed in decimal", &pmtId, kRavelErrInvalidArgument,
+       {{kError, "Table ID isn't for PAT! Table ID=[2]\n"}}, 0x02, 0x4800},
+      {"NIT table_id, printed in decimal", &nitId, kRavelErrInvalidArgument,
+       {{kError, "Table ID isn't for PAT! Table ID=[64]\n"}}, 0x40, 0x0001},
+      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
+       {{kWarning, "PAT Section: CRC Error!\n"}}, 0x00, 0x7ED0},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCPAT pat(good.data());
+    ASSERT_EQ(1, pat.GetProgramCount());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, pat.ParseRawData(c.section ? c.section->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(0, pat.GetProgramCount());
+    if (c.section == nullptr) continue;
+    EXPECT_EQ(c.tableId, pat.iTableId);
+    EXPECT_EQ(c.tableIdExtension, pat.iTableIdExtension);
+  }
+}
+
+TEST(PATParse, ConstructedOverNullIsEmptyAndShowsAnUnknownName) {
+  TraceRecorder recorder;
+  RavelCPAT pat(nullptr);
+  EXPECT_TRUE(recorder.Lines().empty());
+  EXPECT_EQ(0, pat.GetProgramCount());
+  EXPECT_EQ(0xFFFF, pat.GetNetworkPID());
+  EXPECT_EQ(0, pat.iSession);
+  EXPECT_EQ(0, pat.iTableId);
+  EXPECT_EQ(0, pat.iSectionLength);
+  EXPECT_EQ(0, pat.iTableIdExtension);
+  EXPECT_EQ(0, pat.iVersionNumber);
+  EXPECT_EQ(0, pat.bCurrentNextIndicator);
+  EXPECT_EQ(0, pat.iLastSectionNumber);
+  pat.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, "#################################################\n"},
+                {kDump, "#### PAT Table Information\n"},
+                {kDump, "# Header Information\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[Unknown]\n"},
+                {kDump, "Section syntax indicator=[0], Section length=[0], Any Identifier(?)=[0x0000]\n"},
+                {kDump, "Version number=[0], Current next indicator=[0], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, "# Body Information\n"},
+                {kDump, "The number of PMT Table Info=[0]\n"},
+                {kDump, "#################################################\n"},
+            }),
+            recorder.Lines());
+}
+
+TEST(PATParse, EntriesAreReadInFoursUntilTheFirstCrcByte) {
+  // section_length 9: no body, nothing read. From 10 on, entries start at byte 8
+  // and every 4 bytes while the start lies before the first CRC byte, so a
+  // trailing partial entry is read with its last bytes taken from the CRC_32.
+  struct Case {
+    Bytes body;
+    unsigned short sectionLength;
+    int entriesRead;
+  } cases[] = {
+      {Bytes(), 9, 0},
+      {Bytes{0x00}, 10, 1},
+      {Bytes{0x12, 0x34}, 11, 1},
+      {Bytes{0x00, 0x05, 0xE1}, 12, 1},
+      {Bytes{0x00, 0x05, 0xE1, 0x23}, 13, 1},
+      {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00}, 14, 2},
+      {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00, 0x06, 0xE1}, 16, 2},
+      {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00, 0x06, 0xE1, 0x24}, 17, 2},
+      {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00, 0x06, 0xE1, 0x24, 0x00}, 18, 3},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.sectionLength);
+    sb::SectionOptions options;
+    Bytes section = sb::LongSection(options, c.body);
+    TraceRecorder recorder;
+    RavelCPAT pat(section.data());
+    EXPECT_TRUE(recorder.Lines().empty());
+    ASSERT_EQ(c.sectionLength, pat.iSectionLength);
+    Programs expected;
+    unsigned int networkPid = 0xFFFF;
+    for (int i = 0; i < c.entriesRead; ++i) {
+      unsigned int number = RavelRead16(&section[8 + 4 * i]);
+      unsigned int pid = RavelRead16(&section[10 + 4 * i]) & 0x1FFF;
+      if (number == 0) {
+        networkPid = pid;
+      } else {
+        expected.push_back(Program(number, pid));
+      }
+    }
+    std::stable_sort(expected.begin(), expected.end(),
+                     [](const Program& a, const Program& b) { return a.first < b.first; });
+    EXPECT_EQ(expected, ListOf(pat));
+    EXPECT_EQ(networkPid, pat.GetNetworkPID());
+  }
+}
+
+TEST(PATParse, ReparseReplacesTheListButKeepsAnEarlierNetworkPid) {
+  Bytes first = PatSection({{0, 0x0010}, {1, 0x0101}, {2, 0x1FC8}, {3, 0x0103}});
+  Bytes second = PatSection({{7, 0x0700}, {6, 0x0600}}, 0x1234, 2);
+  Bytes third = PatSection({{0, 0x0020}});
+  RavelCPAT pat(first.data());
+  ASSERT_EQ(3, pat.GetProgramCount());
+  EXPECT_EQ(kRavelOk, pat.ParseRawData(second.data()));
+  EXPECT_EQ((Programs{{6, 0x0600}, {7, 0x0700}}), ListOf(pat));
+  EXPECT_EQ(0x0010, pat.GetNetworkPID());
+  EXPECT_EQ(0x1234, pat.iTableIdExtension);
+  EXPECT_EQ(2, pat.iVersionNumber);
+  EXPECT_EQ(kRavelOk, pat.ParseRawData(third.data()));
+  EXPECT_EQ(0, pat.GetProgramCount());
+  EXPECT_EQ(0x0020, pat.GetNetworkPID());
+}
+
+TEST(PATCopy, CopiesHeaderNameNetworkPidAndEveryProgram) {
+  Bytes section = PatSection({{0, 0x0010}, {5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}});
+  Bytes other = PatSection({{9, 0x0900}, {8, 0x0800}, {0, 0x0030}}, 0x0001, 7);
+  std::unique_ptr<RavelCPAT> source(new RavelCPAT(section.data()));
+  source->iSession = 0x5A;
+  const Programs programs = ListOf(*source);
+
+  RavelCPAT constructed(*source);
+  RavelCPAT assigned(other.data());
+  assigned = *source;
+  source.reset();
+  for (RavelCPAT* copy : {&constructed, &assigned}) {
+    EXPECT_EQ(programs, ListOf(*copy));
+    EXPECT_EQ(0x0010, copy->GetNetworkPID());
+    EXPECT_EQ(0x5A, copy->iSession);
+    EXPECT_EQ(0x00, copy->iTableId);
+    EXPECT_EQ(0x7ED0, copy->iTableIdExtension);
+    EXPECT_EQ(1, copy->iVersionNumber);
+    EXPECT_EQ(section.size() - 3, copy->iSectionLength);
+    EXPECT_STREQ("PAT", copy->sTableName.GetString());
+  }
+  // Assigning a table to itself clears its programs before the copy.
+  assigned = assigned;
+  EXPECT_EQ(0, assigned.GetProgramCount());
+  EXPECT_EQ(0x0010, assigned.GetNetworkPID());
+}
+
+TEST(PATShow, DumpsTheListAndEachEntryAtItsOwnMask) {
+  Bytes section = PatSection({{0, 0x0010}, {5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}});
+  RavelCPAT pat(section.data());
+  TraceRecorder recorder;
+  pat.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, "#################################################\n"},
+                {kDump, "#### PAT Table Information\n"},
+                {kDump, "# Header Information\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[PAT]\n"},
+                {kDump, "Section syntax indicator=[1], Section length=[25], Any Identifier(?)=[0x7ed0]\n"},
+                {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, "# Body Information\n"},
+                {kDump, "The number of PMT Table Info=[3]\n"},
+                {kDump, "[0]th Table Info: Program Number=[3], PID=[0x101]\n"},
+                {kDump, "[1]th Table Info: Program Number=[5], PID=[0x100]\n"},
+                {kDump, "[2]th Table Info: Program Number=[1], PID=[0x1fc8]\n"},
+                {kDump, "#################################################\n"},
+            }),
+            recorder.Lines());
+  recorder.Clear();
+  pat.GetPMTInfo(2)->Show();
+  EXPECT_EQ((TraceLines{{kWarning, "Program Number=[1], PID=[8136]\n"}}), recorder.Lines());
+}
+
+TEST(PMTInfo, ReadsProgramNumberAndThirteenBitPid) {
+  struct Case {
+    Bytes entry;
+    int result;
+    unsigned short number, pid;
+  } cases[] = {
+      {Bytes{0x48, 0x00, 0xE1, 0xF0}, kRavelOk, 0x4800, 0x01F0},
+      {Bytes{0xFF, 0xFF, 0xFF, 0xFF}, kRavelOk, 0xFFFF, 0x1FFF},
+      {Bytes{0x00, 0x01, 0x1F, 0xC8}, kRavelOk, 0x0001, 0x1FC8},
+      {Bytes(), kRavelErrInvalidArgument, 0, 0},
+  };
+  for (const Case& c : cases) {
+    Bytes previous{0x12, 0x34, 0x05, 0x67};
+    RavelCPMTInfo info(previous.data());
+    Bytes entry = c.entry;
+    EXPECT_EQ(c.result, info.ParseRawData(entry.empty() ? nullptr : entry.data()));
+    EXPECT_EQ(c.number, info.GetProgramNumber());
+    EXPECT_EQ(c.pid, info.GetPID());
+  }
+}
+
+TEST(PATCapture, JapaneseChannelListsItsOneSegPMTLast) {
+  Bytes contents;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", contents);
+  std::vector<Bytes> sections = captures::SplitSections(contents);
+  Bytes* patSection = nullptr;
+  for (Bytes& s : sections) {
+    if (!s.empty() && s[0] == 0x00) {
+      patSection = &s;
+      break;
+    }
+  }
+  ASSERT_NE(nullptr, patSection) << "no PAT section in the capture";
+  TraceRecorder recorder;
+  RavelCPAT pat(patSection->data());
+  EXPECT_TRUE(recorder.Lines().empty());
+  EXPECT_EQ(0x7ED0, pat.iTableIdExtension);
+  EXPECT_EQ(0x0010, pat.GetNetworkPID());
+  EXPECT_EQ((Programs{{0x4800, 0x01F0}, {0x4801, 0x03F0}, {0xFFF0, 0x1CF0}, {0x4980, 0x1FC8}}), ListOf(pat));
+}
