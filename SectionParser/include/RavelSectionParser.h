@@ -24,6 +24,7 @@
 // Tables.
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTableBase.h"
+#include "Ravel_CTablePAT.h"
 
 // DSM-CC data carousel.
 
@@ -38,17 +39,28 @@
 #include "Ravel_CDescriptorCopyright.h"
 #include "Ravel_CDescriptorCountryAvailability.h"
 #include "Ravel_CDescriptorDataComponent.h"
+#include "Ravel_CDescriptorExtendedBroadcaster.h"
 #include "Ravel_CDescriptorExtendedEvent.h"
 #include "Ravel_CDescriptorGingaApp.h"
 #include "Ravel_CDescriptorGingaAppDataComponent.h"
 #include "Ravel_CDescriptorGingaAppLoc.h"
+#include "Ravel_CDescriptorLinkage.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
+#include "Ravel_CDescriptorLogoTransmission.h"
 #include "Ravel_CDescriptorNetworkName.h"
 #include "Ravel_CDescriptorParentalRating.h"
+#include "Ravel_CDescriptorPartialReception.h"
 #include "Ravel_CDescriptorSeries.h"
+#include "Ravel_CDescriptorService.h"
+#include "Ravel_CDescriptorServiceList.h"
 #include "Ravel_CDescriptorShortEvent.h"
+#include "Ravel_CDescriptorStreamIdentifier.h"
+#include "Ravel_CDescriptorSystemManagement.h"
+#include "Ravel_CDescriptorTSInformation.h"
 #include "Ravel_CDescriptorTargetRegion.h"
+#include "Ravel_CDescriptorTerrDeliverySystem.h"
 #include "Ravel_CObjectCarouselTransmissionFormat.h"
+#include "Ravel_CTxType.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_FixedText.h"
 
