@@ -60,10 +60,10 @@ int RavelCPCR::ParseRawData(unsigned char* packet) {
   // The flags are read from the length byte itself.
   RavelCBitInputStream reader(adaptation, 2, 0);
   unsigned char status = 0;
-  reader.Skip(3);                                  // 111xxxxx
+  reader.Skip(3);                                         // 111xxxxx
   const unsigned char pcrFlag = reader.ReadBit(status);   // xxx1xxxx
   const unsigned char opcrFlag = reader.ReadBit(status);  // xxxx1xxx
-  reader.Skip(3);                                  // xxxxx111
+  reader.Skip(3);                                         // xxxxx111
 
   if (pcrFlag) {
     mPCR = ClockOf(adaptation);

@@ -39,9 +39,9 @@ int RavelCTSPacket::ParseRawData(unsigned char* packet) {
   }
 
   const unsigned char flags = packet[1];
-  bTransportErrorIndicator = (flags >> 7) & 0x01;     // 1xxxxxxx
-  bPayloadUnitStartIndicator = (flags >> 6) & 0x01;   // x1xxxxxx
-  bTransportPriority = (flags >> 5) & 0x01;           // xx1xxxxx
+  bTransportErrorIndicator = (flags >> 7) & 0x01;                         // 1xxxxxxx
+  bPayloadUnitStartIndicator = (flags >> 6) & 0x01;                       // x1xxxxxx
+  bTransportPriority = (flags >> 5) & 0x01;                               // xx1xxxxx
   iPID = static_cast<unsigned short>(((flags & 0x1F) << 8) | packet[2]);  // xxx11111 + 8 bits
   const unsigned char control = packet[3];
   iTransportScramblingControl = (control >> 6) & 0x03;  // 11xxxxxx
@@ -55,8 +55,7 @@ int RavelCTSPacket::ParseRawData(unsigned char* packet) {
       // the payload position lies beyond the packet. The address is formed as
       // an integer so that no pointer leaves the buffer; readers check it.
       const unsigned int adaptationLength = packet[4];
-      pPayloadStartPtr =
-          reinterpret_cast<unsigned char*>(reinterpret_cast<uintptr_t>(packet) + 5u + adaptationLength);
+      pPayloadStartPtr = reinterpret_cast<unsigned char*>(reinterpret_cast<uintptr_t>(packet) + 5u + adaptationLength);
       return kRavelOk;
     }
     case 2:

@@ -290,9 +290,8 @@ int RavelCTSPktStore::AddTSPacket(const unsigned char* packet, RavelCSectionData
     GetAssembleData(out);
     result = 1;
   } else {
-    RAVEL_TRACE(RAVEL_PARSER_ERROR,
-                "Section Length Invalid!! Section Len=[%d], Cur Size=[%d], Remained Size=[%d]\n", iSectionLen,
-                iCurBufSize, pointerField);
+    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Section Length Invalid!! Section Len=[%d], Cur Size=[%d], Remained Size=[%d]\n",
+                iSectionLen, iCurBufSize, pointerField);
     Reset();
   }
 
@@ -341,8 +340,8 @@ void RavelCTSPktStore::GetAssembleData(RavelCSectionData& out) {
   if (copied < capacity) memset(buffer + copied, 0, static_cast<size_t>(capacity - copied));
   out.Append(buffer, iSectionLen);
   if (copied != iCurBufSize) {
-    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Data size not matched! bufPos=[%d], iCurBufSize=[%d], iSectionLen=[%d]\n",
-                copied, iCurBufSize, iSectionLen);
+    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Data size not matched! bufPos=[%d], iCurBufSize=[%d], iSectionLen=[%d]\n", copied,
+                iCurBufSize, iSectionLen);
   }
   Reset();
 }
