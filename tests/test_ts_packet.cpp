@@ -1,0 +1,227 @@
+// TS packet header: field decoding, the packed byte, locations and failures.
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <cstdio>
+
+#include "Ravel_CTSPacket.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kError = 0x80000020u;
+
+// A packet with the given header bytes; byte 4 is `byte4`, the rest a pattern.
+Bytes RawPacket(uint8_t b1, uint8_t b2, uint8_t b3, uint8_t byte4 = 0x00, uint8_t sync = 0x47) {
+  Bytes p(188);
+  for (size_t i = 0; i < p.size(); ++i) p[i] = static_cast<uint8_t>(i * 7 + 3);
+  p[0] = sync;
+  p[1] = b1;
+  p[2] = b2;
+  p[3] = b3;
+  p[4] = byte4;
+  return p;
+}
+
+// Offset of a location in the packet, -1 for null.
+long OffsetIn(const Bytes& packet, const unsigned char* at) {
+  if (at == nullptr) return -1;
+  return static_cast<long>(reinterpret_cast<uintptr_t>(at) - reinterpret_cast<uintptr_t>(packet.data()));
+}
+
+std::string Hex32(const void* p) {
+  char text[16];
+  std::snprintf(text, sizeof(text), "0x%08x", static_cast<unsigned int>(reinterpret_cast<uintptr_t>(p)));
+  return text;
+}
+
+}  // namespace
+
+TEST(TSPacketHeader, DecodesFieldsAndLocatesAdaptationFieldAndPayload) {
+  struct Case {
+    const char* name;
+    uint8_t b1, b2, b3, byte4;
+    int tei, pusi, priority;
+    unsigned int pid;
+    int scrambling, adaptation, counter;
+    long adaptationAt, payloadAt;  // -1: null
+  } cases[] = {
+      {"payload only, section start", 0x40, 0x00, 0x10, 0x00, 0, 1, 0, 0x0000, 0, 1, 0, -1, 4},
+      {"all flags and widest values", 0xBF, 0xFF, 0xDF, 0x00, 1, 0, 1, 0x1FFF, 3, 1, 15, -1, 4},
+      {"adaptation length 0: payload at byte 5", 0x01, 0x23, 0x3A, 0x00, 0, 0, 0, 0x0123, 0, 3, 10, 4, 5},
+      {"adaptation length 7", 0x07, 0x6A, 0x75, 0x07, 0, 0, 0, 0x076A, 1, 3, 5, 4, 12},
+      {"adaptation length 183: payload at the end", 0x00, 0x11, 0x30, 183, 0, 0, 0, 0x0011, 0, 3, 0, 4, 188},
+      {"adaptation length 200: beyond the packet", 0x00, 0x11, 0x31, 200, 0, 0, 0, 0x0011, 0, 3, 1, 4, 205},
+      {"adaptation field only", 0x40, 0x00, 0x2F, 0x07, 0, 1, 0, 0x0000, 0, 2, 15, 4, -1},
+      {"scrambled and erroneous packets still parse", 0x9F, 0xC8, 0x93, 0x00, 1, 0, 0, 0x1FC8, 2, 1, 3, -1, 4},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    TraceRecorder recorder;
+    Bytes packet = RawPacket(c.b1, c.b2, c.b3, c.byte4);
+    RavelCTSPacket header(nullptr);
+    EXPECT_EQ(kRavelOk, header.ParseRawData(packet.data()));
+    EXPECT_EQ(c.tei, header.bTransportErrorIndicator);
+    EXPECT_EQ(c.pusi, header.bPayloadUnitStartIndicator);
+    EXPECT_EQ(c.priority, header.bTransportPriority);
+    EXPECT_EQ(c.pid, header.iPID);
+    EXPECT_EQ(c.scrambling, header.iTransportScramblingControl);
+    EXPECT_EQ(c.adaptation, header.iAdaptationFieldControl);
+    EXPECT_EQ(c.counter, header.iContinuityCounter);
+    EXPECT_EQ(c.adaptationAt, OffsetIn(packet, header.pAdaptionFieldStartPtr));
+    EXPECT_EQ(c.payloadAt, OffsetIn(packet, header.pPayloadStartPtr));
+    EXPECT_TRUE(recorder.Records().empty());
+  }
+}
+
+TEST(TSPacketHeader, PacksScramblingAdaptationAndCounterIntoOneByte) {
+  // Callers read the byte after the PID: scrambling control in bits 0-1,
+  // adaptation field control in bits 2-3, continuity counter in bits 4-7.
+  struct Case {
+    uint8_t b3;
+    uint8_t packed;
+  } cases[] = {{0x10, 0x04}, {0x5F, 0xF5}, {0xDA, 0xA7}, {0xB1, 0x1E}, {0x3C, 0xCC}};
+  for (const Case& c : cases) {
+    Bytes packet = RawPacket(0x00, 0x20, c.b3, 0x00);
+    RavelCTSPacket header(packet.data());
+    const unsigned char* packedByte = reinterpret_cast<const unsigned char*>(&header.iPID) + sizeof(header.iPID);
+    EXPECT_EQ(c.packed, *packedByte) << std::hex << int(c.b3);
+  }
+  RavelCTSPacket probe(nullptr);
+  EXPECT_LT(reinterpret_cast<const unsigned char*>(&probe.iPID) + sizeof(probe.iPID),
+            reinterpret_cast<const unsigned char*>(&probe.pAdaptionFieldStartPtr));
+  EXPECT_LT(reinterpret_cast<const unsigned char*>(&probe.pAdaptionFieldStartPtr),
+            reinterpret_cast<const unsigned char*>(&probe.pPayloadStartPtr));
+}
+
+TEST(TSPacketHeader, FailuresClearKeepOrPartlyKeepTheMembers) {
+  enum Members { kCleared, kUnchanged, kHeaderKeptPointersNull };
+  struct Case {
+    const char* name;
+    bool nullPacket;
+    uint8_t sync, b1, b2, b3;
+    int result;
+    Members members;
+    TraceLines traces;
+  } cases[] = {
+      {"null packet", true, 0, 0, 0, 0, kRavelErrInvalidArgument, kCleared, {}},
+      {"sync byte 0x48",
+       false,
+       0x48,
+       0x41,
+       0x00,
+       0x13,
+       kRavelErrSyncByte,
+       kUnchanged,
+       {{kError, "Invalid TS Packet Start Byte=[0x48]\n"}}},
+      {"sync byte 0x00",
+       false,
+       0x00,
+       0x41,
+       0x00,
+       0x13,
+       kRavelErrSyncByte,
+       kUnchanged,
+       {{kError, "Invalid TS Packet Start Byte=[0x00]\n"}}},
+      {"reserved adaptation field control",
+       false,
+       0x47,
+       0x81,
+       0x23,
+       0xC9,
+       kRavelErrInvalidArgument,
+       kHeaderKeptPointersNull,
+       {{kError, "Invalid Adaptation Field Control! => 0x0]"}}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    Bytes earlier = RawPacket(0x5F, 0xFE, 0x37, 0x05);  // PUSI, PID 0x1FFE, AF+payload, counter 7
+    RavelCTSPacket header(earlier.data());
+    Bytes packet = RawPacket(c.b1, c.b2, c.b3, 0x00, c.sync);
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, header.ParseRawData(c.nullPacket ? nullptr : packet.data()));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    switch (c.members) {
+      case kCleared:
+        EXPECT_EQ(0, header.bPayloadUnitStartIndicator);
+        EXPECT_EQ(0u, header.iPID);
+        EXPECT_EQ(0, header.iAdaptationFieldControl);
+        EXPECT_EQ(0, header.iContinuityCounter);
+        EXPECT_EQ(nullptr, header.pAdaptionFieldStartPtr);
+        EXPECT_EQ(nullptr, header.pPayloadStartPtr);
+        break;
+      case kUnchanged:
+        EXPECT_EQ(1, header.bPayloadUnitStartIndicator);
+        EXPECT_EQ(0x1FFEu, header.iPID);
+        EXPECT_EQ(3, header.iAdaptationFieldControl);
+        EXPECT_EQ(7, header.iContinuityCounter);
+        EXPECT_EQ(earlier.data() + 4, header.pAdaptionFieldStartPtr);
+        EXPECT_EQ(earlier.data() + 10, header.pPayloadStartPtr);
+        break;
+      case kHeaderKeptPointersNull:
+        EXPECT_EQ(1, header.bTransportErrorIndicator);
+        EXPECT_EQ(0, header.bPayloadUnitStartIndicator);
+        EXPECT_EQ(0x0123u, header.iPID);
+        EXPECT_EQ(3, header.iTransportScramblingControl);
+        EXPECT_EQ(0, header.iAdaptationFieldControl);
+        EXPECT_EQ(9, header.iContinuityCounter);
+        EXPECT_EQ(nullptr, header.pAdaptionFieldStartPtr);
+        EXPECT_EQ(nullptr, header.pPayloadStartPtr);
+        break;
+    }
+  }
+}
+
+TEST(TSPacketHeader, ConstructorParsesAndTracesFromItsSourceFile) {
+  Bytes packet = RawPacket(0x40, 0x10, 0x1C);
+  RavelCTSPacket parsed(packet.data());
+  EXPECT_EQ(0x0010u, parsed.iPID);
+  EXPECT_EQ(12, parsed.iContinuityCounter);
+  EXPECT_EQ(packet.data() + 4, parsed.pPayloadStartPtr);
+
+  TraceRecorder recorder;
+  Bytes bad = RawPacket(0x40, 0x10, 0x1C, 0x00, 0x46);
+  RavelCTSPacket rejected(bad.data());  // the result is dropped; the object stays cleared
+  EXPECT_EQ(0u, rejected.iPID);
+  EXPECT_EQ(nullptr, rejected.pPayloadStartPtr);
+  ASSERT_EQ(1u, recorder.Records().size());
+  EXPECT_EQ("SectionParser/source/Ravel_CTSPacket", recorder.Records()[0].file);
+  EXPECT_EQ("Invalid TS Packet Start Byte=[0x46]\n", recorder.Records()[0].text);
+}
+
+TEST(TSPacketHeader, ShowDumpsTheMembersWithAddressesAsNumbers) {
+  struct Case {
+    uint8_t b1, b2, b3;
+    std::string flagsLine, fieldsLine;
+  } cases[] = {
+      {0xE0, 0x21, 0x75, "Transport Error Indicator=[1], Payload Unit Start Indicator=[1], Transport Pritoriry=[1]\n",
+       "PID=[0x21], Transport Scrambling Control=[1], Adaptation Field Control=[3], Contiuity Index=[5]\n"},
+      {0x07, 0x6A, 0x1F, "Transport Error Indicator=[0], Payload Unit Start Indicator=[0], Transport Pritoriry=[0]\n",
+       "PID=[0x76a], Transport Scrambling Control=[0], Adaptation Field Control=[1], Contiuity Index=[15]\n"},
+  };
+  for (const Case& c : cases) {
+    Bytes packet = RawPacket(c.b1, c.b2, c.b3, 0x02);
+    RavelCTSPacket header(packet.data());
+    TraceRecorder recorder;
+    header.Show();
+    TraceLines expected = {
+        {kDump, "#################################################\n"},
+        {kDump, "#### TS Packet Header Information\n"},
+        {kDump, c.flagsLine},
+        {kDump, c.fieldsLine},
+        {kDump, "Adaptation Field Start Ptr Addr=[" + Hex32(header.pAdaptionFieldStartPtr) +
+                    "], Payload Start Ptr Addr=[" + Hex32(header.pPayloadStartPtr) + "]\n"},
+        {kDump, "#################################################\n"},
+    };
+    EXPECT_EQ(expected, recorder.Lines());
+  }
+  RavelCTSPacket empty(nullptr);
+  TraceRecorder recorder;
+  empty.Show();
+  ASSERT_EQ(6u, recorder.Records().size());
+  EXPECT_EQ("Adaptation Field Start Ptr Addr=[0x00000000], Payload Start Ptr Addr=[0x00000000]\n",
+            recorder.Records()[4].text);
+}
