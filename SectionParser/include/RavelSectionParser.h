@@ -20,6 +20,9 @@
 #include "Ravel_Trace.h"
 
 // Transport stream layer.
+#include "Ravel_CTSPacket.h"
+#include "Ravel_CTSPktAssembler.h"
+#include "Ravel_CPCR.h"
 
 // Tables.
 #include "Ravel_CTableAIT.h"
