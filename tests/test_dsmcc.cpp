@@ -1,0 +1,430 @@
+// DSM-CC data carousel messages: the message header, DSI and DDB.
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <map>
+#include <memory>
+#include <string>
+
+#include "Captures.h"
+#include "Ravel_CArray.h"
+#include "Ravel_CDsmccDDB.h"
+#include "Ravel_CDsmccDSI.h"
+#include "Ravel_CDsmccMsgBase.h"
+#include "Ravel_CNASP.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Util.h"
+#include "SectionReassembly.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kCarouselDump = 0x10000040u;
+const unsigned int kCarouselWarning = 0x40000040u;
+const unsigned int kCarouselError = 0x80000040u;
+
+// dsmccMessageHeader / dsmccDownloadDataHeader with its adaptation bytes.
+Bytes Header(uint16_t messageId, uint32_t transactionId, uint8_t adaptationLength, uint16_t messageLength,
+             uint8_t dsmccType = 0x03) {
+  Bytes h{0x11, dsmccType};
+  sb::Append(h, sb::U16(messageId));
+  sb::Append(h, sb::U32(transactionId));
+  h.push_back(0xFF);  // reserved
+  h.push_back(adaptationLength);
+  sb::Append(h, sb::U16(messageLength));
+  for (int i = 0; i < adaptationLength; ++i) h.push_back(static_cast<uint8_t>(0xA0 + i));
+  return h;
+}
+
+Bytes ServerId(uint32_t carouselId, uint16_t tsid, uint16_t onid, uint16_t sid) {
+  Bytes s{0x00, 0x01};  // AFI, type
+  sb::Append(s, sb::U32(carouselId));
+  sb::Append(s, sb::U32(0x00010203));
+  sb::Append(s, sb::U16(tsid));
+  sb::Append(s, sb::U16(onid));
+  sb::Append(s, sb::U16(sid));
+  sb::Append(s, Bytes{0xEE, 0xEE, 0xEE, 0xEE});  // not read
+  return s;
+}
+
+Bytes Dsi(uint8_t adaptationLength, const Bytes& privateData, uint16_t messageId = 0x1006) {
+  Bytes body = ServerId(0x0000ABCD, 0x0421, 0x0422, 0xE760);
+  sb::Append(body, sb::U16(0));  // compatibilityDescriptorLength
+  sb::Append(body, sb::U16(static_cast<unsigned int>(privateData.size())));
+  sb::Append(body, privateData);
+  Bytes message =
+      Header(messageId, 0x80000002u, adaptationLength, static_cast<uint16_t>(adaptationLength + body.size()));
+  sb::Append(message, body);
+  return message;
+}
+
+Bytes Ddb(uint16_t moduleId, uint8_t version, uint16_t block, const Bytes& data, uint8_t adaptationLength = 0) {
+  Bytes message =
+      Header(0x1003, 0x000000AB, adaptationLength, static_cast<uint16_t>(adaptationLength + 6 + data.size()));
+  sb::Append(message, sb::U16(moduleId));
+  message.push_back(version);
+  message.push_back(0xFF);  // reserved
+  sb::Append(message, sb::U16(block));
+  sb::Append(message, data);
+  return message;
+}
+
+Bytes Pattern(size_t size, uint8_t seed) {
+  Bytes b(size);
+  for (size_t i = 0; i < size; ++i) b[i] = static_cast<uint8_t>(seed + i * 7);
+  return b;
+}
+
+std::string Format(const char* format, int a, int b, int c, int d) {
+  char text[200];
+  std::snprintf(text, sizeof(text), format, a, b, c, d);
+  return text;
+}
+
+}  // namespace
+
+TEST(DsmccHeader, ReadsEveryMessageAndReportsUnknownIdsByTheirDsmccType) {
+  struct Case {
+    uint16_t messageId;
+    uint8_t dsmccType;
+    TraceLines trace;
+  } cases[] = {
+      {0x1002, 0x03, {}},
+      {0x1003, 0x03, {}},
+      {0x1006, 0x03, {}},
+      {0x1001, 0x03, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x03]\n"}}},
+      {0x0000, 0x7F, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x7f]\n"}}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.messageId);
+    Bytes message = Header(c.messageId, 0xFEDCBA98u, 2, 0x1234, c.dsmccType);
+    TraceRecorder recorder;
+    RavelCDsmccBase header(message.data());
+    EXPECT_EQ(c.trace, recorder.Lines());
+    if (!c.trace.empty()) {
+      EXPECT_EQ("SectionParser/source/Ravel_CDsmccMsgBase", recorder.Records()[0].file);
+    }
+    EXPECT_EQ(0x11, header.GetProtocolDiscriminator());
+    EXPECT_EQ(c.dsmccType, header.GetDsmccType());
+    EXPECT_EQ(c.messageId, header.GetMessageId());
+    EXPECT_EQ(0xFEDCBA98u, header.GetTransactionId());
+    EXPECT_EQ(2, header.GetAdaptationLength());
+    EXPECT_EQ(0x1234, header.GetMessageLength());
+    recorder.Clear();
+    EXPECT_EQ(kRavelOk, header.ParseRawData(message.data()));
+    EXPECT_EQ(c.trace, recorder.Lines());
+
+    recorder.Clear();
+    header.Show();
+    char first[160];
+    std::snprintf(first, sizeof(first),
+                  "DSMCC Header: protocolDiscriminator=[0x11], dsmccType=[0x%02x], messageID=[0x%04x]\n", c.dsmccType,
+                  c.messageId);
+    TraceLines dump{
+        {kCarouselDump, first},
+        {kCarouselDump, "DSMCC Header: transaction_id=[0xfedcba98], adaptationLength=[2], messageLength=[4660]\n"}};
+    EXPECT_EQ(dump, recorder.Lines());
+
+    recorder.Clear();
+    EXPECT_EQ(kRavelErrInvalidArgument, header.ParseRawData(nullptr));
+    EXPECT_TRUE(recorder.Records().empty());
+    EXPECT_EQ(0, header.GetMessageId());
+    EXPECT_EQ(0u, header.GetTransactionId());
+    EXPECT_EQ(0, header.GetMessageLength());
+  }
+}
+
+TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
+  struct Case {
+    const char* what;
+    uint8_t adaptationLength;
+    uint16_t messageId;
+    Bytes privateData;
+    TraceLines trace;
+  } cases[] = {
+      {"plain",
+       0,
+       0x1006,
+       Bytes{1, 2, 3},
+       {{kCarouselWarning, "NASP Input Data is NULL!\n"},
+        {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+        {kCarouselWarning, "Private data length [3]\n"}}},
+      // Server id from byte 16 of the message.
+      {"adaptation 4",
+       4,
+       0x1006,
+       Bytes(),
+       {{kCarouselWarning, "NASP Input Data is NULL!\n"},
+        {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+        {kCarouselWarning, "Private data length [0]\n"}}},
+      {"foreign message id",
+       0,
+       0x1001,
+       Bytes{9},
+       {{kCarouselWarning, "NASP Input Data is NULL!\n"},
+        {kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x03]\n"},
+        {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+        {kCarouselWarning, "Private data length [1]\n"}}},
+  };
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes message = Dsi(c.adaptationLength, c.privateData, c.messageId);
+    TraceRecorder recorder;
+    RavelCDsmccDSI dsi(message.data());
+    EXPECT_EQ(c.trace, recorder.Lines());
+    EXPECT_EQ("SectionParser/source/Ravel_CNASP", recorder.Records()[0].file);
+    EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records().back().file);
+    RavelCNASP& nasp = dsi.GetNASP();
+    EXPECT_EQ(0x00, nasp.GetAFI());
+    EXPECT_EQ(0x01, nasp.GetType());
+    EXPECT_EQ(0x0000ABCDu, nasp.GetCarouselId());
+    EXPECT_EQ(0x00010203u, nasp.GetSpecifier());
+    EXPECT_EQ(0x0421, nasp.GetTransportStreamId());
+    EXPECT_EQ(0x0422, nasp.GetOriginalNetworkId());
+    EXPECT_EQ(0xE760, nasp.GetServiceId());
+    EXPECT_EQ(static_cast<int>(c.privateData.size()), dsi.GetPrivateDataLength());
+    // Points into the message itself, after serverId, compatibility descriptor and length.
+    EXPECT_EQ(message.data() + 12 + c.adaptationLength + 24, dsi.GetPrivateData());
+
+    recorder.Clear();
+    dsi.Show();
+    TraceLines dump{
+        {kCarouselDump, Format("DSMCC Header: protocolDiscriminator=[0x%02x], dsmccType=[0x%02x], messageID=[0x%04x]\n",
+                               0x11, 0x03, c.messageId, 0)},
+        {kCarouselDump,
+         Format("DSMCC Header: transaction_id=[0x%08x], adaptationLength=[%d], messageLength=[%d]\n",
+                static_cast<int>(0x80000002u), c.adaptationLength, static_cast<int>(message.size()) - 12, 0)},
+        {kCarouselDump, "\t\tNASP: AFI=[0x00], Type=[0x01], CaourselID=[0x0000abcd], iSpecifier=[0x00010203]\n"},
+        {kCarouselDump,
+         "\t\tNASP(Ginga Service Location): Transport Stream Id=[0x0421], Original Network ID=[0x0422], Service "
+         "ID=[0xe760]\n"}};
+    EXPECT_EQ(dump, recorder.Lines());
+  }
+  TraceRecorder recorder;
+  RavelCDsmccDSI empty(nullptr);
+  TraceLines trace{{kCarouselWarning, "NASP Input Data is NULL!\n"},
+                   {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"}};
+  EXPECT_EQ(trace, recorder.Lines());
+  EXPECT_EQ(0, empty.GetMessageId());
+  EXPECT_EQ(0u, empty.GetNASP().GetCarouselId());
+  recorder.Clear();
+  EXPECT_EQ(kRavelErrInvalidArgument, empty.ParseRawData(nullptr));
+  EXPECT_EQ(TraceLines({{kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"}}), recorder.Lines());
+  RavelCNASP nasp(nullptr);
+  EXPECT_EQ(kRavelErrInvalidArgument, nasp.ParseRawData(nullptr));
+}
+
+TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
+  struct Case {
+    const char* what;
+    size_t size;
+    uint8_t adaptationLength;
+    int result;
+    int blockDataLen;
+    TraceLines trace;
+  } cases[] = {
+      {"empty block", 0, 0, kRavelOk, 0, {}},
+      {"one byte", 1, 0, kRavelOk, 1, {}},
+      {"after an adaptation header", 100, 4, kRavelOk, 100, {}},
+      {"the limit", 4096, 0, kRavelOk, 4096, {}},
+      {"one over the limit",
+       4097,
+       0,
+       kRavelErrCorruptSection,
+       0,
+       {{kCarouselError, "Invalid Block Data Length=[4097]\n"}}},
+      {"over the limit with adaptation",
+       4097,
+       8,
+       kRavelErrCorruptSection,
+       0,
+       {{kCarouselError, "Invalid Block Data Length=[4097]\n"}}},
+  };
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes data = Pattern(c.size, 3);
+    Bytes message = Ddb(0x0102, 7, 9, data, c.adaptationLength);
+    TraceRecorder recorder;
+    RavelCDsmccDDB ddb(nullptr);
+    EXPECT_EQ(c.result, ddb.ParseRawData(message.data()));
+    EXPECT_EQ(c.trace, recorder.Lines());
+    EXPECT_EQ(0x0102, ddb.GetModuleId());
+    EXPECT_EQ(7, ddb.GetModuleVersion());
+    EXPECT_EQ(9, ddb.GetBlockNumber());
+    EXPECT_EQ(c.blockDataLen, ddb.GetBlockDataLen());
+    if (c.result == kRavelOk) {
+      ASSERT_NE(nullptr, ddb.GetBlockData());
+      EXPECT_EQ(0, std::memcmp(data.data(), ddb.GetBlockData(), data.size()));
+      // The block is a copy: the message may go away.
+      EXPECT_TRUE(data.empty() || ddb.GetBlockData() != message.data() + 18 + c.adaptationLength);
+    } else {
+      EXPECT_EQ(nullptr, ddb.GetBlockData());
+    }
+    recorder.Clear();
+    ddb.Show();
+    ASSERT_EQ(3u, recorder.Records().size());
+    EXPECT_EQ(kCarouselDump, recorder.Records()[2].mask);
+    EXPECT_EQ(Format("moduleId=[0x%04x], moduleVersion=[0x%02x], blockNumber=[%d], blockDataLen=[%d]\n", 0x0102, 7, 9,
+                     c.blockDataLen),
+              recorder.Records()[2].text);
+  }
+}
+
+TEST(DsmccDDB, ParsesAgainCopiesDeeplyAndClearsOnNull) {
+  Bytes first = Ddb(1, 1, 0, Pattern(50, 1));
+  Bytes second = Ddb(2, 3, 4, Pattern(20, 9));
+  RavelCDsmccDDB ddb(first.data());
+  ASSERT_EQ(kRavelOk, ddb.ParseRawData(second.data()));
+  EXPECT_EQ(2, ddb.GetModuleId());
+  EXPECT_EQ(20, ddb.GetBlockDataLen());
+  EXPECT_EQ(0, std::memcmp(second.data() + 18, ddb.GetBlockData(), 20));
+
+  RavelCDsmccDDB copy(ddb);
+  EXPECT_EQ(0x1003, copy.GetMessageId());
+  EXPECT_EQ(0xABu, copy.GetTransactionId());
+  EXPECT_EQ(26, copy.GetMessageLength());
+  EXPECT_TRUE(copy == ddb);
+  EXPECT_EQ(20, copy.GetBlockDataLen());
+  EXPECT_NE(ddb.GetBlockData(), copy.GetBlockData());
+  EXPECT_EQ(0, std::memcmp(ddb.GetBlockData(), copy.GetBlockData(), 20));
+
+  RavelCDsmccDDB assigned(first.data());
+  assigned = ddb;
+  EXPECT_EQ(4, assigned.GetBlockNumber());
+  EXPECT_EQ(0, std::memcmp(second.data() + 18, assigned.GetBlockData(), 20));
+  RavelCDsmccDDB refused(nullptr);
+  assigned = refused;
+  EXPECT_EQ(nullptr, assigned.GetBlockData());
+  EXPECT_EQ(0, assigned.GetBlockDataLen());
+
+  EXPECT_EQ(kRavelErrInvalidArgument, ddb.ParseRawData(nullptr));
+  EXPECT_EQ(nullptr, ddb.GetBlockData());
+  EXPECT_EQ(0, ddb.GetModuleId());
+  EXPECT_EQ(0, ddb.GetModuleVersion());
+  EXPECT_EQ(0, ddb.GetBlockNumber());
+  EXPECT_EQ(0, ddb.GetBlockDataLen());
+  EXPECT_EQ(0, ddb.GetMessageId());
+}
+
+TEST(DsmccDDB, OrdersBlocksOfOneModuleVersionOnly) {
+  struct Key {
+    uint16_t module;
+    uint8_t version;
+    uint16_t block;
+  };
+  struct Case {
+    const char* what;
+    Key a, b;
+    bool eq, lt, gt, le, ge;
+  } cases[] = {
+      {"3 before 5", {1, 2, 3}, {1, 2, 5}, false, true, false, true, false},
+      {"5 after 3", {1, 2, 5}, {1, 2, 3}, false, false, true, false, true},
+      {"same block", {1, 2, 3}, {1, 2, 3}, true, false, false, true, true},
+      {"other module", {1, 2, 3}, {4, 2, 5}, false, false, false, false, false},
+      {"other version", {1, 2, 3}, {1, 9, 3}, false, false, false, false, false},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes ma = Ddb(c.a.module, c.a.version, c.a.block, Bytes{1});
+    Bytes mb = Ddb(c.b.module, c.b.version, c.b.block, Bytes{1});
+    RavelCDsmccDDB a(ma.data());
+    RavelCDsmccDDB b(mb.data());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.eq, (a == b) != 0);
+    EXPECT_TRUE(recorder.Records().empty());  // equality never traces
+    EXPECT_EQ(c.lt, (a < b) != 0);
+    EXPECT_EQ(c.gt, (a > b) != 0);
+    EXPECT_EQ(c.le, (a <= b) != 0);
+    EXPECT_EQ(c.ge, (a >= b) != 0);
+    bool sameModule = c.a.module == c.b.module && c.a.version == c.b.version;
+    std::vector<std::string> expected;
+    if (!sameModule) {
+      expected.assign(4, Format("Two Messages are totally different! This module id, version=[%d, %d], Compared "
+                                "One=[%d, %d]\n",
+                                c.a.module, c.a.version, c.b.module, c.b.version));
+    }
+    EXPECT_EQ(expected, recorder.TextsAt(kCarouselWarning));
+    EXPECT_EQ(expected.size(), recorder.Records().size());
+  }
+}
+
+TEST(DsmccDDB, BlocksOfAModuleSortIntoOrder) {
+  const uint16_t arrival[] = {4, 0, 3, 1, 2};
+  RavelCPointerArray<RavelCDsmccDDB> blocks;
+  for (uint16_t number : arrival) {
+    Bytes message = Ddb(7, 1, number, Bytes{static_cast<uint8_t>(number)});
+    blocks.Append(new RavelCDsmccDDB(message.data()));
+  }
+  TraceRecorder recorder;
+  blocks.Sort();
+  EXPECT_TRUE(recorder.Records().empty());
+  for (int i = 0; i < blocks.iCount; ++i) {
+    EXPECT_EQ(i, blocks[i]->GetBlockNumber());
+    EXPECT_EQ(i, blocks[i]->GetBlockData()[0]);
+  }
+}
+
+// --- Captured object carousel (PID 0x076A): DSI and DDB messages. ---
+
+namespace {
+
+std::vector<Bytes> CarouselSections(const Bytes& stream) {
+  return reassembly::Sections(captures::PacketsOfPid(stream, 0x076A));
+}
+
+uint16_t MessageIdOf(const Bytes& section) { return static_cast<uint16_t>((section[10] << 8) | section[11]); }
+
+}  // namespace
+
+TEST(DsmccCapture, DsiAndDdbMessagesOfTheObjectCarouselParse) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("object-carousel.ts", stream);
+  std::vector<Bytes> sections = CarouselSections(stream);
+  ASSERT_GT(sections.size(), 400u);
+  int dsiCount = 0, ddbCount = 0;
+  std::map<int, std::map<int, int> > blockSizes;  // module -> block number -> size
+  for (Bytes& section : sections) {
+    ASSERT_NE(0, RavelUtil_CheckSectionCRC32(section.data()));
+    unsigned char* message = section.data() + 8;
+    TraceRecorder recorder;
+    if (section[0] == 0x3B && MessageIdOf(section) == 0x1006) {
+      RavelCDsmccDSI dsi(message);
+      ++dsiCount;
+      TraceLines expected{{kCarouselWarning, "NASP Input Data is NULL!\n"},
+                          {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+                          {kCarouselWarning, "Private data length [64]\n"}};
+      EXPECT_EQ(expected, recorder.Lines());
+      // A DVB object carousel fills the server id with 0xFF.
+      EXPECT_EQ(0xFF, dsi.GetNASP().GetAFI());
+      EXPECT_EQ(0xFFFFFFFFu, dsi.GetNASP().GetCarouselId());
+      EXPECT_EQ(0xFFFF, dsi.GetNASP().GetServiceId());
+      EXPECT_EQ(dsi.GetMessageLength(), 24 + dsi.GetPrivateDataLength());
+      // The private data (the service gateway info) ends where the CRC starts.
+      EXPECT_EQ(section.data() + section.size() - 4, dsi.GetPrivateData() + dsi.GetPrivateDataLength());
+    } else if (section[0] == 0x3C) {
+      RavelCDsmccDDB ddb(nullptr);
+      ASSERT_EQ(kRavelOk, ddb.ParseRawData(message));
+      ++ddbCount;
+      EXPECT_TRUE(recorder.Records().empty());
+      EXPECT_EQ(0x1003, ddb.GetMessageId());
+      EXPECT_EQ(125, ddb.GetModuleVersion());
+      EXPECT_EQ(section.data() + section.size() - 4, message + 18 + ddb.GetBlockDataLen());
+      blockSizes[ddb.GetModuleId()][ddb.GetBlockNumber()] = ddb.GetBlockDataLen();
+    }
+  }
+  EXPECT_GT(dsiCount, 0);
+  EXPECT_GT(ddbCount, 0);
+  // Modules 1 to 3; every block but the last of a module is full (4066 bytes).
+  ASSERT_EQ(3u, blockSizes.size());
+  for (auto& module : blockSizes) {
+    SCOPED_TRACE(module.first);
+    int expectedNumber = 0;
+    for (auto& block : module.second) {
+      EXPECT_EQ(expectedNumber++, block.first);
+      if (block.first != module.second.rbegin()->first) {
+        EXPECT_EQ(4066, block.second);
+      }
+    }
+  }
+}
