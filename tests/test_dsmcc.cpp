@@ -1,4 +1,4 @@
-// DSM-CC data carousel messages: the message header, DSI and DDB.
+// DSM-CC data carousel messages: the message header, DSI, DII and DDB.
 #include <gtest/gtest.h>
 
 #include <cstring>
@@ -7,8 +7,10 @@
 #include <string>
 
 #include "Captures.h"
+#include "Ravel_ByteOrder.h"
 #include "Ravel_CArray.h"
 #include "Ravel_CDsmccDDB.h"
+#include "Ravel_CDsmccDII.h"
 #include "Ravel_CDsmccDSI.h"
 #include "Ravel_CDsmccMsgBase.h"
 #include "Ravel_CNASP.h"
@@ -74,6 +76,47 @@ Bytes Pattern(size_t size, uint8_t seed) {
   Bytes b(size);
   for (size_t i = 0; i < size; ++i) b[i] = static_cast<uint8_t>(seed + i * 7);
   return b;
+}
+
+struct Module {
+  uint16_t id;
+  uint32_t size;
+  uint8_t version;
+  Bytes info;  // the module info descriptors
+};
+
+Bytes ModuleRecord(const Module& m) {
+  Bytes r = sb::U16(m.id);
+  sb::Append(r, sb::U32(m.size));
+  r.push_back(m.version);
+  r.push_back(static_cast<uint8_t>(m.info.size()));
+  sb::Append(r, m.info);
+  return r;
+}
+
+Bytes Dii(const std::vector<Module>& modules, const Bytes& privateData, uint8_t adaptationLength = 0,
+          const Bytes& compatibility = Bytes()) {
+  Bytes body = sb::U32(0x80000002u);  // downloadId
+  sb::Append(body, sb::U16(4066));    // blockSize
+  body.push_back(0x03);               // windowSize
+  body.push_back(0x04);               // ackPeriod
+  sb::Append(body, sb::U32(0x00000005));
+  sb::Append(body, sb::U32(0xFFFFFFFFu));
+  sb::Append(body, sb::U16(static_cast<unsigned int>(compatibility.size())));
+  sb::Append(body, compatibility);
+  sb::Append(body, sb::U16(static_cast<unsigned int>(modules.size())));
+  for (const Module& m : modules) sb::Append(body, ModuleRecord(m));
+  sb::Append(body, sb::U16(static_cast<unsigned int>(privateData.size())));
+  sb::Append(body, privateData);
+  Bytes message = Header(0x1002, 0x80000002u, adaptationLength, static_cast<uint16_t>(adaptationLength + body.size()));
+  sb::Append(message, body);
+  return message;
+}
+
+TraceLines DumpOf(RavelCDsmccDII& dii) {
+  TraceRecorder recorder;
+  dii.Show();
+  return recorder.Lines();
 }
 
 std::string Format(const char* format, int a, int b, int c, int d) {
@@ -365,6 +408,153 @@ TEST(DsmccDDB, BlocksOfAModuleSortIntoOrder) {
   }
 }
 
+TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
+  const unsigned int kParserWarning = 0x40000020u;
+  Bytes allKinds = sb::Cat({sb::Descriptor(0x01, sb::Text("text/xml")), sb::Descriptor(0x02, sb::Text("a.xml")),
+                            sb::Descriptor(0x03, sb::Text("porGuia")), sb::Descriptor(0x04, Bytes{0, 0, 2}),
+                            sb::Descriptor(0x05, Bytes{1, 2, 3, 4}), sb::Descriptor(0x06, Bytes{0x40}),
+                            sb::Descriptor(0x07, sb::U32(30)), sb::Descriptor(0xC2, Bytes{1, 0, 0, 0x10, 0})});
+  Bytes twoNames = sb::Cat({sb::Descriptor(0x02, sb::Text("first")), sb::Descriptor(0x02, sb::Text("second"))});
+  struct Case {
+    const char* what;
+    std::vector<Module> modules;
+    Bytes privateData;
+    uint8_t adaptationLength;
+    Bytes compatibility;
+    TraceLines trace;
+  } cases[] = {
+      {"no modules", {}, Bytes(), 0, Bytes(), {}},
+      {"modules without descriptors", {{1, 100, 1, Bytes()}, {2, 200000, 2, Bytes()}}, Bytes(), 0, Bytes(), {}},
+      // The location descriptor is not kept by a module record.
+      {"every descriptor kind",
+       {{7, 4066, 3, allKinds}},
+       Bytes(),
+       0,
+       Bytes(),
+       {{kParserWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x06]\n"}}},
+      {"a later name wins", {{1, 1, 0, twoNames}, {2, 2, 0, Bytes()}}, Bytes(), 0, Bytes(), {}},
+      {"after adaptation and compatibility descriptor",
+       {{3, 33, 1, sb::Descriptor(0x99, Bytes{1})}, {4, 44, 1, Bytes()}},
+       Bytes(),
+       6,
+       Bytes{0, 1, 0x42, 0x42, 0x42},
+       {{kParserWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x99]\n"}}},
+      {"private data descriptors",
+       {{1, 1, 0, Bytes()}},
+       sb::Cat({sb::Descriptor(0x0A, Bytes{1, 2}), sb::Descriptor(0x01, sb::Text("x"))}),
+       0,
+       Bytes(),
+       {{kParserWarning, "DSMCC DII: Unsupported Descriptor. Tag=[0x0a]\n"},
+        {kParserWarning, "DSMCC DII: Unsupported Descriptor. Tag=[0x01]\n"}}},
+  };
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes message = Dii(c.modules, c.privateData, c.adaptationLength, c.compatibility);
+    TraceRecorder recorder;
+    RavelCDsmccDII dii(nullptr);
+    EXPECT_EQ(kRavelOk, dii.ParseRawData(message.data()));
+    EXPECT_EQ(c.trace, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CDsmccDII", r.file);
+    EXPECT_EQ(0x80000002u, dii.GetDownloadId());
+    EXPECT_EQ(4066, dii.GetBlockSize());
+    EXPECT_EQ(3, dii.GetWindowSize());
+    EXPECT_EQ(4, dii.GetAckPeriod());
+    EXPECT_EQ(5u, dii.GetTCDownloadWindow());
+    EXPECT_EQ(0xFFFFFFFFu, dii.GetTCDownloadScenario());
+    ASSERT_EQ(static_cast<int>(c.modules.size()), dii.GetNumberOfModules());
+    for (size_t i = 0; i < c.modules.size(); ++i) {
+      RavelCModuleInfo* m = dii.GetModuleInfo(static_cast<int>(i));
+      ASSERT_NE(nullptr, m);
+      EXPECT_EQ(c.modules[i].id, m->GetModuleId());
+      EXPECT_EQ(c.modules[i].size, m->GetModuleSize());
+      EXPECT_EQ(c.modules[i].version, m->GetModuleVersion());
+      EXPECT_EQ(c.modules[i].info.size(), m->GetModuleInfoLength());
+      EXPECT_EQ(m, dii.GetModuleInfoByID(c.modules[i].id));
+    }
+  }
+
+  RavelCDsmccDII all(Dii({{7, 4066, 3, allKinds}}, Bytes()).data());
+  RavelCModuleInfo* m = all.GetModuleInfo(0);
+  ASSERT_NE(nullptr, m->GetTypeDescriptor());
+  EXPECT_STREQ("text/xml", m->GetTypeDescriptor()->GetType());
+  EXPECT_STREQ("a.xml", m->GetNameDescriptor()->GetFileName());
+  EXPECT_STREQ("Guia", m->GetInfoDescriptor()->GetText());
+  EXPECT_EQ(2, m->GetModuleLinkDescriptor()->GetModuleId());
+  EXPECT_EQ(4, m->GetCRC32Descriptor()->GetCRC32()[3]);
+  EXPECT_EQ(30u, m->GetEstDownloadTimeDescriptor()->GetEstDownloadTime());
+  EXPECT_EQ(0x1000u, m->GetCompressionTypeDescriptor()->GetOriginalSize());
+  RavelCDsmccDII names(Dii({{1, 1, 0, twoNames}}, Bytes()).data());
+  EXPECT_STREQ("second", names.GetModuleInfo(0)->GetNameDescriptor()->GetFileName());
+  EXPECT_EQ(nullptr, names.GetModuleInfo(0)->GetTypeDescriptor());
+}
+
+TEST(DsmccDII, GettersRefuseBadIndexesAndUnknownIds) {
+  Bytes message = Dii({{1, 10, 0, Bytes()}, {2, 20, 0, Bytes()}, {2, 30, 1, Bytes()}}, Bytes());
+  RavelCDsmccDII dii(message.data());
+  TraceRecorder recorder;
+  for (int index : {-1, 3, 1000}) {
+    recorder.Clear();
+    EXPECT_EQ(nullptr, dii.GetModuleInfo(index));
+    TraceLines expected{
+        {kCarouselError, "GetModuleInfo: Invalid Array Index=[" + std::to_string(index) + "], Module Info Len=[3]\n"}};
+    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ(0, recorder.PanicCount());
+  }
+  recorder.Clear();
+  EXPECT_EQ(nullptr, dii.GetModuleInfoByID(9));
+  EXPECT_EQ(20u, dii.GetModuleInfoByID(2)->GetModuleSize());  // the first with that id
+  EXPECT_TRUE(recorder.Records().empty());
+}
+
+TEST(DsmccDII, DumpsCopiesDeeplyAndParsesAgainFromScratch) {
+  Bytes info = sb::Cat({sb::Descriptor(0x02, sb::Text("m.bin")), sb::Descriptor(0x07, sb::U32(9))});
+  Bytes message = Dii({{0x0102, 754, 0x7D, info}}, Bytes());
+  RavelCDsmccDII dii(message.data());
+  TraceLines expected{
+      {kCarouselDump, "DSMCC Header: protocolDiscriminator=[0x11], dsmccType=[0x03], messageID=[0x1002]\n"},
+      {kCarouselDump, "DSMCC Header: transaction_id=[0x80000002], adaptationLength=[0], messageLength=[" +
+                          std::to_string(message.size() - 12) + "]\n"},
+      {kCarouselDump, "downloadId=[0x80000002], blockSize=[4066], windowSize=[3], ackPeriod=[4]\n"},
+      {kCarouselDump, "tCDownloadWindow=[0x00000005], tCDownloadScenario=[0xffffffff], numOfMOdules=[1]\n"},
+      {kCarouselDump,
+       "\tModule Info: moduleId=[0x0102], moduleSize=[754], moduleVersion=[0x7d], moduleInfoLength=[13]\n"},
+      {0x10000020u, "\t=================== Name Descriptor ===================\n"},
+      {0x10000020u, "\tDescriptor Tag=[0x2], Descriptor Length=[5], Name=[Name Descriptor]\n"},
+      {0x10000020u, "\tiFileName=[m.bin]\n"},
+      {0x10000020u, "\t=================== EST Download Time Descriptor ===================\n"},
+      {0x10000020u, "\tDescriptor Tag=[0x7], Descriptor Length=[4], Name=[Estimated Donwload Time Descriptor]\n"},
+      {0x10000020u, "\tiEstDownloadTime=[9]\n"}};
+  EXPECT_EQ(expected, DumpOf(dii));
+
+  RavelCDsmccDII copy(dii);
+  EXPECT_EQ(expected, DumpOf(copy));
+  ASSERT_EQ(1, copy.GetNumberOfModules());
+  EXPECT_NE(dii.GetModuleInfo(0), copy.GetModuleInfo(0));
+  EXPECT_NE(dii.GetModuleInfo(0)->GetNameDescriptor(), copy.GetModuleInfo(0)->GetNameDescriptor());
+  RavelCDsmccDII assigned(Dii({{5, 5, 5, Bytes()}, {6, 6, 6, Bytes()}}, Bytes()).data());
+  assigned = dii;
+  EXPECT_EQ(expected, DumpOf(assigned));
+
+  // A second parse replaces the records; a null parse leaves none.
+  ASSERT_EQ(kRavelOk, dii.ParseRawData(Dii({{8, 1, 1, Bytes()}, {9, 2, 2, Bytes()}}, Bytes()).data()));
+  ASSERT_EQ(2, dii.GetNumberOfModules());
+  EXPECT_EQ(8, dii.GetModuleInfo(0)->GetModuleId());
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelErrInvalidArgument, dii.ParseRawData(nullptr));
+  EXPECT_TRUE(recorder.Records().empty());
+  EXPECT_EQ(0, dii.GetNumberOfModules());
+  EXPECT_EQ(0u, dii.GetDownloadId());
+  EXPECT_EQ(0, dii.GetBlockSize());
+  EXPECT_EQ(0u, dii.GetTCDownloadScenario());
+  EXPECT_EQ(1, copy.GetNumberOfModules());  // the copy is unaffected
+
+  RavelCModuleInfo empty(nullptr);
+  TraceLines nullTrace{{kCarouselError, "Module Info Parsing Error. Input Data is NULL!\n"}};
+  EXPECT_EQ(nullTrace, recorder.Lines());
+  EXPECT_EQ(0, empty.GetModuleId());
+  EXPECT_EQ(nullptr, empty.GetNameDescriptor());
+}
+
 // --- Captured object carousel (PID 0x076A): DSI and DDB messages. ---
 
 namespace {
@@ -426,5 +616,83 @@ TEST(DsmccCapture, DsiAndDdbMessagesOfTheObjectCarouselParse) {
         EXPECT_EQ(4066, block.second);
       }
     }
+  }
+}
+
+TEST(DsmccCapture, DiiListsTheThreeModulesThatTheDdbBlocksRebuild) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("object-carousel.ts", stream);
+  std::vector<Bytes> sections = CarouselSections(stream);
+  std::unique_ptr<RavelCDsmccDII> dii;
+  std::vector<uint32_t> originalSizes;
+  int diiCount = 0;
+  std::map<int, RavelCPointerArray<RavelCDsmccDDB> > modules;
+  for (const Bytes& section : sections) {
+    // The module info bytes are read as far as their descriptor lengths say, which
+    // in this object carousel reach past the section: the zeros keep those reads
+    // inside the buffer, as a receiver's section buffer would.
+    Bytes padded = section;
+    padded.resize(section.size() + 4096, 0x00);
+    unsigned char* message = padded.data() + 8;
+    if (section[0] == 0x3B && MessageIdOf(section) == 0x1002) {
+      TraceRecorder recorder;
+      std::unique_ptr<RavelCDsmccDII> parsed(new RavelCDsmccDII(nullptr));
+      ASSERT_EQ(kRavelOk, parsed->ParseRawData(message));
+      EXPECT_TRUE(recorder.Records().empty()) << recorder.Joined();
+      ++diiCount;
+      if (!dii) {
+        dii.reset(new RavelCDsmccDII(*parsed));
+        // Each module info is a BIOP module info ending in a compressed module
+        // descriptor (tag 0x09) whose last four bytes give the original size.
+        const unsigned char* body = message + 12 + parsed->GetAdaptationLength();
+        const unsigned char* record = body + 18 + RavelRead16(body + 16) + 2;
+        for (int i = 0; i < parsed->GetNumberOfModules(); ++i) {
+          const unsigned char* infoEnd = record + 8 + record[7];
+          EXPECT_EQ(0x09, infoEnd[-7]);
+          originalSizes.push_back(RavelRead32(infoEnd - 4));
+          record = infoEnd;
+        }
+      }
+    } else if (section[0] == 0x3C) {
+      RavelCDsmccDDB block(message);
+      RavelCPointerArray<RavelCDsmccDDB>& blocks = modules[block.GetModuleId()];
+      bool known = false;
+      for (int i = 0; i < blocks.iCount && !known; ++i) known = (*blocks[i] == block) != 0;
+      if (!known) blocks.Append(new RavelCDsmccDDB(block));
+    }
+  }
+  ASSERT_GT(diiCount, 0);
+  ASSERT_TRUE(dii);
+  EXPECT_EQ(4066, dii->GetBlockSize());
+  ASSERT_EQ(3, dii->GetNumberOfModules());
+  EXPECT_EQ(std::vector<uint32_t>({294, 756113, 31946}), originalSizes);
+
+  struct Expected {
+    uint16_t id;
+    uint32_t size;  // as carried, compressed
+  } expected[] = {{1, 133}, {2, 379138}, {3, 29806}};
+  for (int i = 0; i < 3; ++i) {
+    SCOPED_TRACE(i);
+    RavelCModuleInfo* info = dii->GetModuleInfo(i);
+    ASSERT_NE(nullptr, info);
+    EXPECT_EQ(expected[i].id, info->GetModuleId());
+    EXPECT_EQ(expected[i].size, info->GetModuleSize());
+    EXPECT_EQ(125, info->GetModuleVersion());
+    EXPECT_EQ(28, info->GetModuleInfoLength());
+
+    // Rebuild the module from its blocks, in block order.
+    RavelCPointerArray<RavelCDsmccDDB>& blocks = modules[info->GetModuleId()];
+    TraceRecorder recorder;
+    blocks.Sort();
+    EXPECT_TRUE(recorder.Records().empty());
+    Bytes module;
+    for (int b = 0; b < blocks.iCount; ++b) {
+      EXPECT_EQ(b, blocks[b]->GetBlockNumber());
+      EXPECT_EQ(info->GetModuleVersion(), blocks[b]->GetModuleVersion());
+      module.insert(module.end(), blocks[b]->GetBlockData(), blocks[b]->GetBlockData() + blocks[b]->GetBlockDataLen());
+    }
+    EXPECT_EQ(static_cast<int>((info->GetModuleSize() + 4065) / 4066), blocks.iCount);
+    EXPECT_EQ(info->GetModuleSize(), module.size());
+    EXPECT_EQ(0x78, module[0]);  // a zlib stream (compression method 0x78)
   }
 }
