@@ -310,7 +310,7 @@ TEST(InfoDescriptor, KeepsTheTextWithTwoZeroBytesAndCopiesItUpToTheFirstZero) {
     RavelCInfoDescriptor d(raw.data());
     EXPECT_STREQ(c.language, d.GetLanguageCode());
     ASSERT_NE(nullptr, d.GetText());
-    EXPECT_EQ(0, std::memcmp(c.text.data(), d.GetText(), c.text.size()));
+    EXPECT_EQ(std::string(c.text.begin(), c.text.end()), std::string(d.GetText(), c.text.size()));
     EXPECT_EQ(0, d.GetText()[c.text.size()]);
     EXPECT_EQ(0, d.GetText()[c.text.size() + 1]);
     RavelCInfoDescriptor copy(d);

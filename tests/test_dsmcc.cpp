@@ -298,7 +298,7 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
     EXPECT_EQ(c.blockDataLen, ddb.GetBlockDataLen());
     if (c.result == kRavelOk) {
       ASSERT_NE(nullptr, ddb.GetBlockData());
-      EXPECT_EQ(0, std::memcmp(data.data(), ddb.GetBlockData(), data.size()));
+      EXPECT_EQ(data, Bytes(ddb.GetBlockData(), ddb.GetBlockData() + ddb.GetBlockDataLen()));
       // The block is a copy: the message may go away.
       EXPECT_TRUE(data.empty() || ddb.GetBlockData() != message.data() + 18 + c.adaptationLength);
     } else {
