@@ -392,22 +392,6 @@ TEST(DsmccDDB, OrdersBlocksOfOneModuleVersionOnly) {
   }
 }
 
-TEST(DsmccDDB, BlocksOfAModuleSortIntoOrder) {
-  const uint16_t arrival[] = {4, 0, 3, 1, 2};
-  RavelCPointerArray<RavelCDsmccDDB> blocks;
-  for (uint16_t number : arrival) {
-    Bytes message = Ddb(7, 1, number, Bytes{static_cast<uint8_t>(number)});
-    blocks.Append(new RavelCDsmccDDB(message.data()));
-  }
-  TraceRecorder recorder;
-  blocks.Sort();
-  EXPECT_TRUE(recorder.Records().empty());
-  for (int i = 0; i < blocks.iCount; ++i) {
-    EXPECT_EQ(i, blocks[i]->GetBlockNumber());
-    EXPECT_EQ(i, blocks[i]->GetBlockData()[0]);
-  }
-}
-
 TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
   const unsigned int kParserWarning = 0x40000020u;
   Bytes allKinds = sb::Cat({sb::Descriptor(0x01, sb::Text("text/xml")), sb::Descriptor(0x02, sb::Text("a.xml")),

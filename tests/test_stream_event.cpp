@@ -108,7 +108,7 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
     int nptContentId;  // -1: none held
     std::vector<int> events;
   } cases[] = {
-      {"no descriptors", {}, kRavelOk, {}, -1, {}},
+      {"section_length 9: no descriptors", {}, kRavelOk, {}, -1, {}},
       // Each NPT reference is built empty first, and that traces.
       {"one of each", {Npt(5), Event(1)}, kRavelOk, {kEmptyNpt}, 5, {1}},
       {"events in section order", {Event(3), Event(1), Event(2)}, kRavelOk, {}, -1, {3, 1, 2}},
@@ -146,6 +146,7 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
     RavelCDsmccStreamEvent table(nullptr);
     EXPECT_EQ(c.result, table.ParseRawData(section.data()));
     EXPECT_EQ(c.trace, recorder.Lines());
+    EXPECT_STREQ("Stream Descriptor Event Table", table.sTableName.GetString());  // named before the loop
     if (c.nptContentId < 0) {
       EXPECT_EQ(nullptr, table.GetNPTReference());
     } else {
@@ -154,15 +155,6 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
     }
     EXPECT_EQ(c.events, EventIds(table));
   }
-}
-
-TEST(StreamEventTable, SectionLengthNineHoldsNoDescriptors) {
-  Bytes section = StreamSection({});
-  ASSERT_EQ(9, section[2]);
-  RavelCDsmccStreamEvent table(section.data());
-  EXPECT_STREQ("Stream Descriptor Event Table", table.sTableName.GetString());
-  EXPECT_EQ(nullptr, table.GetNPTReference());
-  EXPECT_EQ(0, table.GetNumberOfGeneralEvents());
 }
 
 TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
@@ -207,12 +199,6 @@ TEST(StreamEventTable, ParsesAgainFromScratchAndReleasesOnNull) {
   EXPECT_TRUE(recorder.Records().empty());
   EXPECT_EQ(nullptr, table.GetNPTReference());
   EXPECT_EQ(0, table.GetNumberOfGeneralEvents());
-
-  RavelCDsmccStreamEvent empty(nullptr);
-  EXPECT_EQ(0, empty.iTableId);
-  EXPECT_EQ(0, empty.iSectionLength);
-  EXPECT_EQ(nullptr, empty.GetNPTReference());
-  EXPECT_EQ(0, empty.GetNumberOfGeneralEvents());
 }
 
 TEST(StreamEventTable, GeneralEventGetterPanicsOutOfRangeAndGivesNull) {
