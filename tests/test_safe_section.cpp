@@ -3,17 +3,23 @@
 // the caller's object with the traces of a direct parse.
 #include <gtest/gtest.h>
 
+#include <map>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "Captures.h"
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CDsmccDDB.h"
+#include "Ravel_CDsmccDII.h"
+#include "Ravel_CDsmccDSI.h"
 #include "Ravel_CSafeSection.h"
 #include "Ravel_CTSPktAssembler.h"
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTableStreamEventDescriptor.h"
 #include "Ravel_ResultCode.h"
+#include "SectionReassembly.h"
 #include "StreamBuilder.h"
 #include "TraceRecorder.h"
 
@@ -51,14 +57,98 @@ Bytes GoodAit() {
   return AitSection(sb::Cat({sb::DescriptorLoop({}), sb::DescriptorLoop({app})}));
 }
 
+// dsmccMessageHeader with `adaptation` bytes of adaptation header; the
+// messageLength covers them and `body`, unless `messageLength` is given.
+Bytes Message(uint16_t messageId, const Bytes& body, uint8_t adaptation = 0, int messageLength = -1) {
+  Bytes m{0x11, 0x03};
+  sb::Append(m, sb::U16(messageId));
+  sb::Append(m, sb::U32(0x80000002u));
+  m.push_back(0xFF);
+  m.push_back(adaptation);
+  sb::Append(m, sb::U16(messageLength >= 0 ? static_cast<unsigned int>(messageLength)
+                                           : static_cast<unsigned int>(adaptation + body.size())));
+  for (int i = 0; i < adaptation; ++i) m.push_back(0xA0);
+  sb::Append(m, body);
+  return m;
+}
+
+Bytes DsiBody(unsigned int privateDataLength, const Bytes& privateData) {
+  Bytes body{0x00, 0x01};
+  sb::Append(body, sb::U32(0xABCD));
+  sb::Append(body, sb::U32(0x00010203));
+  sb::Append(body, sb::Cat({sb::U16(0x0421), sb::U16(0x0422), sb::U16(0xE760), sb::U32(0xEEEEEEEE)}));
+  sb::Append(body, sb::U16(0));
+  sb::Append(body, sb::U16(privateDataLength));
+  sb::Append(body, privateData);
+  return body;
+}
+
+// Module records: moduleId 16 | moduleSize 32 | moduleVersion 8 | moduleInfoLength 8 | info.
+Bytes DiiBody(unsigned int numberOfModules, const std::vector<Bytes>& infos, unsigned int privateDataLength,
+              const Bytes& privateData, unsigned int compatibilityLength = 0) {
+  Bytes body = sb::Cat({sb::U32(0x80000002u), sb::U16(4066), sb::U8(3), sb::U8(4), sb::U32(5), sb::U32(0xFFFFFFFFu)});
+  sb::Append(body, sb::U16(compatibilityLength));
+  sb::Append(body, sb::U16(numberOfModules));
+  for (size_t i = 0; i < infos.size(); ++i) {
+    sb::Append(body, sb::Cat({sb::U16(static_cast<unsigned int>(i + 1)), sb::U32(1000), sb::U8(1),
+                              sb::U8(static_cast<unsigned int>(infos[i].size())), infos[i]}));
+  }
+  sb::Append(body, sb::U16(privateDataLength));
+  sb::Append(body, privateData);
+  return body;
+}
+
+Bytes DdbBody(const Bytes& block) { return sb::Cat({sb::U16(7), sb::U8(1), sb::U8(0xFF), sb::U16(2), block}); }
+
+Bytes GoodDii() {
+  Bytes name = sb::Descriptor(0x02, sb::Text("index.bml"));
+  Bytes type = sb::Descriptor(0x01, sb::Text("text/xml"));
+  return Message(0x1002, DiiBody(2, {sb::Cat({type, name}), {}}, 0, {}));
+}
+
+// A carousel section around a message: table_id 0x3B or 0x3C, then the CRC_32.
+Bytes Carousel(uint8_t tableId, const Bytes& message) {
+  sb::SectionOptions o;
+  o.tableId = tableId;
+  o.tableIdExtension = 0x0007;
+  return sb::LongSection(o, message);
+}
+
+Bytes StreamEvents() {
+  Bytes npt = sb::Descriptor(0x17, sb::Cat({sb::U8(0x7F), sb::U8(0xFE), sb::U32(0x00000001), sb::U8(0xFE),
+                                            sb::U32(0x00000002), sb::U16(1), sb::U16(1)}));
+  sb::SectionOptions o;
+  o.tableId = 0x3D;
+  return sb::LongSection(o, npt);
+}
+
 // The good sections the checks are tried on: built ones, and the real ones when
 // the shared captures are there.
 std::vector<Bytes> Fixtures() {
-  std::vector<Bytes> fixtures = {Pat({{0, 0x10}, {3, 0x103}, {1, 0x1FC8}}), GoodAit()};
+  std::vector<Bytes> fixtures = {Pat({{0, 0x10}, {3, 0x103}, {1, 0x1FC8}}),
+                                 GoodAit(),
+                                 StreamEvents(),
+                                 Carousel(0x3B, Message(0x1006, DsiBody(3, {1, 2, 3}))),
+                                 Carousel(0x3B, GoodDii()),
+                                 Carousel(0x3C, Message(0x1003, DdbBody({9, 8, 7, 6})))};
   for (const char* name : {"isdbt-japan-psi.sections", "isdb-signalling-mix.sections"}) {
     Bytes contents;
     if (!captures::Load(name, contents)) continue;
     for (const Bytes& section : captures::SplitSections(contents)) fixtures.push_back(section);
+  }
+  for (const char* name : {"stream-events-1.ts", "stream-events-2.ts", "object-carousel.ts"}) {
+    Bytes stream;
+    if (!captures::Load(name, stream)) continue;
+    for (unsigned char tableId : {0x3B, 0x3C, 0x3D}) {
+      int pid = reassembly::FindPidOfTable(stream, tableId);
+      if (pid < 0) continue;
+      // The first few of each table: enough to hold every kind of message.
+      int taken = 0;
+      for (const Bytes& section :
+           reassembly::Sections(captures::PacketsOfPid(stream, static_cast<unsigned int>(pid)))) {
+        if (section[0] == tableId && taken++ < 3) fixtures.push_back(section);
+      }
+    }
   }
   return fixtures;
 }
@@ -68,6 +158,11 @@ std::unique_ptr<unsigned char[]> Exactly(const Bytes& bytes, size_t count) {
   std::unique_ptr<unsigned char[]> copy(new unsigned char[count == 0 ? 1 : count]);
   for (size_t i = 0; i < count; ++i) copy[i] = bytes[i];
   return copy;
+}
+
+Bytes WithByte(Bytes bytes, size_t index, uint8_t value) {
+  bytes[index] = value;
+  return bytes;
 }
 
 Bytes WithSectionLength(Bytes section, int delta) {
@@ -93,7 +188,7 @@ TEST(SafeSection, RefusesEveryTruncatedPrefixBeforeAnyParse) {
       RavelCPAT pat(nullptr);
       ASSERT_EQ(expected, safe.ParseInto(bytes.get(), static_cast<int>(count), pat)) << f << " " << count;
       EXPECT_EQ(nullptr, safe.GetTable());
-      EXPECT_EQ(nullptr, safe.GetSection());
+      EXPECT_EQ(nullptr, safe.GetData());
       EXPECT_EQ(0, safe.GetParseResult());
       EXPECT_TRUE(recorder.Records().empty()) << f << " " << count;
     }
@@ -142,7 +237,7 @@ TEST(SafeSection, GivesTheMatchingResultForEachDamage) {
   EXPECT_EQ(kRavelSafeTooShort, safe.Parse(pat.data(), 2));
   // Load checks the same and keeps the copy of a section of any table_id.
   EXPECT_EQ(kRavelSafeOk, safe.Load(unknownTable.data(), static_cast<int>(unknownTable.size())));
-  EXPECT_EQ(static_cast<int>(unknownTable.size()), safe.GetSectionSize());
+  EXPECT_EQ(static_cast<int>(unknownTable.size()), safe.GetDataSize());
   EXPECT_EQ(kRavelSafeCrcError, safe.Load(badCrc.data(), static_cast<int>(badCrc.size())));
 }
 
@@ -162,23 +257,141 @@ TEST(SafeSection, KnowsWhichTablesItMakesAndWhichVerifyTheirCrc) {
 
 TEST(SafeSection, ParsesAsADirectParseWouldWithTheSameTraces) {
   for (const Bytes& section : Fixtures()) {
+    SCOPED_TRACE(static_cast<int>(section[0]));
     if (!RavelCSafeSection::IsKnownTable(section[0])) continue;
     RavelCSafeSection safe;
     TraceRecorder viaSafe;
-    ASSERT_EQ(kRavelSafeOk, safe.Parse(section.data(), static_cast<int>(section.size()))) << int(section[0]);
+    ASSERT_EQ(kRavelSafeOk, safe.Parse(section.data(), static_cast<int>(section.size())));
     safe.Show();
     TraceLines safeLines = viaSafe.Lines();
-    EXPECT_EQ(RavelSectionSize(section.data()), safe.GetSectionSize());
+    EXPECT_EQ(RavelSectionSize(section.data()), safe.GetDataSize());
+    EXPECT_EQ(0, safe.GetParseResult());
 
-    // A direct parse of the padded copy (the AIT traces the section's address).
+    // A direct parse of the padded copy (some classes trace the address they parse).
     TraceRecorder direct;
-    std::unique_ptr<RavelCTableBase> table(safe.CopyTable());
-    ASSERT_NE(nullptr, table);
-    direct.Clear();
-    EXPECT_EQ(kRavelOk, table->ParseRawData(safe.GetSection()));
-    table->Show();
-    EXPECT_EQ(direct.Lines(), safeLines) << int(section[0]);
+    if (safe.GetTable() != nullptr) {
+      std::unique_ptr<RavelCTableBase> table(safe.CopyTable());
+      ASSERT_NE(nullptr, table);
+      direct.Clear();
+      EXPECT_EQ(kRavelOk, table->ParseRawData(safe.GetData()));
+      table->Show();
+    } else if (safe.GetMessage()->iMessageId == 0x1006) {
+      EXPECT_EQ(nullptr, safe.CopyMessage());
+      RavelCDsmccDSI dsi(safe.GetData() + 8);
+      dsi.Show();
+    } else {
+      std::unique_ptr<RavelCDsmccBase> message(safe.CopyMessage());
+      ASSERT_NE(nullptr, message);
+      direct.Clear();
+      EXPECT_EQ(kRavelOk, message->ParseRawData(safe.GetData() + 8));
+      message->Show();
+    }
+    EXPECT_EQ(direct.Lines(), safeLines);
   }
+}
+
+TEST(SafeSection, ChecksEveryPartOfADsmccMessageBeforeItsParse) {
+  Bytes dii = GoodDii();
+  Bytes shortRecords = Message(0x1002, DiiBody(3, {{}, {}}, 0, {}));
+  Bytes longInfo = Message(0x1002, DiiBody(1, {Bytes(10, 0x01)}, 0, {}));
+  longInfo[12 + 20 + 7] = 200;  // moduleInfoLength of the only record
+  struct Case {
+    const char* label;
+    Bytes message;
+    RavelSafeResult result;
+    int parseResult;
+  } cases[] = {
+      {"DSI", Message(0x1006, DsiBody(3, {1, 2, 3})), kRavelSafeOk, 0},
+      {"DSI after 4 adaptation bytes", Message(0x1006, DsiBody(0, {}), 4), kRavelSafeOk, 0},
+      {"DSI private data past the end", Message(0x1006, DsiBody(4, {1, 2, 3})), kRavelSafeOutsideMessage, 0},
+      {"DSI without room for its server id", Message(0x1006, Bytes(20, 0x00)), kRavelSafeOutsideMessage, 0},
+      {"DII", dii, kRavelSafeOk, 0},
+      {"DII with more modules than records", shortRecords, kRavelSafeOutsideMessage, 0},
+      {"DII module info past the end", longInfo, kRavelSafeOutsideMessage, 0},
+      {"DII private data past the end", Message(0x1002, DiiBody(0, {}, 3, {1, 2})), kRavelSafeOutsideMessage, 0},
+      {"DII compatibility descriptor past the end", Message(0x1002, DiiBody(0, {}, 0, {}, 9)),
+       kRavelSafeOutsideMessage, 0},
+      {"DII cut in its download parameters", Message(0x1002, Bytes(17, 0x00)), kRavelSafeOutsideMessage, 0},
+      {"DDB", Message(0x1003, DdbBody({1, 2, 3})), kRavelSafeOk, 0},
+      {"DDB of an empty block", Message(0x1003, DdbBody({})), kRavelSafeOk, 0},
+      {"DDB whose messageLength misses the block header", Message(0x1003, DdbBody({}), 0, 5),
+       kRavelSafeOutsideMessage, 0},
+      {"DDB adaptation longer than the message", WithByte(Message(0x1003, DdbBody({})), 9, 200),
+       kRavelSafeOutsideMessage, 0},
+      {"DDB of 4097 bytes: the class refuses it", Message(0x1003, DdbBody(Bytes(4097, 0x5A))), kRavelSafeRefused,
+       kRavelErrCorruptSection},
+      {"unknown message id", Message(0x1001, DdbBody({})), kRavelSafeUnknownTable, 0},
+      {"messageLength one more than the bytes", Message(0x1003, DdbBody({1}), 0, 8), kRavelSafeLengthMismatch, 0},
+  };
+  for (const Case& c : cases) {
+    std::unique_ptr<unsigned char[]> bytes = Exactly(c.message, c.message.size());
+    RavelCSafeSection safe;
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, safe.ParseMessage(bytes.get(), static_cast<int>(c.message.size()))) << c.label;
+    EXPECT_EQ(c.result == kRavelSafeRefused ? kRavelSafeOk : c.result,
+              RavelCSafeSection::CheckMessage(bytes.get(), static_cast<int>(c.message.size())))
+        << c.label;
+    EXPECT_EQ(c.parseResult, safe.GetParseResult()) << c.label;
+    EXPECT_EQ(c.result == kRavelSafeOk, safe.GetMessage() != nullptr) << c.label;
+    if (c.result != kRavelSafeOk && c.result != kRavelSafeRefused) {
+      EXPECT_TRUE(recorder.Records().empty()) << c.label;
+    }
+    // The same message in a carousel section gives the same result.
+    Bytes section = Carousel(c.message[3] == 0x03 ? 0x3C : 0x3B, c.message);
+    if (section.size() <= static_cast<size_t>(RavelCSafeSection::kMaxSectionSize)) {
+      EXPECT_EQ(c.result, safe.Parse(section.data(), static_cast<int>(section.size()))) << c.label;
+    }
+  }
+  TraceRecorder recorder;
+  RavelCSafeSection safe;
+  Bytes refused = cases[14].message;
+  safe.ParseMessage(refused.data(), static_cast<int>(refused.size()));
+  EXPECT_EQ((TraceLines{{0x80000040u, "Invalid Block Data Length=[4097]\n"}}), recorder.Lines());
+}
+
+TEST(SafeSection, RefusesEveryTruncatedMessageAndAMessageRunningIntoTheCrc) {
+  for (const Bytes& message : {Message(0x1006, DsiBody(3, {1, 2, 3})), GoodDii(), Message(0x1003, DdbBody({4, 5}))}) {
+    for (size_t count = 0; count < message.size(); ++count) {
+      std::unique_ptr<unsigned char[]> bytes = Exactly(message, count);
+      RavelCSafeSection safe;
+      TraceRecorder recorder;
+      RavelSafeResult expected = count < 12 ? kRavelSafeTooShort : kRavelSafeLengthMismatch;
+      ASSERT_EQ(expected, safe.ParseMessage(bytes.get(), static_cast<int>(count))) << count;
+      RavelCDsmccDDB ddb(nullptr);
+      ASSERT_EQ(expected, safe.ParseMessageInto(bytes.get(), static_cast<int>(count), ddb)) << count;
+      EXPECT_TRUE(recorder.Records().empty()) << count;
+    }
+  }
+  RavelCSafeSection safe;
+  EXPECT_EQ(kRavelSafeNullInput, safe.ParseMessage(nullptr, 12));
+  Bytes message = Message(0x1006, DsiBody(0, {}));
+  Bytes intoCrc = Carousel(0x3B, Message(0x1006, DsiBody(0, {}), 0, static_cast<int>(message.size()) - 12 + 2));
+  EXPECT_EQ(kRavelSafeLengthMismatch, safe.Parse(intoCrc.data(), static_cast<int>(intoCrc.size())));
+  Bytes noHeader = Carousel(0x3C, Bytes(11, 0x00));
+  EXPECT_EQ(kRavelSafeTooShort, safe.Parse(noHeader.data(), static_cast<int>(noHeader.size())));
+}
+
+TEST(SafeSection, ChecksTheCallersMessageClassWhateverTheMessageIdSays) {
+  Bytes ddb = Message(0x1003, DdbBody(Bytes(10, 0x22)));
+  RavelCSafeSection safe;
+  RavelCDsmccDSI dsi(nullptr);
+  RavelCDsmccDII dii(nullptr);
+  RavelCDsmccDDB block(nullptr);
+  // A 10-byte block leaves no room for the server id a DSI reads, nor for the
+  // download parameters of a DII.
+  EXPECT_EQ(kRavelSafeOutsideMessage, safe.ParseMessageInto(ddb.data(), static_cast<int>(ddb.size()), dsi));
+  EXPECT_EQ(kRavelSafeOutsideMessage, safe.ParseMessageInto(ddb.data(), static_cast<int>(ddb.size()), dii));
+  EXPECT_EQ(kRavelSafeOk, safe.ParseMessageInto(ddb.data(), static_cast<int>(ddb.size()), block));
+  EXPECT_EQ(10, block.GetBlockDataLen());
+  EXPECT_EQ(7, block.GetModuleId());
+
+  Bytes dsiMessage = Message(0x1006, DsiBody(3, {1, 2, 3}));
+  TraceRecorder recorder;
+  ASSERT_EQ(kRavelSafeOk, safe.ParseMessageInto(dsiMessage.data(), static_cast<int>(dsiMessage.size()), dsi));
+  EXPECT_EQ(3, dsi.GetPrivateDataLength());
+  // The private data points into the safe object's copy.
+  EXPECT_EQ(safe.GetData() + 12 + 24, dsi.GetPrivateData());
+  EXPECT_EQ(0xE760, dsi.GetNASP().iServiceId);
 }
 
 TEST(SafeSection, ParsesIntoTheCallersObjectAndReportsItsRefusal) {
@@ -209,7 +422,7 @@ TEST(SafeSection, InnerLengthsPastTheSectionReadOnlyTheZeroedPadding) {
   TraceRecorder recorder;
   ASSERT_EQ(kRavelSafeOk, safe.Parse(bytes.get(), static_cast<int>(section.size())));
   for (int i = 0; i < RavelCSafeSection::kPadding; ++i) {
-    ASSERT_EQ(0, safe.GetSection()[safe.GetSectionSize() + i]) << i;
+    ASSERT_EQ(0, safe.GetData()[safe.GetDataSize() + i]) << i;
   }
   RavelCAIT* ait = static_cast<RavelCAIT*>(safe.GetTable());
   // Each zeroed application is 9 bytes with an empty descriptor loop.
@@ -246,4 +459,26 @@ TEST(SafeSection, TakesEveryAitSectionOfTheRealCaptureFromTheAssembler) {
     }
   }
   EXPECT_GT(parsed, 0);
+}
+
+TEST(SafeSection, TakesTheWholeRealObjectCarousel) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("object-carousel.ts", stream);
+  TraceRecorder recorder;
+  std::map<unsigned int, int> messages;  // message id -> count
+  int modules = 0;
+  for (const Bytes& section : reassembly::Sections(captures::PacketsOfPid(stream, 0x076A))) {
+    RavelCSafeSection safe;
+    RavelSafeResult result = safe.Parse(section.data(), static_cast<int>(section.size()));
+    ASSERT_EQ(kRavelSafeOk, result) << RavelCSafeSection::GetResultText(result);
+    ASSERT_NE(nullptr, safe.GetMessage());
+    ++messages[safe.GetMessage()->iMessageId];
+    if (safe.GetMessage()->iMessageId == 0x1002) {
+      modules = static_cast<RavelCDsmccDII*>(safe.GetMessage())->GetNumberOfModules();
+    }
+  }
+  EXPECT_EQ(3, modules);
+  EXPECT_GT(messages[0x1006], 0);
+  EXPECT_GT(messages[0x1002], 0);
+  EXPECT_GT(messages[0x1003], 100);
 }
