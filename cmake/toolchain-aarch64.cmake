@@ -1,0 +1,22 @@
+# Cross build for aarch64 receivers with Debian's aarch64-linux-gnu compilers
+# (g++-aarch64-linux-gnu). Programs built for the target, the tests among them, run
+# through qemu-user with the target's libraries: ctest and test discovery use
+# CMAKE_CROSSCOMPILING_EMULATOR. scripts/test-cross.sh aarch64 builds and runs the
+# whole test suite this way.
+set(CMAKE_SYSTEM_NAME Linux)
+set(CMAKE_SYSTEM_PROCESSOR aarch64)
+
+set(RAVEL_CROSS_TRIPLE aarch64-linux-gnu)
+set(CMAKE_C_COMPILER ${RAVEL_CROSS_TRIPLE}-gcc)
+set(CMAKE_CXX_COMPILER ${RAVEL_CROSS_TRIPLE}-g++)
+
+set(RAVEL_CROSS_SYSROOT /usr/${RAVEL_CROSS_TRIPLE})
+set(CMAKE_CROSSCOMPILING_EMULATOR qemu-aarch64 -L ${RAVEL_CROSS_SYSROOT})
+
+# Libraries and headers of the target only (GoogleTest comes from a prefix built
+# for the target, added to CMAKE_FIND_ROOT_PATH by the caller); programs of the host.
+list(APPEND CMAKE_FIND_ROOT_PATH ${RAVEL_CROSS_SYSROOT})
+set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)
+set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
+set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
+set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
