@@ -1,0 +1,28 @@
+// What is printed once the whole capture has been read.
+#ifndef RAVEL_DUMP_OUTPUT_H
+#define RAVEL_DUMP_OUTPUT_H
+
+#include <cstdio>
+
+#include "Carousel.h"
+#include "Stats.h"
+#include "Summary.h"
+#include "TableKind.h"
+#include "TableRegistry.h"
+#include "TraceOutput.h"
+
+namespace ravel_dump {
+
+// Default output: for each distinct table, in the order first seen, a line
+// saying what it is and how often it was seen, then the table's own Show().
+// The sections of a table are joined with its operator+= first.
+void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, Stats& stats,
+                std::FILE* out);
+
+// The summary of the tables read and of the carousel modules.
+Summary BuildSummary(const TableRegistry& registry, const TableFilter& filter, const CarouselCollector& carousel,
+                     Stats& stats);
+
+}  // namespace ravel_dump
+
+#endif

@@ -1,0 +1,85 @@
+// The default output: every distinct table's own dump, in the order first seen.
+#include <string>
+
+#include "LibraryTables.h"
+#include "Output.h"
+#include "ParseBuffer.h"
+
+namespace ravel_dump {
+namespace {
+
+std::string Describe(const TableEntry& table) {
+  char text[256];
+  std::string line = std::string("== ") + KindName(table.kind);
+  if (table.pid != kNoPid) {
+    std::snprintf(text, sizeof text, " on PID 0x%04x", table.pid);
+    line += text;
+  }
+  std::snprintf(text, sizeof text, ": table_id 0x%02x", table.tableId);
+  line += text;
+  const StoredSection& first = table.sections.begin()->second;
+  bool longForm = first.bytes.size() >= 8 && (first.bytes[1] & 0x80) != 0;
+  if (longForm) {
+    std::snprintf(text, sizeof text, ", id 0x%04x, version %d", table.extension, table.version);
+    line += text;
+    if (KindJoinsSections(table.kind)) {
+      std::snprintf(text, sizeof text, ", %zu of %d sections", table.sections.size(), table.lastSectionNumber + 1);
+      line += text;
+      std::vector<unsigned int> missing = table.Missing();
+      if (!missing.empty()) {
+        line += " (missing";
+        for (unsigned int n : missing) line += " " + std::to_string(n);
+        line += ")";
+      }
+    } else {
+      std::snprintf(text, sizeof text, ", section %u of %d", table.sections.begin()->first,
+                    table.lastSectionNumber + 1);
+      line += text;
+    }
+  }
+  uint64_t times = table.TimesSeen();
+  line += ", seen " + std::to_string(times) + (times == 1 ? " time" : " times");
+  return line;
+}
+
+}  // namespace
+
+void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, Stats& stats,
+                std::FILE* out) {
+  (void)stats;
+  for (const auto& entry : registry.Tables()) {
+    const TableEntry& table = *entry;
+    if (!filter.Accepts(table.kind, table.tableId)) continue;
+    std::string line = Describe(table);
+    std::unique_ptr<TableObject> joined;
+    int failures = 0;
+    {
+      TraceOutput::QuietScope quiet(trace);
+      for (const auto& kv : table.sections) {
+        const StoredSection& section = kv.second;
+        if (section.parseResult != 0) {
+          ++failures;
+          continue;
+        }
+        std::unique_ptr<TableObject> object = MakeTableObject(table.kind);
+        if (!object) break;
+        ParseBuffer buffer(section.bytes);
+        object->Parse(buffer.Section());
+        if (!joined) {
+          joined = std::move(object);
+        } else {
+          joined->Join(*object);
+        }
+      }
+    }
+    if (failures > 0) line += ", " + std::to_string(failures) + " refused by the library";
+    if (!joined && failures == 0) line += " (no parser for this table)";
+    std::fprintf(out, "%s\n", line.c_str());
+    if (joined) {
+      TraceOutput::ShowScope show(trace, out);
+      joined->Show();
+    }
+  }
+}
+
+}  // namespace ravel_dump
