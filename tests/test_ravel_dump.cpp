@@ -1,0 +1,420 @@
+// ravel-dump run as a process, the way its users run it: bad input, packet
+// formats and resynchronisation, repeated tables, escaping of broadcast texts,
+// the summary and its JSON, filters, and the real captures when present.
+#include <gtest/gtest.h>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <cstdlib>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+#include <vector>
+
+#include <nlohmann/json.hpp>
+
+#include "Captures.h"
+#include "StreamBuilder.h"
+
+#ifdef RAVEL_DUMP_PATH
+
+namespace {
+
+namespace fs = std::filesystem;
+
+struct ToolRun {
+  int status = -1;  // exit status, or -1 when the tool did not exit normally
+  std::string out;
+  std::string err;
+};
+
+std::string ReadFile(const std::string& path) {
+  std::ifstream in(path.c_str(), std::ios::binary);
+  return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
+}
+
+void WriteFile(const std::string& path, const Bytes& bytes) {
+  std::ofstream out(path.c_str(), std::ios::binary);
+  out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+}
+
+size_t Lines(const std::string& text) {
+  size_t count = 0;
+  for (char c : text) count += c == '\n';
+  return count;
+}
+
+class RavelDumpTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    char pattern[] = "/tmp/ravel_dump_test_XXXXXX";
+    ASSERT_NE(nullptr, mkdtemp(pattern));
+    dir_ = pattern;
+  }
+  void TearDown() override {
+    std::error_code ignored;
+    fs::permissions(dir_, fs::perms::owner_all, fs::perm_options::add, ignored);
+    fs::remove_all(dir_, ignored);
+  }
+
+  std::string Path(const std::string& name) const { return dir_ + "/" + name; }
+
+  std::string Write(const std::string& name, const Bytes& bytes) const {
+    WriteFile(Path(name), bytes);
+    return Path(name);
+  }
+
+  // Runs the tool with `args`; `input` becomes its standard input.
+  ToolRun Run(const std::vector<std::string>& args, const Bytes& input = Bytes()) const {
+    std::string in = Path(".stdin"), out = Path(".stdout"), err = Path(".stderr");
+    WriteFile(in, input);
+    pid_t child = fork();
+    if (child == 0) {
+      int fdIn = open(in.c_str(), O_RDONLY);
+      int fdOut = open(out.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+      int fdErr = open(err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+      dup2(fdIn, 0);
+      dup2(fdOut, 1);
+      dup2(fdErr, 2);
+      std::vector<char*> argv;
+      argv.push_back(const_cast<char*>(RAVEL_DUMP_PATH));
+      for (const std::string& a : args) argv.push_back(const_cast<char*>(a.c_str()));
+      argv.push_back(nullptr);
+      execv(RAVEL_DUMP_PATH, argv.data());
+      _exit(127);
+    }
+    ToolRun run;
+    int status = 0;
+    if (child > 0 && waitpid(child, &status, 0) == child && WIFEXITED(status)) run.status = WEXITSTATUS(status);
+    run.out = ReadFile(out);
+    run.err = ReadFile(err);
+    return run;
+  }
+
+  std::string dir_;
+};
+
+// --- Built streams ---------------------------------------------------------
+
+Bytes PatSection(uint16_t tsId, uint8_t version, const std::vector<std::pair<int, int>>& programs) {
+  sb::SectionOptions options;
+  options.tableId = 0x00;
+  options.tableIdExtension = tsId;
+  options.version = version;
+  Bytes body;
+  for (const auto& p : programs) {
+    sb::Append(body, sb::U16(p.first));
+    sb::Append(body, sb::U16(0xE000 | p.second));
+  }
+  return sb::LongSection(options, body);
+}
+
+// An AIT section with one application carrying a name and a Ginga location.
+Bytes AitSection(const std::string& name, const std::string& base, const std::string& initial) {
+  Bytes nameBody = sb::Cat({sb::Text("por"), sb::U8(name.size()), sb::Text(name)});
+  Bytes locationBody = sb::Cat({sb::U8(base.size()), sb::Text(base), sb::U8(0), sb::Text(initial)});
+  Bytes descriptors = sb::Cat({sb::Descriptor(0x01, nameBody), sb::Descriptor(0x07, locationBody)});
+  Bytes application = sb::Cat({sb::U32(0x0000000A), sb::U16(0x0001), sb::U8(0x01),
+                               sb::U16(0xC000 | descriptors.size()), descriptors});
+  sb::SectionOptions options;
+  options.tableId = 0x74;
+  options.tableIdExtension = 0x0009;
+  Bytes body = sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | application.size()), application});
+  return sb::LongSection(options, body);
+}
+
+Bytes Packets(uint16_t pid, const std::vector<Bytes>& sections, int repeat = 1) {
+  sb::PacketWriter writer(pid);
+  for (int r = 0; r < repeat; ++r)
+    for (const Bytes& s : sections) writer.AddSection(s);
+  return writer.Stream();
+}
+
+// 192-byte packets: a 4-byte time stamp before each; 204-byte: a 16-byte trailer.
+Bytes Reframe(const Bytes& stream, int size) {
+  Bytes out;
+  for (size_t at = 0; at + 188 <= stream.size(); at += 188) {
+    if (size == 192) sb::Append(out, {0x12, 0x34, 0x56, 0x78});
+    out.insert(out.end(), stream.begin() + at, stream.begin() + at + 188);
+    if (size == 204) out.insert(out.end(), 16, 0xA5);
+  }
+  return out;
+}
+
+Bytes SamplePatStream() { return Packets(0x0000, {PatSection(0x1234, 3, {{1, 0x0300}, {2, 0x1FC8}})}, 6); }
+
+// --- Bad input --------------------------------------------------------------
+
+TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
+  Bytes good = SamplePatStream();
+  Bytes cut(good.begin(), good.end() - 100);
+  Bytes garbageAtEnd = good;
+  garbageAtEnd.insert(garbageAtEnd.end(), 300, 0x00);
+  Bytes text(2000, 'x');
+  Bytes sections = sb::Cat({PatSection(1, 0, {{1, 0x100}}), PatSection(1, 1, {{1, 0x100}})});
+  Bytes cutSections(sections.begin(), sections.end() - 3);
+  struct Case {
+    const char* what;
+    std::vector<std::string> args;  // "@" stands for the case's file
+    Bytes file;
+    bool makeFile;
+    Bytes input;
+    const char* message;
+  } cases[] = {
+      {"missing path", {"@"}, {}, false, {}, "No such file or directory"},
+      {"directory", {"DIR"}, {}, false, {}, "is a directory"},
+      {"empty file", {"@"}, {}, true, {}, "empty input"},
+      {"empty standard input", {"-"}, {}, false, {}, "standard input: empty input"},
+      {"text file", {"@"}, text, true, {}, "not a transport stream"},
+      {"cut in a packet", {"@"}, cut, true, {}, "truncated"},
+      {"cut on standard input", {"-"}, {}, false, cut, "truncated"},
+      {"garbage at the end", {"@"}, garbageAtEnd, true, {}, "truncated"},
+      {"sections cut", {"--sections", "@"}, cutSections, true, {}, "truncated"},
+      {"not sections", {"--sections", "@"}, text, true, {}, "not a file of raw sections"},
+      {"stream given as sections", {"--sections", "@"}, good, true, {}, "a transport stream, not raw sections"},
+      {"empty sections", {"--sections", "@"}, {}, true, {}, "empty input"},
+  };
+  for (const Case& c : cases) {
+    std::string file = Path("input.bin");
+    fs::remove(file);
+    if (c.makeFile) WriteFile(file, c.file);
+    std::vector<std::string> args;
+    for (const std::string& a : c.args) args.push_back(a == "@" ? file : a == "DIR" ? dir_ : a);
+    args.insert(args.begin(), {"--extract-modules", Path("modules")});
+    ToolRun run = Run(args, c.input);
+    EXPECT_EQ(1, run.status) << c.what;
+    EXPECT_EQ("", run.out) << c.what;
+    EXPECT_EQ(1u, Lines(run.err)) << c.what << ": " << run.err;
+    EXPECT_EQ(0u, run.err.find("ravel-dump: ")) << c.what << ": " << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.message)) << c.what << ": " << run.err;
+    EXPECT_FALSE(fs::exists(Path("modules"))) << c.what;
+  }
+}
+
+TEST_F(RavelDumpTest, UnreadableFileIsReportedAsSuch) {
+  if (geteuid() == 0) GTEST_SKIP() << "permissions do not apply to root";
+  std::string file = Write("locked.ts", SamplePatStream());
+  chmod(file.c_str(), 0);
+  ToolRun run = Run({file});
+  EXPECT_EQ(1, run.status);
+  EXPECT_EQ("", run.out);
+  EXPECT_EQ("ravel-dump: " + file + ": Permission denied\n", run.err);
+}
+
+TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
+  std::string file = Write("pat.ts", SamplePatStream());
+  struct Case {
+    std::vector<std::string> args;
+    const char* message;
+  } cases[] = {
+      {{}, "no capture given"},
+      {{"--frobnicate", file}, "frobnicate"},
+      {{"--standard", "mars", file}, "unknown standard 'mars'"},
+      {{"--pid", "9000", file}, "bad PID '9000'"},
+      {{"--pid", "0x10,zz", file}, "bad PID 'zz'"},
+      {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
+      {{"--trace", "loud", file}, "unknown trace level 'loud'"},
+      {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"},
+      {{file, file}, "only one capture"},
+  };
+  for (const Case& c : cases) {
+    ToolRun run = Run(c.args);
+    EXPECT_EQ(2, run.status) << c.message;
+    EXPECT_EQ("", run.out) << c.message;
+    EXPECT_EQ(1u, Lines(run.err)) << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.message)) << run.err;
+  }
+}
+
+TEST_F(RavelDumpTest, HelpAndVersionGoToStandardOutput) {
+  ToolRun help = Run({"--help"});
+  EXPECT_EQ(0, help.status);
+  EXPECT_EQ("", help.err);
+  for (const char* option : {"--summary", "--json", "--extract-modules", "--sections", "--standard", "--pid",
+                             "--table", "--trace", "--version"}) {
+    EXPECT_NE(std::string::npos, help.out.find(option)) << option;
+  }
+  ToolRun version = Run({"--version"});
+  EXPECT_EQ(0, version.status);
+  EXPECT_EQ(0u, version.out.find("ravel-dump "));
+  EXPECT_EQ(1u, Lines(version.out));
+}
+
+// --- Packets ------------------------------------------------------------------
+
+TEST_F(RavelDumpTest, PacketSizesAndGarbageGiveTheSameTables) {
+  Bytes plain = SamplePatStream();
+  Bytes garbage = plain;
+  // Garbage holding a stray sync byte between the fifth and sixth packets.
+  Bytes junk(77, 0x00);
+  junk[10] = 0x47;
+  garbage.insert(garbage.begin() + 5 * 188, junk.begin(), junk.end());
+  Bytes leading = junk;
+  sb::Append(leading, plain);
+  struct Case {
+    const char* what;
+    Bytes stream;
+    const char* inputLine;
+  } cases[] = {
+      {"188", plain, "input: 6 packets of 188 bytes, 0 bytes skipped, 0 resyncs"},
+      {"192", Reframe(plain, 192), "input: 6 packets of 192 bytes, 0 bytes skipped, 0 resyncs"},
+      {"204", Reframe(plain, 204), "input: 6 packets of 204 bytes, 0 bytes skipped, 0 resyncs"},
+      {"garbage between packets", garbage, "input: 6 packets of 188 bytes, 77 bytes skipped, 1 resyncs"},
+      {"garbage before the first packet", leading, "input: 6 packets of 188 bytes, 77 bytes skipped, 0 resyncs"},
+  };
+  ToolRun reference = Run({Write("plain.ts", plain)});
+  ASSERT_EQ(0, reference.status) << reference.err;
+  EXPECT_NE(std::string::npos, reference.out.find("== PAT on PID 0x0000: table_id 0x00, id 0x1234, version 3"));
+  for (const Case& c : cases) {
+    ToolRun run = Run({Write("case.ts", c.stream)});
+    EXPECT_EQ(0, run.status) << c.what << run.err;
+    EXPECT_EQ(reference.out, run.out) << c.what;
+    EXPECT_NE(std::string::npos, run.err.find(c.inputLine)) << c.what << "\n" << run.err;
+  }
+  ToolRun piped = Run({"-"}, plain);
+  EXPECT_EQ(reference.out, piped.out);
+  EXPECT_NE(std::string::npos, piped.err.find("report: standard input"));
+}
+
+TEST_F(RavelDumpTest, RepeatedTableIsShownOnceWithItsCount) {
+  Bytes v3 = PatSection(0x1234, 3, {{1, 0x0100}});
+  Bytes v4 = PatSection(0x1234, 4, {{1, 0x0100}, {2, 0x0101}});
+  sb::PacketWriter writer(0x0000);
+  for (int i = 0; i < 4; ++i) writer.AddSection(v3);
+  for (int i = 0; i < 2; ++i) writer.AddSection(v4);
+  writer.AddSection(v3);  // back to the first contents: the same table again
+  ToolRun run = Run({Write("pat.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("version 3, section 0 of 1, seen 5 times\n"));
+  EXPECT_NE(std::string::npos, run.out.find("version 4, section 0 of 1, seen 2 times\n"));
+  size_t headers = 0;
+  for (size_t at = run.out.find("== "); at != std::string::npos; at = run.out.find("\n== ", at + 1)) ++headers;
+  EXPECT_EQ(2u, headers);
+  EXPECT_LT(run.out.find("version 3"), run.out.find("version 4"));  // first-seen order
+  EXPECT_NE(std::string::npos, run.out.find("The number of PMT Table Info=[2]\n"));
+}
+
+TEST_F(RavelDumpTest, CorruptSectionsAreCountedNotShown) {
+  Bytes good = PatSection(0x1234, 3, {{1, 0x0100}});
+  Bytes bad = good;
+  bad[9] ^= 0x01;  // a program_number bit: the CRC no longer verifies
+  sb::PacketWriter writer(0x0000);
+  writer.AddSection(bad);
+  writer.AddSection(good);
+  ToolRun run = Run({Write("pat.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("seen 1 time\n"));
+  EXPECT_NE(std::string::npos, run.err.find("2 assembled, 1 CRC failures"));
+  EXPECT_NE(std::string::npos, run.err.find("PID 0x0000 table_id 0x00: CRC failure"));
+}
+
+TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
+  sb::PacketWriter writer(0x0000);
+  Bytes pat = PatSection(0x1234, 3, {{1, 0x0100}});
+  writer.AddSection(pat);
+  writer.AddSection(pat);
+  writer.SetCounter(9);  // a jump from 2 to 9
+  writer.AddSection(pat);
+  ToolRun run = Run({Write("pat.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0000          3          1        0         3  PAT\n")) << run.err;
+}
+
+// --- Texts, summary, JSON, filters -------------------------------------------
+
+TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
+  // An application name with an escape sequence, a bell and a C1 control byte.
+  std::string name = std::string("Jogo\x1b[31m\x07") + "\x9b" + "fim\\";
+  Bytes stream = Packets(0x0100, {AitSection(name, "/apps", "main.ncl")});
+  std::string file = Write("ait.ts", stream);
+  const char* escaped = "Jogo\\x1b[31m\\x07\\x9bfim\\\\";
+
+  ToolRun dump = Run({"--pid", "0x100", file});
+  ASSERT_EQ(0, dump.status) << dump.err;
+  EXPECT_NE(std::string::npos, dump.out.find(std::string("\t App Name.........: ") + escaped)) << dump.out;
+  ToolRun summary = Run({"--pid", "0x100", "--summary", file});
+  ASSERT_EQ(0, summary.status) << summary.err;
+  EXPECT_NE(std::string::npos, summary.out.find(std::string("name \"") + escaped + "\"")) << summary.out;
+  for (const ToolRun* run : {&dump, &summary}) {
+    for (char c : run->out) {
+      unsigned char byte = static_cast<unsigned char>(c);
+      EXPECT_TRUE(byte == '\n' || byte == '\t' || (byte >= 0x20 && byte < 0x7F)) << static_cast<int>(byte);
+    }
+  }
+  ToolRun json = Run({"--pid", "0x100", "--json", file});
+  ASSERT_EQ(0, json.status) << json.err;
+  nlohmann::json document = nlohmann::json::parse(json.out);
+  ASSERT_EQ(1u, document["applications"].size());
+  EXPECT_EQ(escaped, document["applications"][0]["name"].get<std::string>());
+}
+
+TEST_F(RavelDumpTest, SummaryListsGingaApplications) {
+  Bytes stream = Packets(0x0100, {AitSection("Quiz", "/apps/quiz", "main.ncl")}, 3);
+  ToolRun run = Run({"--pid", "0x100", "--summary", Write("ait.ts", stream)});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos,
+            run.out.find("Ginga applications (1):\n  PID 0x0100 type 0x0009: organization 0x0000000a application "
+                         "0x0001 control 1 (autostart) name \"Quiz\" path \"/apps/quiz\" file \"main.ncl\"\n"))
+      << run.out;
+  ToolRun json = Run({"--pid", "0x100", "--json", Path("ait.ts")});
+  nlohmann::json app = nlohmann::json::parse(json.out)["applications"][0];
+  EXPECT_EQ(0x100, app["pid"].get<int>());
+  EXPECT_EQ(9, app["application_type"].get<int>());
+  EXPECT_EQ(10u, app["organization_id"].get<unsigned>());
+  EXPECT_EQ(1u, app["application_id"].get<unsigned>());
+  EXPECT_EQ(1u, app["control_code"].get<unsigned>());
+  EXPECT_EQ(1, app["document_resolution"].get<int>());
+  EXPECT_EQ("/apps/quiz", app["path"].get<std::string>());
+  EXPECT_EQ("main.ncl", app["file"].get<std::string>());
+}
+
+TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
+  Bytes stream = sb::Cat({SamplePatStream(), Packets(0x0100, {AitSection("Quiz", "/", "a.ncl")})});
+  std::string file = Write("mix.ts", stream);
+  struct Case {
+    std::vector<std::string> args;
+    bool pat, ait;
+  } cases[] = {
+      {{file}, true, false},  // nothing names PID 0x0100 as an AIT PID
+      {{"--pid", "0x100", file}, false, true},
+      {{"--pid", "0,0x100", file}, true, true},
+      {{"--pid", "0", "--pid", "256", file}, true, true},
+      {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
+      {{"--pid", "0,0x100", "--table", "0x00", file}, true, false},
+  };
+  for (const Case& c : cases) {
+    ToolRun run = Run(c.args);
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_EQ(c.pat, run.out.find("== PAT") != std::string::npos) << c.args[0];
+    EXPECT_EQ(c.ait, run.out.find("== AIT on PID 0x0100") != std::string::npos) << c.args[0];
+  }
+}
+
+TEST_F(RavelDumpTest, RawSectionsAreReadWithoutPids) {
+  Bytes sections = sb::Cat({PatSection(0x1234, 3, {{1, 0x0100}}), Bytes(5, 0xFF), AitSection("Quiz", "/", "a.ncl"),
+                            PatSection(0x1234, 3, {{1, 0x0100}})});
+  ToolRun run = Run({"--sections", Write("all.sections", sections)});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("== PAT: table_id 0x00, id 0x1234, version 3, section 0 of 1, seen 2 times"));
+  EXPECT_NE(std::string::npos, run.out.find("== AIT: table_id 0x74"));
+  EXPECT_NE(std::string::npos, run.err.find("input: " + std::to_string(sections.size()) + " bytes of raw sections"));
+}
+
+TEST_F(RavelDumpTest, TraceLevelsShowTheLibrarysOwnTraces) {
+  std::string file = Write("ait.ts", Packets(0x0100, {AitSection("Quiz", "/", "a.ncl")}));
+  ToolRun quiet = Run({"--pid", "0x100", "--quiet", file});
+  EXPECT_EQ("", quiet.err);
+  ToolRun traced = Run({"--pid", "0x100", "--quiet", "--trace", "warning", file});
+  EXPECT_NE(std::string::npos, traced.err.find("RavelCAIT::ParseRawData... apRawData=")) << traced.err;
+  EXPECT_NE(std::string::npos, traced.err.find("[0x40000020 SectionParser/source/Ravel_CTableAIT:"));
+  EXPECT_EQ(quiet.out, traced.out);
+}
+
+}  // namespace
+
+#endif  // RAVEL_DUMP_PATH
