@@ -2,7 +2,9 @@
 #include "Capture.h"
 #include "LibraryTables.h"
 #include "ParseBuffer.h"
-#include "RavelSectionParser.h"
+#include "Ravel_CDsmccDDB.h"
+#include "Ravel_CDsmccDII.h"
+#include "Ravel_CTablePAT.h"
 
 namespace ravel_dump {
 namespace {
@@ -15,11 +17,39 @@ int FollowPat(int pid, RavelCPAT& pat, Demux* demux) {
   return 0;
 }
 
+// The DII lists the modules of a download with their sizes and versions.
+int ListModules(int pid, unsigned char* message, CarouselCollector& carousel) {
+  RavelCDsmccDII dii(nullptr);
+  int result = dii.ParseRawData(message);
+  if (result != 0) return result;
+  std::vector<ModuleListing> modules;
+  for (int i = 0; i < dii.cModuleInfos.iCount; ++i) {
+    const RavelCModuleInfo* info = dii.cModuleInfos.ipArray[i];
+    ModuleListing module;
+    module.id = info->iModuleId;
+    module.size = info->iModuleSize;
+    module.version = info->iModuleVersion;
+    if (info->pNameDescriptor != nullptr) module.name = info->pNameDescriptor->GetFileName();
+    modules.push_back(module);
+  }
+  carousel.AddModuleList(pid, dii.iDownloadId, dii.iBlockSize, modules);
+  return 0;
+}
+
+// A DDB carries one block of a module; its header's transaction id is the downloadId.
+int KeepBlock(int pid, unsigned char* message, CarouselCollector& carousel) {
+  RavelCDsmccDDB ddb(nullptr);
+  int result = ddb.ParseRawData(message);
+  if (result != 0) return result;
+  carousel.AddBlock(pid, ddb.iTransactionId, ddb.iModuleId, ddb.iModuleVersion, ddb.iBlockNumber, ddb.pBlockData,
+                    ddb.pBlockData != nullptr && ddb.iBlockDataLen > 0 ? static_cast<std::size_t>(ddb.iBlockDataLen) : 0);
+  return 0;
+}
+
 }  // namespace
 
 int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t size, Demux* demux,
                    CarouselCollector& carousel) {
-  (void)carousel;
   ParseBuffer buffer(section, size);
   if (kind == TableKind::kPat) {
     RavelCPAT pat(nullptr);
@@ -27,6 +57,8 @@ int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t 
     if (result == 0) FollowPat(pid, pat, demux);
     return result;
   }
+  if (kind == TableKind::kDii) return ListModules(pid, buffer.Message(), carousel);
+  if (kind == TableKind::kDdb) return KeepBlock(pid, buffer.Message(), carousel);
   std::unique_ptr<TableObject> object = MakeTableObject(kind);
   return object ? object->Parse(buffer.Section()) : 0;
 }

@@ -1,6 +1,12 @@
 #include "LibraryTables.h"
 
-#include "RavelSectionParser.h"
+#include "Ravel_CDsmccDDB.h"
+#include "Ravel_CDsmccDII.h"
+#include "Ravel_CDsmccDSI.h"
+#include "Ravel_CDsmccMsgBase.h"
+#include "Ravel_CTableAIT.h"
+#include "Ravel_CTablePAT.h"
+#include "Ravel_CTableStreamEventDescriptor.h"
 
 namespace ravel_dump {
 namespace {
@@ -36,6 +42,19 @@ class AitTable : public TableObject {
   RavelCAIT object_;
 };
 
+// A DSM-CC message, built over the message that follows the section header.
+template <class T>
+class Message : public TableObject {
+ public:
+  Message() : object_(nullptr) {}
+  int Parse(unsigned char* section) override { return object_.ParseRawData(section + 8); }
+  void Join(TableObject&) override {}
+  void Show() override { object_.Show(); }
+
+ private:
+  T object_;
+};
+
 }  // namespace
 
 std::unique_ptr<TableObject> MakeTableObject(TableKind kind) {
@@ -44,6 +63,16 @@ std::unique_ptr<TableObject> MakeTableObject(TableKind kind) {
       return std::unique_ptr<TableObject>(new Table<RavelCPAT>);
     case TableKind::kAit:
       return std::unique_ptr<TableObject>(new AitTable);
+    case TableKind::kDsi:
+      return std::unique_ptr<TableObject>(new Message<RavelCDsmccDSI>);
+    case TableKind::kDii:
+      return std::unique_ptr<TableObject>(new Message<RavelCDsmccDII>);
+    case TableKind::kDdb:
+      return std::unique_ptr<TableObject>(new Message<RavelCDsmccDDB>);
+    case TableKind::kDsmccOther:
+      return std::unique_ptr<TableObject>(new Message<RavelCDsmccBase>);
+    case TableKind::kStreamDescriptors:
+      return std::unique_ptr<TableObject>(new Table<RavelCDsmccStreamEvent>);
     default:
       return nullptr;
   }
