@@ -12,7 +12,7 @@ namespace {
 const char kDescription[] =
     "Reads a transport stream capture (or a file of raw sections) the way a one-segment\n"
     "receiver does, and prints the PSI/SI tables, DSM-CC carousel messages and stream\n"
-    "events it holds, through the ravel_sectionparser library.";
+    "events it holds, through the ravel_sectionparser library.\n";
 
 std::vector<std::string> SplitList(const std::vector<std::string>& values) {
   std::vector<std::string> words;
@@ -66,7 +66,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
        cxxopts::value<std::string>(), "NAME")
       ("p,pid", "Read only these PIDs, each as a section PID (comma-separated, decimal or 0x hex)",
        cxxopts::value<std::vector<std::string>>(), "PIDS")
-      ("t,table", "Show only these tables: pat, pmt, nit, sdt, eit, tdt, tot, bit, ait, dsi, dii, ddb, "
+      ("t,table", "Dump only these tables: pat, pmt, nit, sdt, eit, tdt, tot, bit, ait, dsi, dii, ddb, "
        "dsmcc, stream-events, other, or table_ids", cxxopts::value<std::vector<std::string>>(), "TABLES")
       ("trace", "Also show the library's own traces of these levels on stderr: dump, detail, warning, "
        "error, all", cxxopts::value<std::string>(), "LEVELS")
@@ -83,8 +83,11 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     if (result.count("help")) {
       std::cout << parser.help({""}) << "\n"
                 << "Without --summary or --json, each distinct table is dumped by the library's own Show(),\n"
-                << "in the order first seen. A report of packets, continuity breaks, CRC failures and\n"
-                << "tables goes to stderr at the end.\n";
+                << "in the order first seen. Section PIDs are those a receiver reads (PAT, NIT, SDT, EIT,\n"
+                << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
+                << "PMTs name); a capture without them (one carousel PID, say) is read with --pid.\n"
+                << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
+                << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
       return ParseOutcome::kExitOk;
     }
     if (result.count("version")) {
