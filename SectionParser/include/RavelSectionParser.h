@@ -26,7 +26,9 @@
 
 // Tables.
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableBIT.h"
 #include "Ravel_CTableBase.h"
+#include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
 

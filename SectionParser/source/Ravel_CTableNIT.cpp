@@ -254,11 +254,12 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
   }
 
   // The transport stream loop follows wherever the network loop stopped, and
-  // its own length, not section_length, bounds it.
+  // its own length, not section_length, bounds it. The end is counted from the
+  // length field itself, two bytes before the first entry: the receivers' rule.
   unsigned short transportStreamLoopLength = RavelRead12(section + at);  // ----xxxx xxxxxxxx
   if (transportStreamLoopLength == 0) return kRavelOk;
+  const int end = at + transportStreamLoopLength;
   at += 2;
-  int end = at + transportStreamLoopLength;
   do {
     RavelCTSInfo* transportStream = new RavelCTSInfo(0);
     if (transportStream->ParseRawData(section + at) != kRavelOk) {
