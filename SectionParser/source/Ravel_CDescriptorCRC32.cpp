@@ -13,7 +13,7 @@ const RavelCDescriptorKind RavelCCRC32Descriptor::kKind = {
     "This Descriptor isn't CRC32 Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== CRC32 Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCCRC32Descriptor::RavelCCRC32Descriptor(unsigned char* raw) {
   std::memset(aCRC32, 0, sizeof(aCRC32));

@@ -12,7 +12,7 @@ const RavelCDescriptorKind RavelCCompressionTypeDescriptor::kKind = {
     "This Descriptor isn't Compression Type Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Compression Type Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(unsigned char* raw)
     : iCompressionType(0), iOriginalSize(0) {

@@ -12,7 +12,7 @@ const RavelCDescriptorKind RavelCEstDownloadTimeDescriptor::kKind = {
     "This Descriptor isn't Estimated Download Time Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== EST Download Time Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCEstDownloadTimeDescriptor::RavelCEstDownloadTimeDescriptor(unsigned char* raw) : iEstDownloadTime(0) {
   ParseRawData(raw);

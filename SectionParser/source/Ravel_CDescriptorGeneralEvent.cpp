@@ -16,7 +16,7 @@ const RavelCDescriptorKind RavelCGeneralEventDescriptor::kKind = {
     "This Descriptor isn't  General Event Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== General Event Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 namespace {
 

@@ -14,7 +14,7 @@ const RavelCDescriptorKind RavelCInfoDescriptor::kKind = {
     "This Descriptor isn't Info Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Info Descriptor ===================\n",
     RAVEL_UTILITY_WARNING,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCInfoDescriptor::RavelCInfoDescriptor(unsigned char* raw) : pText(0) {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));

@@ -11,7 +11,7 @@ const RavelCDescriptorKind RavelCLocationDescriptor::kKind = {
     "This Descriptor isn't Location Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Location Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCLocationDescriptor::RavelCLocationDescriptor(unsigned char* raw) : iLocationTag(0) { ParseRawData(raw); }
 

@@ -12,7 +12,7 @@ const RavelCDescriptorKind RavelCModuleLinkDescriptor::kKind = {
     "This Descriptor isn't Module Link Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Module Link Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(unsigned char* raw) : iPosition(0), iModuleId(0) {
   ParseRawData(raw);

@@ -14,7 +14,7 @@ const RavelCDescriptorKind RavelCNPTReferenceDescriptor::kKind = {
     "This Descriptor isn't  NPT Reference Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== NPT Reference Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    true};
+    true, kRavelTraceSourcePath};
 
 namespace {
 

@@ -12,7 +12,7 @@ const RavelCDescriptorKind RavelCNameDescriptor::kKind = {
     "This Descriptor isn't Name Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Name Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCNameDescriptor::RavelCNameDescriptor(unsigned char* raw) : sFileName() { ParseRawData(raw); }
 

@@ -12,7 +12,7 @@ const RavelCDescriptorKind RavelCTypeDescriptor::kKind = {
     "This Descriptor isn't Type Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Type Descriptor ===================\n",
     RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCTypeDescriptor::RavelCTypeDescriptor(unsigned char* raw) : sType() { ParseRawData(raw); }
 
