@@ -5,6 +5,8 @@
 #include "Ravel_CDsmccDSI.h"
 #include "Ravel_CDsmccMsgBase.h"
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableBIT.h"
+#include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
 
@@ -61,6 +63,10 @@ std::unique_ptr<TableObject> MakeTableObject(TableKind kind) {
   switch (kind) {
     case TableKind::kPat:
       return std::unique_ptr<TableObject>(new Table<RavelCPAT>);
+    case TableKind::kNit:
+      return std::unique_ptr<TableObject>(new JoinedTable<RavelCNIT>);
+    case TableKind::kBit:
+      return std::unique_ptr<TableObject>(new JoinedTable<RavelCBIT>);
     case TableKind::kAit:
       return std::unique_ptr<TableObject>(new AitTable);
     case TableKind::kDsi:

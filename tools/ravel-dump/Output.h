@@ -16,12 +16,11 @@ namespace ravel_dump {
 // Default output: for each distinct table, in the order first seen, a line
 // saying what it is and how often it was seen, then the table's own Show().
 // The sections of a table are joined with its operator+= first.
-void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, Stats& stats,
-                std::FILE* out);
+void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out);
 
-// The summary of the tables read and of the carousel modules.
-Summary BuildSummary(const TableRegistry& registry, const TableFilter& filter, const CarouselCollector& carousel,
-                     Stats& stats);
+// The summary of the tables read (the latest version of each) and of the
+// carousel modules.
+Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace);
 
 }  // namespace ravel_dump
 

@@ -1,28 +1,56 @@
-// The summary, from the latest version of each table read.
-#include <map>
+// The summary, from the latest version of each table read, through the
+// library's table and descriptor classes.
+#include <cstring>
 
-#include "ByteText.h"
 #include "Output.h"
 #include "ParseBuffer.h"
-#include "RavelSectionParser.h"
+#include "Ravel_CDescriptorLocalTimeOffset.h"
+#include "Ravel_CDescriptorNetworkName.h"
+#include "Ravel_CDescriptorParentalRating.h"
+#include "Ravel_CDescriptorPartialReception.h"
+#include "Ravel_CDescriptorService.h"
+#include "Ravel_CDescriptorServiceList.h"
+#include "Ravel_CDescriptorShortEvent.h"
+#include "Ravel_CDescriptorStreamIdentifier.h"
+#include "Ravel_CDescriptorTSInformation.h"
+#include "Ravel_CDescriptorTerrDeliverySystem.h"
+#include "Ravel_Cfg.h"
+#include "Ravel_CTableAIT.h"
+#include "Ravel_CTableNIT.h"
+#include "Ravel_CTablePAT.h"
 
 namespace ravel_dump {
 namespace {
 
-// The table of `kind` seen last (on `pid` when given), or null.
-const TableEntry* Latest(const TableRegistry& registry, TableKind kind, int pid = -2) {
+const int kAnyPid = -2;
+
+std::string Text(const char* text) { return text != nullptr ? std::string(text) : std::string(); }
+
+std::string Field(const char* field, std::size_t capacity) {
+  return std::string(field, strnlen(field, capacity));
+}
+
+// The table of `kind` seen last that `accept` takes, or null.
+template <class Accept>
+const TableEntry* Latest(const TableRegistry& registry, TableKind kind, Accept accept) {
   const TableEntry* latest = nullptr;
   for (const auto& entry : registry.Tables()) {
-    if (entry->kind != kind || (pid != -2 && entry->pid != pid)) continue;
+    if (entry->kind != kind || !accept(*entry)) continue;
     if (latest == nullptr || entry->lastSeen > latest->lastSeen) latest = entry.get();
   }
   return latest;
 }
 
-const StoredSection* FirstParsed(const TableEntry& table) {
-  for (const auto& kv : table.sections)
-    if (kv.second.parseResult == 0) return &kv.second;
-  return nullptr;
+
+// Calls `use(object)` for each section of `table` that the library accepted.
+template <class T, class Use>
+void EachSection(const TableEntry& table, Use use) {
+  for (const auto& kv : table.sections) {
+    if (kv.second.parseResult != 0) continue;
+    ParseBuffer buffer(kv.second.bytes);
+    T object(nullptr);
+    if (object.ParseRawData(buffer.Section()) == 0) use(object);
+  }
 }
 
 ServiceSummary& ServiceOf(std::vector<ServiceSummary>& services, int id) {
@@ -33,27 +61,68 @@ ServiceSummary& ServiceOf(std::vector<ServiceSummary>& services, int id) {
   return services.back();
 }
 
+// The PAT: the transport stream id and the services with their PMT PIDs.
 void AddPat(const TableRegistry& registry, Summary& summary) {
-  const TableEntry* table = Latest(registry, TableKind::kPat, 0x0000);
-  if (table == nullptr) table = Latest(registry, TableKind::kPat);
+  const TableEntry* table = Latest(registry, TableKind::kPat, [](const TableEntry& t) { return t.pid <= 0; });
   if (table == nullptr) return;
-  const StoredSection* section = FirstParsed(*table);
-  if (section == nullptr) return;
-  ParseBuffer buffer(section->bytes);
-  RavelCPAT pat(nullptr);
-  if (pat.ParseRawData(buffer.Section()) != 0) return;
-  summary.transportStreamId = pat.iTableIdExtension;
-  for (int i = 0; i < pat.aProgramList.iCount; ++i) {
-    const RavelCPMTInfo* program = pat.aProgramList.ipArray[i];
-    ServiceSummary& service = ServiceOf(summary.services, program->iProgramNumber);
-    service.pmtPid = program->iPID;
-    // The PAT keeps the first program with a one-segment PMT PID apart.
-    service.oneSegment = program->iPID >= 0x1FC8 && program->iPID <= 0x1FCF;
-  }
+  EachSection<RavelCPAT>(*table, [&](RavelCPAT& pat) {
+    summary.transportStreamId = pat.iTableIdExtension;
+    for (int i = 0; i < pat.aProgramList.iCount; ++i) {
+      const RavelCPMTInfo* program = pat.aProgramList.ipArray[i];
+      ServiceSummary& service = ServiceOf(summary.services, program->iProgramNumber);
+      service.pmtPid = program->iPID;
+      // The receiver's one-segment service: its PMT on 0x1FC8 to 0x1FCF.
+      service.oneSegment = program->iPID >= 0x1FC8 && program->iPID <= 0x1FCF;
+    }
+  });
 }
 
+
+
+// The NIT of this network: its name and transport streams.
+void AddNit(const TableRegistry& registry, Summary& summary) {
+  const TableEntry* table = Latest(registry, TableKind::kNit, [](const TableEntry& t) { return t.tableId == 0x40; });
+  if (table == nullptr) return;
+  NetworkSummary& network = summary.network;
+  network.id = table->extension;
+  EachSection<RavelCNIT>(*table, [&](RavelCNIT& nit) {
+    network.valid = true;
+    if (nit.pNetworkName != nullptr && network.name.empty()) network.name = Text(nit.pNetworkName->GetNetworkName());
+    for (int i = 0; i < nit.aTSInfoList.iCount; ++i) {
+      const RavelCTSInfo* info = nit.aTSInfoList.ipArray[i];
+      TransportStreamSummary ts;
+      ts.id = info->iTransportStreamId;
+      ts.originalNetworkId = info->iOriginalNetworkId;
+      if (const RavelCTSInformationDescriptor* tsInfo = info->pTSInformation) {
+        ts.name = Text(tsInfo->GetTsName());
+        ts.remoteControlKey = tsInfo->iRemoteControlKeyId;
+      }
+      if (const RavelCTerrDeliverySystemDescriptor* delivery = info->pTerrDeliverySystem) {
+        ts.areaCode = delivery->iAreaCode;
+        ts.guardInterval = delivery->iGuardInterval;
+        ts.transmissionMode = delivery->iTransmissionMode;
+        for (int f = 0; f < delivery->iFrequencyCount && delivery->pFrequencies != nullptr; ++f) {
+          ts.frequencies.push_back(delivery->pFrequencies[f]);
+        }
+      }
+      if (const RavelCPartialReceptionDescriptor* partial = info->pPartialReception) {
+        for (int s = 0; s < partial->aServiceIds.iCount; ++s) ts.partialReception.push_back(partial->aServiceIds.ipArray[s]);
+      }
+      if (const RavelCServiceListDescriptor* list = info->pServiceList) {
+        for (int s = 0; s < list->iServiceCount && list->pServiceIds != nullptr; ++s) {
+          ts.serviceList.push_back({list->pServiceIds[s], list->pServiceTypes[s]});
+        }
+      }
+      network.streams.push_back(ts);
+    }
+  });
+}
+
+
+
+
+// Every AIT section stands alone: the applications of all of them, each once.
 void AddApplications(const TableRegistry& registry, Summary& summary) {
-  // Every AIT section stands alone: all current ones count, in the order seen.
   for (const auto& entry : registry.Tables()) {
     if (entry->kind != TableKind::kAit) continue;
     for (const auto& kv : entry->sections) {
@@ -71,12 +140,13 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
         app.applicationId = record.iApplicationId;
         app.controlCode = record.iApplicationControlCode;
         app.documentResolution = record.iDocumentResolution;
-        app.name = std::string(record.szAppName, strnlen(record.szAppName, sizeof record.szAppName));
-        app.path = std::string(record.szAppFilePath, strnlen(record.szAppFilePath, sizeof record.szAppFilePath));
-        app.file = std::string(record.szAppFileName, strnlen(record.szAppFileName, sizeof record.szAppFileName));
+        app.name = Field(record.szAppName, sizeof record.szAppName);
+        app.path = Field(record.szAppFilePath, sizeof record.szAppFilePath);
+        app.file = Field(record.szAppFileName, sizeof record.szAppFileName);
         bool repeated = false;
         for (const ApplicationSummary& other : summary.applications) {
-          repeated = repeated || (other.pid == app.pid && other.organizationId == app.organizationId &&
+          repeated = repeated || (other.pid == app.pid && other.applicationType == app.applicationType &&
+                                  other.organizationId == app.organizationId &&
                                   other.applicationId == app.applicationId && other.controlCode == app.controlCode &&
                                   other.name == app.name && other.path == app.path && other.file == app.file);
         }
@@ -88,13 +158,12 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
 
 }  // namespace
 
-Summary BuildSummary(const TableRegistry& registry, const TableFilter& filter, const CarouselCollector& carousel,
-                     Stats& stats) {
-  (void)filter;
-  (void)stats;
+Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace) {
+  TraceOutput::QuietScope quiet(trace);
   Summary summary;
   summary.standard = RavelCfg_GetStandard() == 1 ? "japan" : "brazil";
   AddPat(registry, summary);
+  AddNit(registry, summary);
   AddApplications(registry, summary);
   summary.carousels = carousel.Summarize();
   return summary;

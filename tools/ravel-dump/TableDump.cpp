@@ -27,8 +27,10 @@ std::string Describe(const TableEntry& table) {
       line += text;
       std::vector<unsigned int> missing = table.Missing();
       if (!missing.empty()) {
+        const std::size_t kListed = 8;
         line += " (missing";
-        for (unsigned int n : missing) line += " " + std::to_string(n);
+        for (std::size_t i = 0; i < missing.size() && i < kListed; ++i) line += " " + std::to_string(missing[i]);
+        if (missing.size() > kListed) line += " ...";
         line += ")";
       }
     } else {
@@ -44,21 +46,20 @@ std::string Describe(const TableEntry& table) {
 
 }  // namespace
 
-void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, Stats& stats,
-                std::FILE* out) {
-  (void)stats;
+void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out) {
   for (const auto& entry : registry.Tables()) {
     const TableEntry& table = *entry;
     if (!filter.Accepts(table.kind, table.tableId)) continue;
     std::string line = Describe(table);
     std::unique_ptr<TableObject> joined;
-    int failures = 0;
+    std::string refused;
     {
       TraceOutput::QuietScope quiet(trace);
       for (const auto& kv : table.sections) {
         const StoredSection& section = kv.second;
         if (section.parseResult != 0) {
-          ++failures;
+          refused += ", section " + std::to_string(kv.first) + " refused by the library (" +
+                     std::to_string(section.parseResult) + ")";
           continue;
         }
         std::unique_ptr<TableObject> object = MakeTableObject(table.kind);
@@ -72,8 +73,8 @@ void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceO
         }
       }
     }
-    if (failures > 0) line += ", " + std::to_string(failures) + " refused by the library";
-    if (!joined && failures == 0) line += " (no parser for this table)";
+    line += refused;
+    if (!joined && refused.empty()) line += " (no parser for this table)";
     std::fprintf(out, "%s\n", line.c_str());
     if (joined) {
       TraceOutput::ShowScope show(trace, out);

@@ -156,13 +156,13 @@ int main(int argc, char** argv) {
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
                      !options.extractDirectory.empty();
-  if (wantSummary) summary = BuildSummary(capture.Registry(), options.tables, capture.Carousel(), stats);
+  if (wantSummary) summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
   if (!options.extractDirectory.empty()) {
     if (!capture.Carousel().WriteModules(options.extractDirectory, summary.carousels, error)) return Fail(error);
   }
   switch (options.mode) {
     case OutputMode::kDump:
-      DumpTables(capture.Registry(), options.tables, trace, stats, stdout);
+      DumpTables(capture.Registry(), options.tables, trace, stdout);
       break;
     case OutputMode::kSummary:
       PrintSummaryText(summary, stdout);
@@ -178,7 +178,7 @@ int main(int argc, char** argv) {
       }
       break;
   }
-  std::fflush(stdout);
+  if (std::fflush(stdout) != 0 || std::ferror(stdout)) return Fail("cannot write the output");
   if (options.report) PrintReport(stderr, inputSummary, stats, demux.Roles(), capture.Registry());
   return 0;
 }
