@@ -20,23 +20,23 @@ const unsigned int kDump = 0x10000020u;
 const unsigned int kWarning = 0x40000020u;
 const unsigned int kError = 0x80000020u;
 
-struct StreamSpec {
+struct StreamDef {
   uint8_t type;
   uint16_t pid;
   std::vector<Bytes> descriptors;
 };
 
-Bytes StreamEntry(const StreamSpec& stream) {
+Bytes StreamEntry(const StreamDef& stream) {
   Bytes entry = sb::U8(stream.type);
   sb::Append(entry, sb::U16(0xE000 | stream.pid));  // reserved bits set, as broadcast
   sb::Append(entry, sb::DescriptorLoop(stream.descriptors));
   return entry;
 }
 
-Bytes PmtBody(uint16_t pcrPid, const std::vector<Bytes>& programInfo, const std::vector<StreamSpec>& streams) {
+Bytes PmtBody(uint16_t pcrPid, const std::vector<Bytes>& programInfo, const std::vector<StreamDef>& streams) {
   Bytes body = sb::U16(0xE000 | pcrPid);
   sb::Append(body, sb::DescriptorLoop(programInfo));
-  for (const StreamSpec& s : streams) sb::Append(body, StreamEntry(s));
+  for (const StreamDef& s : streams) sb::Append(body, StreamEntry(s));
   return body;
 }
 
@@ -49,7 +49,7 @@ sb::SectionOptions PmtOptions(uint16_t programNumber = 0x4800, uint8_t version =
   return options;
 }
 
-Bytes PmtSection(const std::vector<StreamSpec>& streams, const std::vector<Bytes>& programInfo = {},
+Bytes PmtSection(const std::vector<StreamDef>& streams, const std::vector<Bytes>& programInfo = {},
                  uint8_t version = 3, uint16_t programNumber = 0x4800, uint16_t pcrPid = 0x01FF) {
   return sb::LongSection(PmtOptions(programNumber, version), PmtBody(pcrPid, programInfo, streams));
 }
@@ -130,8 +130,8 @@ TEST(PMTStreamSelection, PicksVideoAudioAndCaptionsByStreamType) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    std::vector<StreamSpec> streams;
-    for (const auto& s : c.streams) streams.push_back(StreamSpec{s.first, s.second, {}});
+    std::vector<StreamDef> streams;
+    for (const auto& s : c.streams) streams.push_back(StreamDef{s.first, s.second, {}});
     Bytes section = PmtSection(streams);
     RavelCPMT pmt(section.data());
     ASSERT_EQ(static_cast<int>(c.streams.size()), pmt.GetMapInfoCount());
@@ -170,7 +170,7 @@ TEST(PMTStreamSelection, WalksOnlyTheFirst256StreamsAndComesRoundAgain) {
       for (const auto& t : c.typed) {
         if (t.first == i) type = t.second;
       }
-      Bytes entry = StreamEntry(StreamSpec{type, static_cast<uint16_t>(0x1000 + i), {}});
+      Bytes entry = StreamEntry(StreamDef{type, static_cast<uint16_t>(0x1000 + i), {}});
       pmt.aMapInfoList.Append(new RavelCMapInfo(entry.data()));
     }
     EXPECT_EQ(c.expected, SelectionOf(pmt));
@@ -251,7 +251,7 @@ TEST(PMTParse, KeepsTheDescriptorsAReceiverUsesAndTracesTheOthers) {
 
 TEST(PMTParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes good = PmtSection({{0x1B, 0x0111, {}}}, {ParentalRating(3)});
-  const std::vector<StreamSpec> streams = {{0x0F, 0x0112, {}}};
+  const std::vector<StreamDef> streams = {{0x0F, 0x0112, {}}};
   sb::SectionOptions badCrcOptions = PmtOptions(0x1234);
   badCrcOptions.corruptCrc = true;
   Bytes badCrc = sb::LongSection(badCrcOptions, PmtBody(0x0100, {}, streams));
@@ -302,7 +302,7 @@ TEST(PMTParse, RefusesNullBadCrcAndForeignTableIds) {
 
 TEST(PMTProgramInfoLoop, FailsOnAMalformedDescriptorAndKeepsTheLastParentalRating) {
   BrazilianRules rules;
-  const std::vector<StreamSpec> streams = {{0x1B, 0x0111, {}}, {0x0F, 0x0112, {}}};
+  const std::vector<StreamDef> streams = {{0x1B, 0x0111, {}}, {0x0F, 0x0112, {}}};
   struct Case {
     const char* label;
     std::vector<Bytes> programInfo;

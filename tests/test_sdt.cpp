@@ -17,7 +17,7 @@ const unsigned int kDump = 0x10000020u;
 const unsigned int kWarning = 0x40000020u;
 const unsigned int kError = 0x80000020u;
 
-struct ServiceSpec {
+struct ServiceDef {
   uint16_t serviceId;
   uint8_t eitUserDefined;  // 3 bits
   bool schedule, presentFollowing;
@@ -26,7 +26,7 @@ struct ServiceSpec {
   std::vector<Bytes> descriptors;
 };
 
-Bytes ServiceEntry(const ServiceSpec& s) {
+Bytes ServiceEntry(const ServiceDef& s) {
   Bytes entry = sb::U16(s.serviceId);
   sb::Append(entry, sb::U8(0xE0 | (s.eitUserDefined << 2) | (s.schedule ? 2 : 0) | (s.presentFollowing ? 1 : 0)));
   sb::Append(entry, sb::DescriptorLoop(s.descriptors, static_cast<uint8_t>((s.runningStatus << 1) | (s.freeCA ? 1 : 0))));
@@ -34,8 +34,8 @@ Bytes ServiceEntry(const ServiceSpec& s) {
 }
 
 // A service with the flags of a running free service: only id and descriptors vary.
-ServiceSpec Service(uint16_t id, const std::vector<Bytes>& descriptors = {}) {
-  return ServiceSpec{id, 0, true, true, 4, false, descriptors};
+ServiceDef Service(uint16_t id, const std::vector<Bytes>& descriptors = {}) {
+  return ServiceDef{id, 0, true, true, 4, false, descriptors};
 }
 
 sb::SectionOptions SdtOptions(uint8_t tableId = 0x42, uint8_t version = 2, uint16_t transportStreamId = 0x7ED0) {
@@ -46,13 +46,13 @@ sb::SectionOptions SdtOptions(uint8_t tableId = 0x42, uint8_t version = 2, uint1
   return options;
 }
 
-Bytes SdtBody(uint16_t originalNetworkId, const std::vector<ServiceSpec>& services) {
+Bytes SdtBody(uint16_t originalNetworkId, const std::vector<ServiceDef>& services) {
   Bytes body = sb::Cat({sb::U16(originalNetworkId), sb::U8(0xFF)});
-  for (const ServiceSpec& s : services) sb::Append(body, ServiceEntry(s));
+  for (const ServiceDef& s : services) sb::Append(body, ServiceEntry(s));
   return body;
 }
 
-Bytes SdtSection(const std::vector<ServiceSpec>& services, uint8_t tableId = 0x42, uint8_t version = 2,
+Bytes SdtSection(const std::vector<ServiceDef>& services, uint8_t tableId = 0x42, uint8_t version = 2,
                  uint16_t originalNetworkId = 0x0640) {
   return sb::LongSection(SdtOptions(tableId, version), SdtBody(originalNetworkId, services));
 }
@@ -112,7 +112,7 @@ TEST(ServiceDescription, DecodesFlagsAndStatusFromTheirOwnBits) {
 }
 
 TEST(SDTParse, NamesActualAndOtherAndRefusesEverythingElse) {
-  const std::vector<ServiceSpec> services = {Service(0x4800, {ServiceDescriptor(0x01, "", "TV")})};
+  const std::vector<ServiceDef> services = {Service(0x4800, {ServiceDescriptor(0x01, "", "TV")})};
   Bytes actual = SdtSection(services, 0x42);
   Bytes other = SdtSection(services, 0x46);
   Bytes nitId = SdtSection(services, 0x40);
@@ -177,7 +177,7 @@ TEST(SDTParse, KeepsOnlyTheUpperByteOfTheOriginalNetworkId) {
 TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAMalformedOne) {
   struct Case {
     const char* label;
-    std::vector<ServiceSpec> services;
+    std::vector<ServiceDef> services;
     int result;
     TraceLines traces;
     std::vector<unsigned int> ids;
@@ -237,7 +237,7 @@ TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAM
 TEST(ServiceDescription, MalformedLoopClearsTheServiceAndLaterDescriptorsReplaceEarlierOnes) {
   struct Case {
     const char* label;
-    ServiceSpec spec;
+    ServiceDef entryDef;
     int result;
     unsigned short id;
     bool service, logo, country;
@@ -254,7 +254,7 @@ TEST(ServiceDescription, MalformedLoopClearsTheServiceAndLaterDescriptorsReplace
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes entry = ServiceEntry(c.spec);
+    Bytes entry = ServiceEntry(c.entryDef);
     RavelCServiceDescription service(nullptr);
     EXPECT_EQ(c.result, service.ParseRawData(entry.data()));
     EXPECT_EQ(c.id, service.GetServiceId());
@@ -382,7 +382,7 @@ TEST(SDTCopy, CopiesHeaderNameNetworkIdAndEveryService) {
 
 TEST(SDTShow, DumpsHeaderBodyAndEachServiceWithItsDescriptors) {
   Bytes section = SdtSection(
-      {ServiceSpec{0x4980, 5, false, true, 1, true,
+      {ServiceDef{0x4980, 5, false, true, 1, true,
                    {CountryAvailability("BRA"), LogoType1(3, 0x12, 0x4980), ServiceDescriptor(0xC0, "Pr", "Seg")}},
        Service(0x4800)},
       0x42, 2, 0x0640);
