@@ -568,6 +568,77 @@ TEST_F(RavelDumpTest, ObjectCarouselCaptureModulesAreComplete) {
   EXPECT_NE(std::string::npos, run.err.find("0x076a       6405")) << run.err;
 }
 
+// --- Real captures --------------------------------------------------------------
+
+TEST_F(RavelDumpTest, JapanesePsiSectionsGiveServicesAndTheirPids) {
+  std::string capture = captures::Path("isdbt-japan-psi.sections");
+  if (capture.empty()) GTEST_SKIP() << "shared capture isdbt-japan-psi.sections absent";
+  ToolRun run = Run({"--sections", "--standard", "japan", "--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  nlohmann::json summary = nlohmann::json::parse(run.out);
+  EXPECT_EQ("japan", summary["standard"].get<std::string>());
+  EXPECT_EQ(0x7ED0, summary["transport_stream_id"].get<int>());
+  struct Expect {
+    int id, pmt, video;
+    std::vector<int> audio;
+    int captions;
+    bool oneSegment;
+  } expected[] = {
+      // The PAT's order: by program number, the one-segment program last.
+      {0x4800, 0x01F0, 0x0100, {0x0110}, 0x0130, false},
+      {0x4801, 0x03F0, 0x0100, {0x0110}, 0x0130, false},
+      {0xFFF0, 0x1CF0, -1, {}, -1, false},
+      {0x4980, 0x1FC8, 0x0581, {0x0583}, 0x0587, true},
+  };
+  const nlohmann::json& services = summary["services"];
+  ASSERT_EQ(4u, services.size()) << services.dump(1);
+  for (size_t i = 0; i < 4; ++i) {
+    const Expect& e = expected[i];
+    const nlohmann::json& s = services[i];
+    EXPECT_EQ(e.id, s["id"].get<int>());
+    EXPECT_EQ(e.pmt, s["pmt_pid"].get<int>()) << e.id;
+    EXPECT_EQ(e.video, s["video_pid"].is_null() ? -1 : s["video_pid"].get<int>()) << e.id;
+    EXPECT_EQ(e.audio, s["audio_pids"].get<std::vector<int>>()) << e.id;
+    EXPECT_EQ(e.captions, s["caption_pid"].is_null() ? -1 : s["caption_pid"].get<int>()) << e.id;
+    EXPECT_EQ(e.oneSegment, s["one_segment"].get<bool>()) << e.id;
+  }
+  EXPECT_FALSE(summary["network"].is_null());
+  EXPECT_EQ(0x7ED0, summary["network"]["id"].get<int>());
+}
+
+TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
+  std::string capture = captures::Path("ait.ts");
+  if (capture.empty()) GTEST_SKIP() << "shared capture ait.ts absent";
+  ToolRun run = Run({"--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  // The AIT PIDs are found as a receiver finds them: named by the PMTs.
+  EXPECT_NE(std::string::npos, run.err.find("  0x1ec5          2          0        0         2  AIT\n")) << run.err;
+  struct Expect {
+    int pid;
+    unsigned applicationId, controlCode;
+    const char* name;
+  } expected[] = {
+      {0x1EC5, 0x1AB5, 2, "Programmi TV BB SAT"},
+      {0x1EC6, 0x1AB6, 1, "Launcher SAT"},
+      {0x1EC7, 0x1AB7, 2, "Programmi TV SAT"},
+  };
+  nlohmann::json applications = nlohmann::json::parse(run.out)["applications"];
+  ASSERT_EQ(3u, applications.size()) << applications.dump(1);
+  for (const Expect& e : expected) {
+    bool found = false;
+    for (const nlohmann::json& app : applications) {
+      if (app["pid"].get<int>() != e.pid) continue;
+      found = true;
+      EXPECT_EQ(0x0Bu, app["organization_id"].get<unsigned>());
+      EXPECT_EQ(e.applicationId, app["application_id"].get<unsigned>());
+      EXPECT_EQ(e.controlCode, app["control_code"].get<unsigned>());
+      EXPECT_EQ(e.name, app["name"].get<std::string>());
+      EXPECT_EQ(1, app["application_type"].get<int>());
+    }
+    EXPECT_TRUE(found) << e.name;
+  }
+}
+
 }  // namespace
 
 #endif  // RAVEL_DUMP_PATH

@@ -5,6 +5,7 @@
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
 
 namespace ravel_dump {
 namespace {
@@ -15,6 +16,30 @@ int FollowPat(int pid, RavelCPAT& pat, Demux* demux) {
   for (int i = 0; i < pat.aProgramList.iCount; ++i) demux->AddSectionPid(pat.aProgramList.ipArray[i]->iPID, PidRole::kPmt);
   if (pat.iNetworkPID != 0xFFFF) demux->AddSectionPid(pat.iNetworkPID, PidRole::kNit);
   return 0;
+}
+
+// A PMT names the PIDs of its streams; those that carry sections are read:
+// the AIT (private sections, stream_type 0x05), DSM-CC carousels (0x0B, 0x0D)
+// and stream descriptors (0x0C) (ISO/IEC 13818-1 table 2-34, ABNT NBR 15606-3).
+void FollowPmt(RavelCPMT& pmt, Demux* demux) {
+  if (demux == nullptr) return;
+  for (int i = 0; i < pmt.aMapInfoList.iCount; ++i) {
+    const RavelCMapInfo* stream = pmt.aMapInfoList.ipArray[i];
+    switch (stream->iStreamType) {
+      case 0x05:
+        demux->AddSectionPid(stream->iElementaryPID, PidRole::kAit);
+        break;
+      case 0x0B:
+      case 0x0D:
+        demux->AddSectionPid(stream->iElementaryPID, PidRole::kCarousel);
+        break;
+      case 0x0C:
+        demux->AddSectionPid(stream->iElementaryPID, PidRole::kStreamEvents);
+        break;
+      default:
+        break;
+    }
+  }
 }
 
 // The DII lists the modules of a download with their sizes and versions.
@@ -55,6 +80,12 @@ int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t 
     RavelCPAT pat(nullptr);
     int result = pat.ParseRawData(buffer.Section());
     if (result == 0) FollowPat(pid, pat, demux);
+    return result;
+  }
+  if (kind == TableKind::kPmt) {
+    RavelCPMT pmt(nullptr);
+    int result = pmt.ParseRawData(buffer.Section());
+    if (result == 0) FollowPmt(pmt, demux);
     return result;
   }
   if (kind == TableKind::kDii) return ListModules(pid, buffer.Message(), carousel);

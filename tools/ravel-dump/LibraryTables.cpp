@@ -8,6 +8,8 @@
 #include "Ravel_CTableBIT.h"
 #include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
 
 namespace ravel_dump {
@@ -63,8 +65,12 @@ std::unique_ptr<TableObject> MakeTableObject(TableKind kind) {
   switch (kind) {
     case TableKind::kPat:
       return std::unique_ptr<TableObject>(new Table<RavelCPAT>);
+    case TableKind::kPmt:
+      return std::unique_ptr<TableObject>(new JoinedTable<RavelCPMT>);
     case TableKind::kNit:
       return std::unique_ptr<TableObject>(new JoinedTable<RavelCNIT>);
+    case TableKind::kSdt:
+      return std::unique_ptr<TableObject>(new JoinedTable<RavelCSDT>);
     case TableKind::kBit:
       return std::unique_ptr<TableObject>(new JoinedTable<RavelCBIT>);
     case TableKind::kAit:

@@ -18,6 +18,8 @@
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 
 namespace ravel_dump {
 namespace {
@@ -77,7 +79,64 @@ void AddPat(const TableRegistry& registry, Summary& summary) {
   });
 }
 
+// Each service's PMT: the PIDs the receiver would play.
+void AddPmts(const TableRegistry& registry, Summary& summary) {
+  for (ServiceSummary& service : summary.services) {
+    const TableEntry* table = Latest(registry, TableKind::kPmt, [&](const TableEntry& t) {
+      return t.extension == service.id && (service.pmtPid < 0 || t.pid == service.pmtPid || t.pid == kNoPid);
+    });
+    if (table == nullptr) continue;
+    RavelCPMT pmt(nullptr);
+    bool any = false;
+    EachSection<RavelCPMT>(*table, [&](RavelCPMT& section) {
+      if (!any) {
+        pmt = section;
+        any = true;
+      } else {
+        pmt += section;
+      }
+    });
+    if (!any) continue;
+    if (service.pmtPid < 0 && table->pid != kNoPid) service.pmtPid = table->pid;
+    service.pcrPid = pmt.iPCRPID;
+    unsigned short video = pmt.GetVideoPID();
+    service.videoPid = video != 0 ? video : -1;
+    for (unsigned char n = 0, count = pmt.GetAudioPIDCount(); n < count; ++n) {
+      service.audioPids.push_back(pmt.GetAudioPID(n));
+    }
+    unsigned short captions = pmt.GetCCPID();
+    service.captionPid = captions != 0 ? captions : -1;
+    for (int i = 0; i < pmt.aMapInfoList.iCount; ++i) {
+      const RavelCMapInfo* info = pmt.aMapInfoList.ipArray[i];
+      StreamSummary stream;
+      stream.streamType = info->iStreamType;
+      stream.pid = info->iElementaryPID;
+      if (info->pStreamIdentifier != nullptr) stream.componentTag = info->pStreamIdentifier->iComponentTag;
+      service.streams.push_back(stream);
+    }
+  }
+}
 
+// The SDT of this stream: service types, names and providers.
+void AddSdt(const TableRegistry& registry, Summary& summary) {
+  int tsId = summary.transportStreamId;
+  const TableEntry* table = Latest(registry, TableKind::kSdt, [&](const TableEntry& t) {
+    return t.tableId == 0x42 && (tsId < 0 || t.extension == tsId);
+  });
+  if (table == nullptr) return;
+  if (summary.transportStreamId < 0) summary.transportStreamId = table->extension;
+  EachSection<RavelCSDT>(*table, [&](RavelCSDT& sdt) {
+    for (int i = 0; i < sdt.aServiceList.iCount; ++i) {
+      const RavelCServiceDescription* description = sdt.aServiceList.ipArray[i];
+      ServiceSummary& service = ServiceOf(summary.services, description->iServiceId);
+      if (description->pService != nullptr) {
+        service.type = description->pService->iServiceType;
+        service.name = Text(description->pService->pServiceName);
+        service.provider = Text(description->pService->pServiceProviderName);
+      }
+    }
+  });
+}
 
 // The NIT of this network: its name and transport streams.
 void AddNit(const TableRegistry& registry, Summary& summary) {
@@ -163,6 +222,8 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   Summary summary;
   summary.standard = RavelCfg_GetStandard() == 1 ? "japan" : "brazil";
   AddPat(registry, summary);
+  AddSdt(registry, summary);
+  AddPmts(registry, summary);
   AddNit(registry, summary);
   AddApplications(registry, summary);
   summary.carousels = carousel.Summarize();
