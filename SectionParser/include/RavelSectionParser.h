@@ -30,6 +30,8 @@
 #include "Ravel_CTableBase.h"
 #include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
 
 // DSM-CC data carousel.
