@@ -67,21 +67,21 @@ class RavelCEventInfo {
   int iDurationHour;
   int iDurationMinute;
   int iDurationSecond;
-  unsigned char iRunningStatus;          // 3 bits
-  unsigned char bFreeCAMode;             // 1 bit
-  unsigned short iDescriptorsLoopLength;  // 12 bits
-  unsigned char iSpare;                  // cleared and copied, never parsed
-  RavelCShortEventDescriptor* pShortEventDescriptor;            // 0x4D, owned
-  RavelCContentDescriptor* pContentDescriptor;                  // 0x54, owned
-  RavelCComponentDescriptor* pComponentDescriptor;              // 0x50, owned
-  RavelCParentalRatingDescriptor* pParentalRatingDescriptor;    // 0x55, owned
+  unsigned char iRunningStatus;                               // 3 bits
+  unsigned char bFreeCAMode;                                  // 1 bit
+  unsigned short iDescriptorsLoopLength;                      // 12 bits
+  unsigned char iSpare;                                       // cleared and copied, never parsed
+  RavelCShortEventDescriptor* pShortEventDescriptor;          // 0x4D, owned
+  RavelCContentDescriptor* pContentDescriptor;                // 0x54, owned
+  RavelCComponentDescriptor* pComponentDescriptor;            // 0x50, owned
+  RavelCParentalRatingDescriptor* pParentalRatingDescriptor;  // 0x55, owned
   // Every audio component descriptor (0xC4) in arrival order; the list releases
   // them when emptied. Null only after a parse failed on a malformed descriptor.
   list_head* pAudioComponentList;
-  RavelCCopyrightDescriptor* pCopyrightDescriptor;              // 0x0D, owned
+  RavelCCopyrightDescriptor* pCopyrightDescriptor;  // 0x0D, owned
   // Only the last of an event's extended event descriptors is kept.
-  RavelCExtendedEventDescriptor* pExtendedEventDescriptor;      // 0x4E, owned
-  RavelCSeriesDescriptor* pSeriesDescriptor;                    // 0xD5, owned
+  RavelCExtendedEventDescriptor* pExtendedEventDescriptor;  // 0x4E, owned
+  RavelCSeriesDescriptor* pSeriesDescriptor;                // 0xD5, owned
 
  private:
   void DeleteDescriptors();

@@ -203,7 +203,7 @@ int RavelCEventInfo::ParseRawData(unsigned char* event) {
   iDurationHour = RavelBcd(event[7]);
   iDurationMinute = RavelBcd(event[8]);
   iDurationSecond = RavelBcd(event[9]);
-  iRunningStatus = static_cast<unsigned char>(event[10] >> 5);       // xxx.....
+  iRunningStatus = static_cast<unsigned char>(event[10] >> 5);        // xxx.....
   bFreeCAMode = static_cast<unsigned char>((event[10] >> 4) & 0x01);  // ...x....
   iDescriptorsLoopLength = RavelRead12(event + 10);                   // ....xxxx xxxxxxxx
   if (iDescriptorsLoopLength == 0) return kRavelOk;
@@ -283,13 +283,9 @@ void RavelCEventInfo::Show() {
 }
 
 int RavelCEventInfo::operator<(const RavelCEventInfo& other) const { return cStartTime < other.cStartTime ? 1 : 0; }
-int RavelCEventInfo::operator<=(const RavelCEventInfo& other) const {
-  return cStartTime <= other.cStartTime ? 1 : 0;
-}
+int RavelCEventInfo::operator<=(const RavelCEventInfo& other) const { return cStartTime <= other.cStartTime ? 1 : 0; }
 int RavelCEventInfo::operator>(const RavelCEventInfo& other) const { return cStartTime > other.cStartTime ? 1 : 0; }
-int RavelCEventInfo::operator>=(const RavelCEventInfo& other) const {
-  return cStartTime >= other.cStartTime ? 1 : 0;
-}
+int RavelCEventInfo::operator>=(const RavelCEventInfo& other) const { return cStartTime >= other.cStartTime ? 1 : 0; }
 
 // ---------------------------------------------------------------------------
 // RavelCEIT
@@ -353,8 +349,8 @@ RavelCEIT& RavelCEIT::operator+=(RavelCEIT& other) {
   RAVEL_TRACE(RAVEL_PARSER_ERROR, "Two EIT Information have different information!\n");
   RAVEL_TRACE(RAVEL_PARSER_ERROR, "THIS: TS ID=[%d], Org Network ID=[%d], VersionNum=[%d]\n", iTransportStreamId,
               iOriginalNetworkId, iVersionNumber);
-  RAVEL_TRACE(RAVEL_PARSER_ERROR, "OTHER: TS ID=[%d], Org Network ID=[%d], VersionNum=[%d]\n",
-              other.iTransportStreamId, other.iOriginalNetworkId, other.iVersionNumber);
+  RAVEL_TRACE(RAVEL_PARSER_ERROR, "OTHER: TS ID=[%d], Org Network ID=[%d], VersionNum=[%d]\n", other.iTransportStreamId,
+              other.iOriginalNetworkId, other.iVersionNumber);
   return *this;
 }
 
