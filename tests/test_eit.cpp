@@ -37,13 +37,13 @@ const std::string kParseFail = "EIT Info Parsing Fail! Maybe data has been corru
 // Builders
 
 Bytes ShortEvent(const std::string& name, const std::string& text = "", const std::string& language = "jpn") {
-  return sb::Descriptor(0x4D, sb::Cat({sb::Text(language), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()),
-                                       sb::Text(text)}));
+  return sb::Descriptor(
+      0x4D, sb::Cat({sb::Text(language), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()), sb::Text(text)}));
 }
 
 Bytes ExtendedEvent(unsigned int number, unsigned int last, const std::string& text) {
-  return sb::Descriptor(0x4E, sb::Cat({sb::U8(number << 4 | last), sb::Text("jpn"), sb::U8(0), sb::U8(text.size()),
-                                       sb::Text(text)}));
+  return sb::Descriptor(
+      0x4E, sb::Cat({sb::U8(number << 4 | last), sb::Text("jpn"), sb::U8(0), sb::U8(text.size()), sb::Text(text)}));
 }
 
 // stream_content 2 (audio), main component, quality 1, sampling rate 7.
@@ -63,13 +63,13 @@ Bytes ParentalRating(uint8_t rating) { return sb::Descriptor(0x55, sb::Cat({sb::
 Bytes Copyright(uint32_t id) { return sb::Descriptor(0x0D, sb::Cat({sb::U32(id), sb::Text("(c)")})); }
 
 Bytes Series(uint16_t seriesId, const std::string& name) {
-  return sb::Descriptor(0xD5, sb::Cat({sb::U16(seriesId), sb::U8(0x11), sb::U16(0xE4CD), sb::U24(0x001002),
-                                       sb::Text(name)}));
+  return sb::Descriptor(0xD5,
+                        sb::Cat({sb::U16(seriesId), sb::U8(0x11), sb::U16(0xE4CD), sb::U24(0x001002), sb::Text(name)}));
 }
 
 Bytes DigitalCopyControl() { return sb::Descriptor(0xC1, sb::U8(0x84)); }
 
-struct EventSpec {
+struct EventRecord {
   uint16_t eventId;
   Bytes start;     // 16-bit MJD and three BCD bytes
   Bytes duration;  // three BCD bytes
@@ -78,7 +78,7 @@ struct EventSpec {
   std::vector<Bytes> descriptors;
 };
 
-Bytes EventBytes(const EventSpec& e) {
+Bytes EventBytes(const EventRecord& e) {
   Bytes d = sb::Cat(e.descriptors);
   return sb::Cat({sb::U16(e.eventId), e.start, e.duration,
                   sb::Length12(d.size(), static_cast<uint8_t>(e.runningStatus << 1 | e.freeCAMode)), d});
@@ -93,11 +93,11 @@ Bytes Duration(int hours, int minutes, int seconds = 0) {
 }
 
 // An event at `start` lasting 30 minutes, with descriptors.
-EventSpec Ev(uint16_t eventId, const Bytes& start, const std::vector<Bytes>& descriptors = {}) {
-  return EventSpec{eventId, start, Duration(0, 30), 4, 0, descriptors};
+EventRecord Ev(uint16_t eventId, const Bytes& start, const std::vector<Bytes>& descriptors = {}) {
+  return EventRecord{eventId, start, Duration(0, 30), 4, 0, descriptors};
 }
 
-struct EitSpec {
+struct EitOptions {
   uint8_t tableId = 0x4E;
   uint16_t serviceId = 0x4800;
   uint8_t version = 4;
@@ -110,22 +110,23 @@ struct EitSpec {
   bool corruptCrc = false;
 };
 
-Bytes EitSection(const EitSpec& spec, const Bytes& events) {
-  sb::SectionOptions options;
-  options.tableId = spec.tableId;
-  options.tableIdExtension = spec.serviceId;
-  options.version = spec.version;
-  options.sectionNumber = spec.sectionNumber;
-  options.lastSectionNumber = spec.lastSectionNumber;
-  options.corruptCrc = spec.corruptCrc;
-  return sb::LongSection(options, sb::Cat({sb::U16(spec.transportStreamId), sb::U16(spec.originalNetworkId),
-                                           sb::U8(spec.segmentLastSectionNumber), sb::U8(spec.lastTableId), events}));
+Bytes EitSection(const EitOptions& options, const Bytes& events) {
+  sb::SectionOptions sectionOptions;
+  sectionOptions.tableId = options.tableId;
+  sectionOptions.tableIdExtension = options.serviceId;
+  sectionOptions.version = options.version;
+  sectionOptions.sectionNumber = options.sectionNumber;
+  sectionOptions.lastSectionNumber = options.lastSectionNumber;
+  sectionOptions.corruptCrc = options.corruptCrc;
+  return sb::LongSection(sectionOptions,
+                         sb::Cat({sb::U16(options.transportStreamId), sb::U16(options.originalNetworkId),
+                                  sb::U8(options.segmentLastSectionNumber), sb::U8(options.lastTableId), events}));
 }
 
-Bytes EitSection(const EitSpec& spec, const std::vector<EventSpec>& events) {
+Bytes EitSection(const EitOptions& options, const std::vector<EventRecord>& events) {
   Bytes all;
-  for (const EventSpec& e : events) sb::Append(all, EventBytes(e));
-  return EitSection(spec, all);
+  for (const EventRecord& e : events) sb::Append(all, EventBytes(e));
+  return EitSection(options, all);
 }
 
 // ---------------------------------------------------------------------------
@@ -168,7 +169,8 @@ std::string Holdings(RavelCEventInfo& e) {
 
 Bytes FromHex(const std::string& hex) {
   Bytes out;
-  for (size_t i = 0; i + 1 < hex.size(); i += 2) out.push_back(static_cast<uint8_t>(std::stoi(hex.substr(i, 2), 0, 16)));
+  for (size_t i = 0; i + 1 < hex.size(); i += 2)
+    out.push_back(static_cast<uint8_t>(std::stoi(hex.substr(i, 2), 0, 16)));
   return out;
 }
 
@@ -198,26 +200,75 @@ TEST(EITEventFields, StartTimesFollowTheDateRuleAndBcdIsNotValidated) {
     int freeCA;
   } cases[] = {
       {"ordinary day", At(2020, 4, 5, 19, 0), Duration(0, 30), 0x8, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, {0, 30, 0}, 4, 0},
-      {"leap day", At(2012, 2, 29, 23, 59, 59), Duration(1, 0, 5), 0x9, {2012, 2, 29, 23, 59, 59, 0, 0, 0}, {1, 0, 5}, 4,
+      {"leap day",
+       At(2012, 2, 29, 23, 59, 59),
+       Duration(1, 0, 5),
+       0x9,
+       {2012, 2, 29, 23, 59, 59, 0, 0, 0},
+       {1, 0, 5},
+       4,
        1},
-      {"1 January: previous year's 32 December", At(2013, 1, 1, 0, 0), Duration(0, 1), 0x2,
-       {2012, 12, 32, 0, 0, 0, 0, 0, 0}, {0, 1, 0}, 1, 0},
-      {"2 January is right", At(2013, 1, 2, 6, 15), Duration(0, 1), 0x2, {2013, 1, 2, 6, 15, 0, 0, 0, 0}, {0, 1, 0}, 1,
+      {"1 January: previous year's 32 December",
+       At(2013, 1, 1, 0, 0),
+       Duration(0, 1),
+       0x2,
+       {2012, 12, 32, 0, 0, 0, 0, 0, 0},
+       {0, 1, 0},
+       1,
        0},
-      {"1 March: 32 February", At(2013, 3, 1, 12, 0), Duration(2, 0), 0xE, {2013, 2, 32, 12, 0, 0, 0, 0, 0}, {2, 0, 0},
-       7, 0},
-      {"1 May: 31 April", At(2014, 5, 1, 12, 0), Duration(2, 0), 0x6, {2014, 4, 31, 12, 0, 0, 0, 0, 0}, {2, 0, 0}, 3, 0},
-      {"1 October: 31 September", At(2019, 10, 1, 1, 2, 3), Duration(0, 0, 1), 0x0, {2019, 9, 31, 1, 2, 3, 0, 0, 0},
-       {0, 0, 1}, 0, 0},
-      {"BCD digits unchecked", Bytes{0xE4, 0x89, 0x99, 0x9A, 0xFF}, Bytes{0xFF, 0x9A, 0x99}, 0x1,
-       {2019, 1, 22, 99, 100, 165, 0, 0, 0}, {165, 100, 99}, 0, 1},
-      {"MJD 0 is not range-checked", Bytes{0x00, 0x00, 0x00, 0x00, 0x00}, Duration(0, 0), 0xF,
-       {1859, -1, 19, 0, 0, 0, 0, 0, 0}, {0, 0, 0}, 7, 1},
+      {"2 January is right",
+       At(2013, 1, 2, 6, 15),
+       Duration(0, 1),
+       0x2,
+       {2013, 1, 2, 6, 15, 0, 0, 0, 0},
+       {0, 1, 0},
+       1,
+       0},
+      {"1 March: 32 February",
+       At(2013, 3, 1, 12, 0),
+       Duration(2, 0),
+       0xE,
+       {2013, 2, 32, 12, 0, 0, 0, 0, 0},
+       {2, 0, 0},
+       7,
+       0},
+      {"1 May: 31 April",
+       At(2014, 5, 1, 12, 0),
+       Duration(2, 0),
+       0x6,
+       {2014, 4, 31, 12, 0, 0, 0, 0, 0},
+       {2, 0, 0},
+       3,
+       0},
+      {"1 October: 31 September",
+       At(2019, 10, 1, 1, 2, 3),
+       Duration(0, 0, 1),
+       0x0,
+       {2019, 9, 31, 1, 2, 3, 0, 0, 0},
+       {0, 0, 1},
+       0,
+       0},
+      {"BCD digits unchecked",
+       Bytes{0xE4, 0x89, 0x99, 0x9A, 0xFF},
+       Bytes{0xFF, 0x9A, 0x99},
+       0x1,
+       {2019, 1, 22, 99, 100, 165, 0, 0, 0},
+       {165, 100, 99},
+       0,
+       1},
+      {"MJD 0 is not range-checked",
+       Bytes{0x00, 0x00, 0x00, 0x00, 0x00},
+       Duration(0, 0),
+       0xF,
+       {1859, -1, 19, 0, 0, 0, 0, 0, 0},
+       {0, 0, 0},
+       7,
+       1},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     Bytes events = sb::Cat({sb::U16(0x1234), c.start, c.duration, Bytes{static_cast<uint8_t>(c.flags << 4), 0x00}});
-    Bytes section = EitSection(EitSpec(), events);
+    Bytes section = EitSection(EitOptions(), events);
     TraceRecorder recorder;
     RavelCEIT eit(section.data());
     EXPECT_TRUE(recorder.Lines().empty());
@@ -300,7 +351,7 @@ TEST(EITEventDescriptors, LastOfEachKindWinsAndEveryAudioComponentIsKept) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes section = EitSection(EitSpec(), {Ev(7, At(2020, 4, 5, 19, 0), c.descriptors)});
+    Bytes section = EitSection(EitOptions(), {Ev(7, At(2020, 4, 5, 19, 0), c.descriptors)});
     TraceRecorder recorder;
     RavelCEIT eit(section.data());
     TraceLines expected;
@@ -367,11 +418,16 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
 }
 
 TEST(EITEventDescriptors, CopiesAreDeepAndSelfAssignmentDropsTheDescriptors) {
-  Bytes raw = EventBytes(EventSpec{0x0EDE, At(2020, 4, 5, 19, 30), Duration(0, 30), 2, 1,
-                                   {ShortEvent("Name", "Text"), Content(0x82), Component(0xB3), ParentalRating(0x05),
-                                    AudioComponent(0x10), AudioComponent(0x11), Copyright(4),
-                                    ExtendedEvent(1, 1, "more"), Series(9, "Series")}});
-  const std::string all = "short:Name content:130 component:179 rating:16 audio:16 audio:17 copyright:4 extended:1 series:9 ";
+  Bytes raw = EventBytes(EventRecord{
+      0x0EDE,
+      At(2020, 4, 5, 19, 30),
+      Duration(0, 30),
+      2,
+      1,
+      {ShortEvent("Name", "Text"), Content(0x82), Component(0xB3), ParentalRating(0x05), AudioComponent(0x10),
+       AudioComponent(0x11), Copyright(4), ExtendedEvent(1, 1, "more"), Series(9, "Series")}});
+  const std::string all =
+      "short:Name content:130 component:179 rating:16 audio:16 audio:17 copyright:4 extended:1 series:9 ";
   std::unique_ptr<RavelCEventInfo> source(new RavelCEventInfo(raw.data()));
   source->iSpare = 0x33;
   ASSERT_EQ(all, Holdings(*source));
@@ -435,17 +491,17 @@ TEST(EITParse, AcceptsPresentFollowingTheFirstActualScheduleAndOtherSchedules) {
       {0x70, kRavelErrInvalidArgument, nullptr},
       {0x00, kRavelErrInvalidArgument, nullptr},
   };
-  Bytes previous = EitSection(EitSpec(), {Ev(1, At(2020, 4, 5, 19, 0))});
+  Bytes previous = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0))});
   for (const Case& c : cases) {
     SCOPED_TRACE(c.tableId);
-    EitSpec spec;
-    spec.tableId = c.tableId;
-    spec.serviceId = 0x4801;
-    spec.transportStreamId = 0x1111;
-    spec.originalNetworkId = 0x2222;
-    spec.segmentLastSectionNumber = 8;
-    spec.lastTableId = 0x51;
-    Bytes section = EitSection(spec, {Ev(2, At(2020, 4, 5, 20, 0)), Ev(3, At(2020, 4, 5, 21, 0))});
+    EitOptions options;
+    options.tableId = c.tableId;
+    options.serviceId = 0x4801;
+    options.transportStreamId = 0x1111;
+    options.originalNetworkId = 0x2222;
+    options.segmentLastSectionNumber = 8;
+    options.lastTableId = 0x51;
+    Bytes section = EitSection(options, {Ev(2, At(2020, 4, 5, 20, 0)), Ev(3, At(2020, 4, 5, 21, 0))});
     RavelCEIT eit(previous.data());
     ASSERT_EQ(1, eit.GetEventCount());
     TraceRecorder recorder;
@@ -471,21 +527,21 @@ TEST(EITParse, AcceptsPresentFollowingTheFirstActualScheduleAndOtherSchedules) {
 }
 
 TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
-  EitSpec badCrcSpec;
-  badCrcSpec.corruptCrc = true;
-  badCrcSpec.tableId = 0x4F;
-  badCrcSpec.version = 9;
-  Bytes badCrc = EitSection(badCrcSpec, {Ev(2, At(2020, 4, 5, 20, 0))});
-  EitSpec otherSpec;
-  otherSpec.tableId = 0x4F;
-  otherSpec.version = 9;
-  otherSpec.serviceId = 0x0101;
-  Bytes zeroLength = EitSection(
-      otherSpec, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}), Ev(3, At(2020, 4, 5, 21, 0), {Bytes{0x4D, 0x00}})});
-  Bytes zeroTag = EitSection(otherSpec, {Ev(2, At(2020, 4, 5, 20, 0), {Bytes{0x00, 0x03, 1, 2, 3}})});
+  EitOptions badCrcOptions;
+  badCrcOptions.corruptCrc = true;
+  badCrcOptions.tableId = 0x4F;
+  badCrcOptions.version = 9;
+  Bytes badCrc = EitSection(badCrcOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
+  EitOptions otherOptions;
+  otherOptions.tableId = 0x4F;
+  otherOptions.version = 9;
+  otherOptions.serviceId = 0x0101;
+  Bytes zeroLength = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}),
+                                               Ev(3, At(2020, 4, 5, 21, 0), {Bytes{0x4D, 0x00}})});
+  Bytes zeroTag = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {Bytes{0x00, 0x03, 1, 2, 3}})});
   Bytes badCrcAndTableId = EitSection(
       [] {
-        EitSpec s;
+        EitOptions s;
         s.tableId = 0x51;
         s.corruptCrc = true;
         return s;
@@ -500,18 +556,28 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
     bool headerParsed;
   } cases[] = {
       {"null", nullptr, kRavelErrInvalidArgument, {}, false},
-      {"bad CRC: the header is not parsed", &badCrc, kRavelErrCorruptSection,
-       {{kWarning, "EIT Section: CRC Error!\n"}}, false},
-      {"the CRC is checked before the table_id", &badCrcAndTableId, kRavelErrCorruptSection,
-       {{kWarning, "EIT Section: CRC Error!\n"}}, false},
-      {"zero-length descriptor in the second event", &zeroLength, kRavelErrCorruptSection,
+      {"bad CRC: the header is not parsed",
+       &badCrc,
+       kRavelErrCorruptSection,
+       {{kWarning, "EIT Section: CRC Error!\n"}},
+       false},
+      {"the CRC is checked before the table_id",
+       &badCrcAndTableId,
+       kRavelErrCorruptSection,
+       {{kWarning, "EIT Section: CRC Error!\n"}},
+       false},
+      {"zero-length descriptor in the second event",
+       &zeroLength,
+       kRavelErrCorruptSection,
        {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x4d], descrLen=[0]\n"}, {kWarning, kParseFail}},
        true},
-      {"descriptor tag 0", &zeroTag, kRavelErrCorruptSection,
+      {"descriptor tag 0",
+       &zeroTag,
+       kRavelErrCorruptSection,
        {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x00], descrLen=[3]\n"}, {kWarning, kParseFail}},
        true},
   };
-  Bytes previous = EitSection(EitSpec(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(5, At(2020, 4, 5, 19, 30))});
+  Bytes previous = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(5, At(2020, 4, 5, 19, 30))});
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCEIT eit(previous.data());
@@ -546,16 +612,21 @@ TEST(EITParse, EventLoopRunsFromByte14ToTheFirstCrcByte) {
     std::vector<std::string> warnings;
   } cases[] = {
       {"no events: section_length 15", Bytes(), {}, {}, {}},
-      {"events without descriptors", sb::Cat({EventBytes(Ev(1, At(2020, 1, 2, 0, 0))), EventBytes(Ev(2, At(2020, 1, 2, 1, 0)))}),
-       {1, 2}, {0, 0}, {}},
+      {"events without descriptors",
+       sb::Cat({EventBytes(Ev(1, At(2020, 1, 2, 0, 0))), EventBytes(Ev(2, At(2020, 1, 2, 1, 0)))}),
+       {1, 2},
+       {0, 0},
+       {}},
       {"each event steps by 12 + its loop length",
        sb::Cat({EventBytes(Ev(3, At(2020, 1, 2, 0, 0), {ShortEvent("a"), AudioComponent(1)})),
                 EventBytes(Ev(4, At(2020, 1, 2, 1, 0))), EventBytes(Ev(5, At(2020, 1, 2, 2, 0), {Content(1)}))}),
-       {3, 4, 5}, {19, 0, 4}, {"raw genre = 0x1!\n"}},
+       {3, 4, 5},
+       {19, 0, 4},
+       {"raw genre = 0x1!\n"}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes section = EitSection(EitSpec(), c.events);
+    Bytes section = EitSection(EitOptions(), c.events);
     TraceRecorder recorder;
     RavelCEIT eit(section.data());
     EXPECT_EQ(c.warnings, recorder.TextsAt(kWarning));
@@ -566,7 +637,7 @@ TEST(EITParse, EventLoopRunsFromByte14ToTheFirstCrcByte) {
     for (int i = 0; i < eit.GetEventCount(); ++i) lengths.push_back(eit.GetEventInfo(i)->iDescriptorsLoopLength);
     EXPECT_EQ(c.loopLengths, lengths);
   }
-  EXPECT_EQ(15u, EitSection(EitSpec(), Bytes()).size() - 3);
+  EXPECT_EQ(15u, EitSection(EitOptions(), Bytes()).size() - 3);
 }
 
 TEST(EITParse, ConstructedOverNullIsEmptyAndReparseReplaces) {
@@ -577,11 +648,11 @@ TEST(EITParse, ConstructedOverNullIsEmptyAndReparseReplaces) {
   EXPECT_TRUE(eit.sTableName.IsEmpty());
   EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
 
-  Bytes first = EitSection(EitSpec(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(2, At(2020, 4, 5, 19, 30))});
-  EitSpec secondSpec;
-  secondSpec.tableId = 0x60;
-  secondSpec.transportStreamId = 0x0001;
-  Bytes second = EitSection(secondSpec, {Ev(9, At(2020, 4, 6, 0, 0))});
+  Bytes first = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(2, At(2020, 4, 5, 19, 30))});
+  EitOptions secondOptions;
+  secondOptions.tableId = 0x60;
+  secondOptions.transportStreamId = 0x0001;
+  Bytes second = EitSection(secondOptions, {Ev(9, At(2020, 4, 6, 0, 0))});
   EXPECT_EQ(kRavelOk, eit.ParseRawData(first.data()));
   EXPECT_EQ((std::vector<int>{1, 2}), EventIds(eit));
   EXPECT_EQ(kRavelOk, eit.ParseRawData(second.data()));
@@ -596,34 +667,40 @@ TEST(EITParse, ConstructedOverNullIsEmptyAndReparseReplaces) {
 TEST(EITMerge, JoinsMatchingTablesSortedByStartTimeKeepingTiesInOrder) {
   struct Case {
     const char* label;
-    std::vector<EventSpec> mine;
-    std::vector<EventSpec> theirs;
+    std::vector<EventRecord> mine;
+    std::vector<EventRecord> theirs;
     std::vector<int> ids;
   } cases[] = {
-      {"out of order across sections", {Ev(3, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
-       {Ev(2, At(2020, 4, 5, 20, 0)), Ev(0, At(2020, 4, 5, 18, 0))}, {0, 1, 2, 3}},
+      {"out of order across sections",
+       {Ev(3, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
+       {Ev(2, At(2020, 4, 5, 20, 0)), Ev(0, At(2020, 4, 5, 18, 0))},
+       {0, 1, 2, 3}},
       {"ties: held events before appended ones, each in its order",
        {Ev(10, At(2020, 4, 5, 20, 0)), Ev(11, At(2020, 4, 5, 20, 0)), Ev(12, At(2020, 4, 5, 19, 0))},
        {Ev(20, At(2020, 4, 5, 20, 0)), Ev(21, At(2020, 4, 5, 19, 0)), Ev(22, At(2020, 4, 5, 20, 0))},
        {12, 21, 10, 11, 20, 22}},
       {"the first of a month sorts as day 32 of the month before",
-       {Ev(1, At(2013, 3, 1, 0, 0)), Ev(2, At(2013, 2, 28, 23, 0))}, {Ev(3, At(2013, 3, 2, 0, 0))}, {2, 1, 3}},
+       {Ev(1, At(2013, 3, 1, 0, 0)), Ev(2, At(2013, 2, 28, 23, 0))},
+       {Ev(3, At(2013, 3, 2, 0, 0))},
+       {2, 1, 3}},
       {"seconds decide", {Ev(1, At(2020, 4, 5, 19, 0, 2))}, {Ev(2, At(2020, 4, 5, 19, 0, 1))}, {2, 1}},
-      {"empty other: the held events are sorted", {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {},
+      {"empty other: the held events are sorted",
+       {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
+       {},
        {1, 2}},
       {"empty target", {}, {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {1, 2}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    EitSpec mineSpec;
-    EitSpec theirSpec;
+    EitOptions mineOptions;
+    EitOptions theirOptions;
     // Table_id, service_id and section numbers are not compared.
-    theirSpec.tableId = 0x4F;
-    theirSpec.serviceId = 0x4801;
-    theirSpec.sectionNumber = 1;
-    theirSpec.segmentLastSectionNumber = 7;
-    Bytes a = EitSection(mineSpec, c.mine);
-    Bytes b = EitSection(theirSpec, c.theirs);
+    theirOptions.tableId = 0x4F;
+    theirOptions.serviceId = 0x4801;
+    theirOptions.sectionNumber = 1;
+    theirOptions.segmentLastSectionNumber = 7;
+    Bytes a = EitSection(mineOptions, c.mine);
+    Bytes b = EitSection(theirOptions, c.theirs);
     RavelCEIT target(a.data());
     RavelCEIT other(b.data());
     TraceRecorder recorder;
@@ -649,14 +726,14 @@ TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
       {"original network", 0x7ED0, 0x0001, 4},
       {"version", 0x7ED0, 0x7ED1, 5},
   };
-  Bytes a = EitSection(EitSpec(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
+  Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    EitSpec spec;
-    spec.transportStreamId = c.transportStreamId;
-    spec.originalNetworkId = c.originalNetworkId;
-    spec.version = c.version;
-    Bytes b = EitSection(spec, {Ev(0, At(2020, 4, 5, 18, 0))});
+    EitOptions options;
+    options.transportStreamId = c.transportStreamId;
+    options.originalNetworkId = c.originalNetworkId;
+    options.version = c.version;
+    Bytes b = EitSection(options, {Ev(0, At(2020, 4, 5, 18, 0))});
     RavelCEIT target(a.data());
     RavelCEIT other(b.data());
     TraceRecorder recorder;
@@ -673,7 +750,7 @@ TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
 }
 
 TEST(EITMerge, TheSameSectionTwiceDoublesItsEvents) {
-  Bytes a = EitSection(EitSpec(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
+  Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
   RavelCEIT target(a.data());
   RavelCEIT again(a.data());
   target += again;
@@ -682,7 +759,7 @@ TEST(EITMerge, TheSameSectionTwiceDoublesItsEvents) {
   EXPECT_EQ((std::vector<int>{1, 1, 1, 1, 2, 2, 2, 2}), EventIds(target));
 
   // Merged events are copies: the other table can go.
-  Bytes withText = EitSection(EitSpec(), {Ev(3, At(2020, 4, 5, 18, 0), {ShortEvent("kept"), AudioComponent(9)})});
+  Bytes withText = EitSection(EitOptions(), {Ev(3, At(2020, 4, 5, 18, 0), {ShortEvent("kept"), AudioComponent(9)})});
   std::unique_ptr<RavelCEIT> other(new RavelCEIT(withText.data()));
   target += *other;
   other.reset();
@@ -693,14 +770,14 @@ TEST(EITMerge, TheSameSectionTwiceDoublesItsEvents) {
 // Copies
 
 TEST(EITCopy, DeepCopiesWithoutTheTableIdCopyAndSelfAssignmentEmpties) {
-  EitSpec spec;
-  spec.tableId = 0x4F;
-  spec.serviceId = 0x4801;
-  spec.version = 19;
-  spec.lastTableId = 0x4F;
-  Bytes section = EitSection(spec, {Ev(1, At(2020, 4, 5, 19, 0), {ShortEvent("One"), AudioComponent(0x10)}),
-                                    Ev(2, At(2020, 4, 5, 19, 30), {ExtendedEvent(0, 0, "Two")})});
-  Bytes otherSection = EitSection(EitSpec(), {Ev(7, At(2020, 1, 1, 0, 0))});
+  EitOptions options;
+  options.tableId = 0x4F;
+  options.serviceId = 0x4801;
+  options.version = 19;
+  options.lastTableId = 0x4F;
+  Bytes section = EitSection(options, {Ev(1, At(2020, 4, 5, 19, 0), {ShortEvent("One"), AudioComponent(0x10)}),
+                                       Ev(2, At(2020, 4, 5, 19, 30), {ExtendedEvent(0, 0, "Two")})});
+  Bytes otherSection = EitSection(EitOptions(), {Ev(7, At(2020, 1, 1, 0, 0))});
   std::unique_ptr<RavelCEIT> source(new RavelCEIT(section.data()));
   source->iSession = 0x42;
 
@@ -768,17 +845,21 @@ void Add(TraceLines& lines, const TraceLines& more) { lines.insert(lines.end(), 
 }  // namespace
 
 TEST(EITShow, DumpsHeaderBodyEventsAndDescriptorsInAFixedOrder) {
-  EitSpec spec;
-  spec.serviceId = 0x4801;
-  spec.version = 19;
-  spec.lastTableId = 0x4F;
+  EitOptions options;
+  options.serviceId = 0x4801;
+  options.version = 19;
+  options.lastTableId = 0x4F;
   // Wire order differs from dump order; the audio components keep theirs.
   Bytes section =
-      EitSection(spec, {EventSpec{0x0EDD, At(2013, 1, 1, 19, 0), Duration(1, 30, 9), 4, 1,
-                                  {Series(12, "Ser"), AudioComponent(0x11), ExtendedEvent(0, 0, "Ext"), Copyright(7),
-                                   AudioComponent(0x10), ParentalRating(0x03), Component(0x00), Content(0x10),
-                                   ShortEvent("Name", "Text"), DigitalCopyControl()}},
-                        Ev(0x0EDE, At(2013, 1, 2, 0, 0))});
+      EitSection(options, {EventRecord{0x0EDD,
+                                       At(2013, 1, 1, 19, 0),
+                                       Duration(1, 30, 9),
+                                       4,
+                                       1,
+                                       {Series(12, "Ser"), AudioComponent(0x11), ExtendedEvent(0, 0, "Ext"),
+                                        Copyright(7), AudioComponent(0x10), ParentalRating(0x03), Component(0x00),
+                                        Content(0x10), ShortEvent("Name", "Text"), DigitalCopyControl()}},
+                           Ev(0x0EDE, At(2013, 1, 2, 0, 0))});
   std::multimap<int, size_t> at = DescriptorOffsets(section);
   auto raw = [&](int tag, int nth) {
     auto it = at.lower_bound(tag);
@@ -935,7 +1016,8 @@ TEST(EITCapture, JapanesePresentFollowingSections) {
       EXPECT_EQ(c.extendedNumbers & 0x0F, e->pExtendedEventDescriptor->GetLastDescriptorNumber());
     }
     std::vector<int> audioTags;
-    for (int a = 0; a < e->GetAudioComponentCount(); ++a) audioTags.push_back(e->GetAudioComponent(a)->GetComponentTag());
+    for (int a = 0; a < e->GetAudioComponentCount(); ++a)
+      audioTags.push_back(e->GetAudioComponent(a)->GetComponentTag());
     EXPECT_EQ(c.audioTags, audioTags);
     EXPECT_NE(nullptr, e->pComponentDescriptor);
     EXPECT_NE(nullptr, e->pContentDescriptor);
@@ -1006,5 +1088,7 @@ TEST(EITCapture, DvbEpgSectionsParseExceptTheCorruptOne) {
   EXPECT_EQ((Ints{1, 45, 0}), (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond}));
   ASSERT_NE(nullptr, e->pShortEventDescriptor);
   EXPECT_STREQ("fre", e->pShortEventDescriptor->GetLanguageCode());
-  EXPECT_EQ(std::string("\x05" "Biathlon"), Str(e->pShortEventDescriptor->GetEventName()));
+  EXPECT_EQ(std::string("\x05"
+                        "Biathlon"),
+            Str(e->pShortEventDescriptor->GetEventName()));
 }
