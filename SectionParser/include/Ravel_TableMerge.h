@@ -6,13 +6,13 @@
 //
 //   RavelCSDT& RavelCSDT::operator+=(RavelCSDT& other) {
 //     if (!RAVEL_TABLE_MERGE_CHECK_VERSION(*this, other, "SDT")) return *this;
-//     RavelTableMerge_AppendCopies(aServiceList, other.aServiceList);
+//     RavelRecordList_AppendCopies(aServiceList, other.aServiceList);
 //     return *this;
 //   }
 #ifndef RAVEL_TABLEMERGE_H
 #define RAVEL_TABLEMERGE_H
 
-#include "Ravel_CArray.h"
+#include "Ravel_RecordList.h"
 #include "Ravel_CTableBase.h"
 #include "Ravel_PGL.h"
 #include "Ravel_Trace.h"
@@ -36,17 +36,5 @@ inline bool RavelTableMerge_CheckVersion(const RavelCTableBase& target, const Ra
 // so the mismatch trace names that file and line.
 #define RAVEL_TABLE_MERGE_CHECK_VERSION(target, other, shortName) \
   RavelTableMerge_CheckVersion((target), (other), (shortName), kRavelTraceSourcePath, __LINE__)
-
-// Appends a deep copy (T's copy constructor) of every entry of `other`, in
-// order. The count is taken before the first append, so joining a list with
-// itself doubles it once instead of chasing its own growing end.
-template <class T>
-inline void RavelTableMerge_AppendCopies(RavelCArray<T*>& target, RavelCArray<T*>& other) {
-  const int count = other.iCount;
-  for (int i = 0; i < count; ++i) {
-    T* entry = other.ipArray[i];
-    if (entry != 0) target.Append(new T(*entry));
-  }
-}
 
 #endif

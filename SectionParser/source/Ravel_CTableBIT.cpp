@@ -119,7 +119,7 @@ RavelCBIT::~RavelCBIT() { RavelRecordList_DeleteAll(aBroadcasterDescriptor); }
 int RavelCBIT::ParseRawData(unsigned char* section) {
   RavelRecordList_DeleteAll(aBroadcasterDescriptor);
   if (section == 0) return kRavelErrInvalidArgument;
-  int result = CheckCrcAndParseHeader(section, "BIT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "BIT Section: CRC Error!\n");
   if (result != kRavelOk) return result;
   if (iTableId != kBITTableId) {
     RAVEL_TRACE(RAVEL_PARSER_ERROR, "Table ID isn't for BIT! Table ID=[0x%02x]\n", iTableId);
@@ -168,11 +168,7 @@ int RavelCBIT::ParseRawData(unsigned char* section) {
 
 RavelCBIT& RavelCBIT::operator+=(RavelCBIT& other) {
   // Nothing is compared: the records of any BIT section are taken as they are.
-  // Counted first, so that a table merged into itself doubles once.
-  int count = other.aBroadcasterDescriptor.iCount;
-  for (int i = 0; i < count; ++i) {
-    aBroadcasterDescriptor.Append(new RavelCBroadcasterDescriptor(*other.aBroadcasterDescriptor.ipArray[i]));
-  }
+  RavelRecordList_AppendCopies(aBroadcasterDescriptor, other.aBroadcasterDescriptor);
   return *this;
 }
 

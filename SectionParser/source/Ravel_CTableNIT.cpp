@@ -3,6 +3,7 @@
 #include "Ravel_ByteOrder.h"
 #include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
+#include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableNIT");
@@ -205,7 +206,7 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
   DeleteNetworkDescriptors();
   RavelRecordList_DeleteAll(aTSInfoList);
   if (section == 0) return kRavelErrInvalidArgument;
-  int result = CheckCrcAndParseHeader(section, "NIT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "NIT Section: CRC Error!\n");
   if (result != kRavelOk) return result;
   if (iTableId == kNITActualTableId) {
     SetTableName("NIT Actual");
@@ -276,20 +277,13 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
 }
 
 RavelCNIT& RavelCNIT::operator+=(RavelCNIT& other) {
-  if (iVersionNumber != other.iVersionNumber) {
-    RAVEL_TRACE(RAVEL_PARSER_ERROR,
-                "Two NIT Information have different information! first one=[%d], second one=[%d]\n",
-                iVersionNumber, other.iVersionNumber);
-    return *this;
-  }
+  if (!RAVEL_TABLE_MERGE_CHECK_VERSION(*this, other, "NIT")) return *this;
   // Network descriptors may come in any section of the table: take those still
   // missing, keep those already held.
   if (pLinkage == 0) pLinkage = CopyOf(other.pLinkage);
   if (pNetworkName == 0) pNetworkName = CopyOf(other.pNetworkName);
   if (pSystemManagement == 0) pSystemManagement = CopyOf(other.pSystemManagement);
-  // Counted first, so that a table merged into itself doubles once.
-  int count = other.aTSInfoList.iCount;
-  for (int i = 0; i < count; ++i) aTSInfoList.Append(new RavelCTSInfo(*other.aTSInfoList.ipArray[i]));
+  RavelRecordList_AppendCopies(aTSInfoList, other.aTSInfoList);
   return *this;
 }
 

@@ -156,13 +156,13 @@ RavelCPMT& RavelCPMT::operator=(RavelCPMT& other) {
   // The target's streams go first, so assigning a table to itself empties it.
   // pParentalRating stays the target's own.
   DeleteStreams();
-  RavelTableMerge_AppendCopies(aMapInfoList, other.aMapInfoList);
+  RavelRecordList_AppendCopies(aMapInfoList, other.aMapInfoList);
   return *this;
 }
 
 RavelCPMT& RavelCPMT::operator+=(RavelCPMT& other) {
   if (!RAVEL_TABLE_MERGE_CHECK_VERSION(*this, other, "PMT")) return *this;
-  RavelTableMerge_AppendCopies(aMapInfoList, other.aMapInfoList);
+  RavelRecordList_AppendCopies(aMapInfoList, other.aMapInfoList);
   return *this;
 }
 
@@ -192,7 +192,7 @@ int RavelCPMT::ParseRawData(unsigned char* section) {
     iProgramInfoLength = 0;
     return kRavelErrInvalidArgument;
   }
-  int result = CheckCrcAndParseHeader(section, "PMT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "PMT Section: CRC Error!\n");
   if (result != kRavelOk) {
     iPCRPID = 0;
     iProgramInfoLength = 0;

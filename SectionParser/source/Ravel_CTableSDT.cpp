@@ -161,13 +161,13 @@ RavelCSDT& RavelCSDT::operator=(RavelCSDT& other) {
   iOriginalNetworkId = other.iOriginalNetworkId;
   // The target's services go first, so assigning a table to itself empties it.
   DeleteServices();
-  RavelTableMerge_AppendCopies(aServiceList, other.aServiceList);
+  RavelRecordList_AppendCopies(aServiceList, other.aServiceList);
   return *this;
 }
 
 RavelCSDT& RavelCSDT::operator+=(RavelCSDT& other) {
   if (!RAVEL_TABLE_MERGE_CHECK_VERSION(*this, other, "SDT")) return *this;
-  RavelTableMerge_AppendCopies(aServiceList, other.aServiceList);
+  RavelRecordList_AppendCopies(aServiceList, other.aServiceList);
   return *this;
 }
 
@@ -187,7 +187,7 @@ int RavelCSDT::ParseRawData(unsigned char* section) {
     iOriginalNetworkId = 0;
     return kRavelErrInvalidArgument;
   }
-  int result = CheckCrcAndParseHeader(section, "SDT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "SDT Section: CRC Error!\n");
   if (result != kRavelOk) {
     iOriginalNetworkId = 0;
     return result;
