@@ -374,29 +374,32 @@ TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
 // --- Texts, summary, JSON, filters -------------------------------------------
 
 TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
-  // An application name with an escape sequence, a bell and a C1 control byte.
-  std::string name = std::string("Jogo\x1b[31m\x07") + "\x9b" + "fim\\";
+  // An escape sequence, a bell, a C1 control byte (alone and as UTF-8), 8-bit
+  // Latin text, and UTF-8 text, which is the one thing printed as it came.
+  std::string name = std::string("Jogo\x1b[31m\x07") + "\x9b" + "fim\\ caf\xc3\xa9 \xe9t\xe9 \xc2\x9b";
+  const std::string escaped = "Jogo\\x1b[31m\\x07\\x9bfim\\\\ caf\xc3\xa9 \\xe9t\\xe9 \\xc2\\x9b";
   Bytes stream = Packets(0x0100, {AitSection(name, "/apps", "main.ncl")});
   std::string file = Write("ait.ts", stream);
-  const char* escaped = "Jogo\\x1b[31m\\x07\\x9bfim\\\\";
 
   ToolRun dump = Run({"--pid", "0x100", file});
   ASSERT_EQ(0, dump.status) << dump.err;
-  EXPECT_NE(std::string::npos, dump.out.find(std::string("\t App Name.........: ") + escaped)) << dump.out;
+  EXPECT_NE(std::string::npos, dump.out.find("\t App Name.........: " + escaped)) << dump.out;
   ToolRun summary = Run({"--pid", "0x100", "--summary", file});
   ASSERT_EQ(0, summary.status) << summary.err;
-  EXPECT_NE(std::string::npos, summary.out.find(std::string("name \"") + escaped + "\"")) << summary.out;
-  for (const ToolRun* run : {&dump, &summary}) {
-    for (char c : run->out) {
-      unsigned char byte = static_cast<unsigned char>(c);
-      EXPECT_TRUE(byte == '\n' || byte == '\t' || (byte >= 0x20 && byte < 0x7F)) << static_cast<int>(byte);
-    }
-  }
+  EXPECT_NE(std::string::npos, summary.out.find("name \"" + escaped + "\"")) << summary.out;
   ToolRun json = Run({"--pid", "0x100", "--json", file});
   ASSERT_EQ(0, json.status) << json.err;
   nlohmann::json document = nlohmann::json::parse(json.out);
   ASSERT_EQ(1u, document["applications"].size());
   EXPECT_EQ(escaped, document["applications"][0]["name"].get<std::string>());
+  for (const ToolRun* run : {&dump, &summary, &json}) {
+    std::string out = run->out;
+    for (size_t at = out.find("\xc3\xa9"); at != std::string::npos; at = out.find("\xc3\xa9")) out.erase(at, 2);
+    for (char c : out) {
+      unsigned char byte = static_cast<unsigned char>(c);
+      EXPECT_TRUE(byte == '\n' || byte == '\t' || (byte >= 0x20 && byte < 0x7F)) << static_cast<int>(byte);
+    }
+  }
 }
 
 TEST_F(RavelDumpTest, SummaryListsGingaApplications) {
@@ -604,6 +607,8 @@ TEST_F(RavelDumpTest, JapanesePsiSectionsGiveServicesAndTheirPids) {
   }
   EXPECT_FALSE(summary["network"].is_null());
   EXPECT_EQ(0x7ED0, summary["network"]["id"].get<int>());
+  EXPECT_FALSE(services[0]["present"].is_null());
+  EXPECT_FALSE(services[0]["following"].is_null());
 }
 
 TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
@@ -637,6 +642,58 @@ TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
     }
     EXPECT_TRUE(found) << e.name;
   }
+}
+
+TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
+  std::string capture = captures::Path("dvb-epg.ts");
+  if (capture.empty()) GTEST_SKIP() << "shared capture dvb-epg.ts absent";
+  ToolRun run = Run({"--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  // The capture's one corrupt EIT section is counted and left out.
+  EXPECT_NE(std::string::npos, run.err.find(" 1 CRC failures,")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("PID 0x0012 table_id 0x4e: CRC failure")) << run.err;
+  nlohmann::json summary = nlohmann::json::parse(run.out);
+  std::vector<int> ids;
+  for (const nlohmann::json& s : summary["services"]) {
+    ids.push_back(s["id"].get<int>());
+    EXPECT_FALSE(s["present"].is_null()) << s.dump();
+    EXPECT_FALSE(s["following"].is_null()) << s.dump();
+  }
+  EXPECT_EQ((std::vector<int>{0x0401, 0x0402, 0x0407, 0x0415, 0x0416}), ids);
+  const nlohmann::json& w9 = summary["services"][1];
+  EXPECT_EQ("W9", w9["name"].get<std::string>());
+  EXPECT_EQ("Multi4", w9["provider"].get<std::string>());
+  struct Expect {
+    const char* which;
+    int eventId, hour, minute, hours, minutes;
+  } events[] = {{"present", 0x1C, 12, 35, 0, 50}, {"following", 0x1D, 13, 25, 0, 55}};
+  for (const Expect& e : events) {
+    const nlohmann::json& event = w9[e.which];
+    EXPECT_EQ(e.eventId, event["event_id"].get<int>()) << e.which;
+    EXPECT_EQ("\\x05NCIS", event["name"].get<std::string>()) << e.which;
+    EXPECT_EQ((nlohmann::json{{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", e.hour}, {"minute", e.minute},
+                              {"second", 0}}),
+              event["start"]);
+    EXPECT_EQ(e.hours, event["duration"]["hours"].get<int>());
+    EXPECT_EQ(e.minutes, event["duration"]["minutes"].get<int>());
+    EXPECT_EQ("fra", event["ratings"][0]["country"].get<std::string>());
+  }
+  const nlohmann::json& time = summary["time"];
+  EXPECT_EQ("TOT", time["source"].get<std::string>());
+  EXPECT_EQ((nlohmann::json{{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", 12}, {"minute", 52}, {"second", 9}}),
+            time["time"]);
+  ASSERT_EQ(1u, time["local_time_offsets"].size());
+  const nlohmann::json& offset = time["local_time_offsets"][0];
+  EXPECT_EQ("FRA", offset["country"].get<std::string>());
+  EXPECT_EQ(1, offset["offset"]["hours"].get<int>());
+  EXPECT_EQ(2, offset["next_offset"]["hours"].get<int>());
+  EXPECT_EQ(3, offset["time_of_change"]["month"].get<int>());
+
+  ToolRun dump = Run({"--table", "eit", capture});
+  ASSERT_EQ(0, dump.status);
+  EXPECT_NE(std::string::npos, dump.out.find("== EIT schedule on PID 0x0012: table_id 0x50, id 0x0401, version 5"));
+  EXPECT_NE(std::string::npos, dump.out.find("###################### EIT Table Information ######################\n"));
+  EXPECT_EQ(std::string::npos, dump.out.find("== SDT"));
 }
 
 }  // namespace

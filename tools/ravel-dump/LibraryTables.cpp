@@ -6,11 +6,14 @@
 #include "Ravel_CDsmccMsgBase.h"
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTableBIT.h"
+#include "Ravel_CTableEIT.h"
 #include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTablePMT.h"
 #include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 
 namespace ravel_dump {
 namespace {
@@ -71,8 +74,15 @@ std::unique_ptr<TableObject> MakeTableObject(TableKind kind) {
       return std::unique_ptr<TableObject>(new JoinedTable<RavelCNIT>);
     case TableKind::kSdt:
       return std::unique_ptr<TableObject>(new JoinedTable<RavelCSDT>);
+    case TableKind::kEitPf:
+    case TableKind::kEitSchedule:
+      return std::unique_ptr<TableObject>(new JoinedTable<RavelCEIT>);
     case TableKind::kBit:
       return std::unique_ptr<TableObject>(new JoinedTable<RavelCBIT>);
+    case TableKind::kTdt:
+      return std::unique_ptr<TableObject>(new Table<RavelCTDT>);
+    case TableKind::kTot:
+      return std::unique_ptr<TableObject>(new Table<RavelCTOT>);
     case TableKind::kAit:
       return std::unique_ptr<TableObject>(new AitTable);
     case TableKind::kDsi:

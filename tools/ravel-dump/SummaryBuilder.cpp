@@ -16,10 +16,13 @@
 #include "Ravel_CDescriptorTerrDeliverySystem.h"
 #include "Ravel_Cfg.h"
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableEIT.h"
 #include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTablePMT.h"
 #include "Ravel_CTableSDT.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 
 namespace ravel_dump {
 namespace {
@@ -43,6 +46,9 @@ const TableEntry* Latest(const TableRegistry& registry, TableKind kind, Accept a
   return latest;
 }
 
+const TableEntry* Latest(const TableRegistry& registry, TableKind kind) {
+  return Latest(registry, kind, [](const TableEntry&) { return true; });
+}
 
 // Calls `use(object)` for each section of `table` that the library accepted.
 template <class T, class Use>
@@ -61,6 +67,22 @@ ServiceSummary& ServiceOf(std::vector<ServiceSummary>& services, int id) {
   services.push_back(ServiceSummary());
   services.back().id = id;
   return services.back();
+}
+
+DateTime MakeDateTime(int year, int month, int day, int hour, int minute, int second) {
+  DateTime t;
+  t.valid = true;
+  t.year = year;
+  t.month = month;
+  t.day = day;
+  t.hour = hour;
+  t.minute = minute;
+  t.second = second;
+  return t;
+}
+
+DateTime MakeDateTime(const RavelCDateTime& d) {
+  return MakeDateTime(d.iYear, d.iMonth, d.iDay, d.iHour, d.iMinute, d.iSecond);
 }
 
 // The PAT: the transport stream id and the services with their PMT PIDs.
@@ -177,8 +199,85 @@ void AddNit(const TableRegistry& registry, Summary& summary) {
   });
 }
 
+EventSummary MakeEvent(RavelCEventInfo& info) {
+  EventSummary event;
+  event.valid = true;
+  event.eventId = info.iEventId;
+  event.start = MakeDateTime(info.cStartTime);
+  event.duration.hours = info.iDurationHour;
+  event.duration.minutes = info.iDurationMinute;
+  event.duration.seconds = info.iDurationSecond;
+  event.runningStatus = info.iRunningStatus;
+  if (const RavelCShortEventDescriptor* shortEvent = info.pShortEventDescriptor) {
+    event.name = Text(shortEvent->pEventName);
+    event.text = Text(shortEvent->pEventDescription);
+  }
+  if (RavelCParentalRatingDescriptor* rating = info.pParentalRatingDescriptor) {
+    for (int i = 0; i < rating->aParentalRatings.iCount; ++i) {
+      const RavelCParentalRating* entry = rating->aParentalRatings.ipArray[i];
+      Rating r;
+      r.country = Field(entry->szCountryCode, sizeof entry->szCountryCode);
+      r.content = entry->iContent;
+      r.minimumAge = entry->iMinimumAge;
+      event.ratings.push_back(r);
+    }
+  }
+  return event;
+}
 
+// Present (section 0) and following (section 1) events of each service, from
+// the EIT present/following of the actual stream.
+void AddEvents(const TableRegistry& registry, Summary& summary) {
+  for (ServiceSummary& service : summary.services) {
+    const TableEntry* table = Latest(registry, TableKind::kEitPf, [&](const TableEntry& t) {
+      return t.tableId == 0x4E && t.extension == service.id;
+    });
+    if (table == nullptr) continue;
+    for (const auto& kv : table->sections) {
+      if (kv.first > 1 || kv.second.parseResult != 0) continue;
+      ParseBuffer buffer(kv.second.bytes);
+      RavelCEIT eit(nullptr);
+      if (eit.ParseRawData(buffer.Section()) != 0 || eit.aEventInfo.iCount == 0) continue;
+      EventSummary event = MakeEvent(*eit.aEventInfo.ipArray[0]);
+      (kv.first == 0 ? service.present : service.following) = event;
+    }
+  }
+}
 
+// The broadcast time: the latest TOT (with the local time offset), else the latest TDT.
+void AddTime(const TableRegistry& registry, Summary& summary) {
+  TimeSummary& time = summary.time;
+  if (const TableEntry* table = Latest(registry, TableKind::kTot)) {
+    EachSection<RavelCTOT>(*table, [&](RavelCTOT& tot) {
+      time.valid = true;
+      time.source = "TOT";
+      time.time = MakeDateTime(tot.iYear, tot.iMonth, tot.iDay, tot.iHour, tot.iMinute, tot.iSecond);
+      if (RavelCLocalTimeOffsetDescriptor* offsets = tot.pLocalTimeOffsetDescriptor) {
+        for (int i = 0; i < offsets->aLocalTimeOffsets.iCount; ++i) {
+          const RavelCLocalTimeOffset* entry = offsets->aLocalTimeOffsets.ipArray[i];
+          LocalOffset o;
+          o.country = Field(entry->szCountryCode, sizeof entry->szCountryCode);
+          o.regionId = entry->iCountryRegionId;
+          o.polarity = entry->iLocalTimeOffsetPolarity;
+          o.offsetHours = entry->iLocalTimeOffsetHour;
+          o.offsetMinutes = entry->iLocalTimeOffsetMinute;
+          o.timeOfChange = MakeDateTime(entry->cTimeOfChange);
+          o.nextHours = entry->iNextTimeOffsetHour;
+          o.nextMinutes = entry->iNextTimeOffsetMinute;
+          time.offsets.push_back(o);
+        }
+      }
+    });
+  }
+  if (time.valid) return;
+  if (const TableEntry* table = Latest(registry, TableKind::kTdt)) {
+    EachSection<RavelCTDT>(*table, [&](RavelCTDT& tdt) {
+      time.valid = true;
+      time.source = "TDT";
+      time.time = MakeDateTime(tdt.iYear, tdt.iMonth, tdt.iDay, tdt.iHour, tdt.iMinute, tdt.iSecond);
+    });
+  }
+}
 
 // Every AIT section stands alone: the applications of all of them, each once.
 void AddApplications(const TableRegistry& registry, Summary& summary) {
@@ -225,6 +324,8 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddSdt(registry, summary);
   AddPmts(registry, summary);
   AddNit(registry, summary);
+  AddEvents(registry, summary);
+  AddTime(registry, summary);
   AddApplications(registry, summary);
   summary.carousels = carousel.Summarize();
   return summary;

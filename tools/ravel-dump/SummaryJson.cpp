@@ -1,6 +1,6 @@
-// The summary as JSON for scripts. Broadcast texts are escaped to printable
-// ASCII (\xNN for other bytes), so the document is valid UTF-8 whatever the
-// broadcast's character coding.
+// The summary as JSON for scripts. Broadcast texts are escaped as in the text
+// output (\xNN for control bytes and bytes that are not UTF-8), so the
+// document is valid UTF-8 whatever the broadcast's character coding.
 #include <nlohmann/json.hpp>
 
 #include "ByteText.h"
@@ -11,7 +11,7 @@ namespace {
 
 using nlohmann::json;
 
-json Text(const std::string& text) { return EscapeAscii(text); }
+json Text(const std::string& text) { return EscapeBytes(text); }
 
 json When(const DateTime& t) {
   if (!t.valid) return nullptr;
@@ -120,7 +120,7 @@ std::string SummaryJson(const Summary& s) {
                          {"blocks_received", m.blocksReceived},
                          {"blocks_total", m.blocksTotal},
                          {"complete", m.complete},
-                         {"file", m.file.empty() ? json(nullptr) : json(EscapeAscii(m.file))}});
+                         {"file", m.file.empty() ? json(nullptr) : json(EscapeBytes(m.file))}});
     }
     carousels.push_back(
         {{"pid", Pid(c.pid)}, {"download_id", c.downloadId}, {"block_size", c.blockSize}, {"modules", modules}});

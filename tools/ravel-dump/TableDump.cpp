@@ -23,7 +23,14 @@ std::string Describe(const TableEntry& table) {
     std::snprintf(text, sizeof text, ", id 0x%04x, version %d", table.extension, table.version);
     line += text;
     if (KindJoinsSections(table.kind)) {
-      std::snprintf(text, sizeof text, ", %zu of %d sections", table.sections.size(), table.lastSectionNumber + 1);
+      bool eit = table.kind == TableKind::kEitPf || table.kind == TableKind::kEitSchedule;
+      if (eit) {
+        // EIT sections come in segments of eight, not all numbers are used.
+        std::snprintf(text, sizeof text, ", %zu sections up to number %d", table.sections.size(),
+                      table.lastSectionNumber);
+      } else {
+        std::snprintf(text, sizeof text, ", %zu of %d sections", table.sections.size(), table.lastSectionNumber + 1);
+      }
       line += text;
       std::vector<unsigned int> missing = table.Missing();
       if (!missing.empty()) {
