@@ -192,6 +192,91 @@ Bytes Reframe(const Bytes& stream, int size) {
   return out;
 }
 
+// A one-segment broadcast as a receiver meets it: the PAT names the PMTs, the
+// one-segment PMT names the AIT and carousel PIDs, the EIT comes on the
+// one-segment EIT PID.
+Bytes ReceiverStream() {
+  sb::SectionOptions o;
+  o.tableId = 0x02;
+  o.tableIdExtension = 0x0642;
+  Bytes streams;
+  struct Stream {
+    uint8_t type;
+    uint16_t pid;
+    uint8_t tag;
+  } list[] = {{0x1B, 0x0111, 0x81}, {0x0F, 0x0112, 0x83}, {0x06, 0x0113, 0x87}, {0x05, 0x0114, 0x88},
+              {0x0D, 0x0115, 0x89}};
+  for (const Stream& s : list) {
+    sb::Append(streams, sb::Cat({sb::U8(s.type), sb::U16(0xE000 | s.pid),
+                                 sb::DescriptorLoop({sb::Descriptor(0x52, sb::U8(s.tag))})}));
+  }
+  Bytes pmt = sb::LongSection(o, sb::Cat({sb::U16(0xE000 | 0x0111), sb::DescriptorLoop({}), streams}));
+
+  o.tableId = 0x40;
+  o.tableIdExtension = 0x0640;
+  Bytes tsDescriptors = sb::Cat({
+      sb::Descriptor(0xCD, sb::Cat({sb::U8(5), sb::U8(5 << 2), sb::Text("Teste")})),
+      sb::Descriptor(0xFA, sb::Cat({sb::U16((0x2A5 << 4) | (1 << 2) | 2), sb::U16(3563), sb::U16(3605)})),
+      sb::Descriptor(0xFB, sb::U16(0x0642)),
+  });
+  Bytes tsLoop = sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::Length12(tsDescriptors.size()), tsDescriptors});
+  Bytes nit = sb::LongSection(
+      o, sb::Cat({sb::DescriptorLoop({sb::Descriptor(0x40, sb::Text("Rede Teste"))}), sb::Length12(tsLoop.size()),
+                  tsLoop}));
+
+  o.tableId = 0x42;
+  o.tableIdExtension = 0x0640;
+  Bytes services;
+  for (int id : {0x0641, 0x0642}) {
+    std::string name = id == 0x0641 ? "Canal" : "Canal 1seg";
+    Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(id == 0x0641 ? 0x01 : 0xC0), sb::U8(8), sb::Text("Emissora"),
+                                                  sb::U8(name.size()), sb::Text(name)}));
+    sb::Append(services, sb::Cat({sb::U16(id), sb::U8(0xFD), sb::U16(0x8000 | service.size()), service}));
+  }
+  Bytes sdt = sb::LongSection(o, sb::Cat({sb::U16(0x0640), sb::U8(0xFF), services}));
+
+  std::vector<Bytes> eit;
+  struct Event {
+    uint16_t id;
+    int hour, minute;
+    uint8_t hours, minutes, rating;
+    const char* name;
+  } events[] = {{1, 12, 0, 0x01, 0x30, 0x23, "Jornal"}, {2, 13, 30, 0x00, 0x45, 0x05, "Novela"}};
+  for (int n = 0; n < 2; ++n) {
+    const Event& e = events[n];
+    Bytes descriptors = sb::Cat({
+        sb::Descriptor(0x4D, sb::Cat({sb::Text("por"), sb::U8(strlen(e.name)), sb::Text(e.name), sb::U8(0)})),
+        sb::Descriptor(0x55, sb::Cat({sb::Text("BRA"), sb::U8(e.rating)})),
+    });
+    Bytes event = sb::Cat({sb::U16(e.id), sb::UtcTime(2013, 5, 10, e.hour, e.minute, 0), sb::U8(e.hours),
+                           sb::U8(e.minutes), sb::U8(0), sb::U16(0x8000 | descriptors.size()), descriptors});
+    o.tableId = 0x4E;
+    o.tableIdExtension = 0x0642;
+    o.sectionNumber = static_cast<uint8_t>(n);
+    o.lastSectionNumber = 1;
+    eit.push_back(sb::LongSection(o, sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::U8(1), sb::U8(0x4E), event})));
+  }
+
+  Bytes offset = sb::Descriptor(0x58, sb::Cat({sb::Text("BRA"), sb::U8((1 << 2) | 0x02 | 1), sb::U8(0x03), sb::U8(0x00),
+                                               sb::UtcTime(2013, 10, 20, 0, 0, 0), sb::U8(0x02), sb::U8(0x00)}));
+  Bytes tot = sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 12, 34, 56), sb::Length12(offset.size()), offset}),
+                               true);
+
+  Bytes ait = AitSection("Quiz", "/apps/quiz", "main.ncl");
+  Bytes module = ModuleBytes(100, 5);
+  return sb::Cat({
+      Packets(0x0114, {ait}),  // before the PMT names its PID: not read
+      Packets(0x0000, {PatSection(0x0640, 1, {{0x0641, 0x0100}, {0x0642, 0x1FC8}})}),
+      Packets(0x1FC8, {pmt}),
+      Packets(0x0010, {nit}),
+      Packets(0x0011, {sdt}),
+      Packets(0x0027, eit),
+      Packets(0x0014, {tot}),
+      Packets(0x0114, {ait}),
+      Packets(0x0115, {DiiSection(1, 1024, {{1, 100, 1}}), DdbSection(1, 1, 1, 0, module)}),
+  });
+}
+
 Bytes SamplePatStream() { return Packets(0x0000, {PatSection(0x1234, 3, {{1, 0x0300}, {2, 0x1FC8}})}, 6); }
 
 // --- Bad input --------------------------------------------------------------
@@ -569,6 +654,75 @@ TEST_F(RavelDumpTest, ObjectCarouselCaptureModulesAreComplete) {
     EXPECT_EQ(module["size"].get<uintmax_t>(), fs::file_size(file)) << file;
   }
   EXPECT_NE(std::string::npos, run.err.find("0x076a       6405")) << run.err;
+}
+
+// --- A receiver's whole path -------------------------------------------------
+
+TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
+  std::string file = Write("oneseg.ts", ReceiverStream());
+  ToolRun run = Run({"--summary", file});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_EQ(
+      "Standard: brazil\n"
+      "Network: \"Rede Teste\" (network_id 0x0640)\n"
+      "Transport stream: 0x0640\n"
+      "  TS 0x0640 of network 0x0640 \"Teste\", remote control key 5\n"
+      "    area code 0x2a5, guard interval 1/16, mode 3\n"
+      "    frequencies: 509.000 MHz (3563) 515.000 MHz (3605)\n"
+      "    partial reception: 0x06\n"
+      "Services (2):\n"
+      "  Service 0x0641 digital TV (0x01) \"Canal\" provider \"Emissora\"\n"
+      "    PMT 0x0100, PCR -, video -, audio -, captions -\n"
+      "  Service 0x0642 data (0xc0) one-segment \"Canal 1seg\" provider \"Emissora\"\n"
+      "    PMT 0x1fc8, PCR 0x0111, video 0x0111, audio 0x0112, captions 0x0113\n"
+      "      stream 0x1b H.264 video on 0x0111, component tag 0x81\n"
+      "      stream 0x0f AAC (ADTS) on 0x0112, component tag 0x83\n"
+      "      stream 0x06 PES private data on 0x0113, component tag 0x87\n"
+      "      stream 0x05 private sections on 0x0114, component tag 0x88\n"
+      "      stream 0x0d DSM-CC sections on 0x0115, component tag 0x89\n"
+      "    present:   2013-05-10 12:00:00 for 01:30:00 \"Jornal\" rating BRA age 12 content 0x2 (event 0x0001)\n"
+      "    following: 2013-05-10 13:30:00 for 00:45:00 \"Novela\" rating BRA age 16 (event 0x0002)\n"
+      "Time: 2013-05-10 12:34:56 (TOT)\n"
+      "  local time offset BRA region 1: -03:00, changes 2013-10-20 00:00:00 to -02:00\n"
+      "Ginga applications (1):\n"
+      "  PID 0x0114 type 0x0009: organization 0x0000000a application 0x0001 control 1 (autostart) name \"Quiz\" "
+      "path \"/apps/quiz\" file \"main.ncl\"\n"
+      "Carousel modules (1):\n"
+      "  PID 0x0115 download 0x00000001, block size 1024\n"
+      "    module 0x0001 version 1, 100 bytes, complete\n",
+      run.out);
+  // Packets of a PID that nothing has named yet are not read.
+  EXPECT_NE(std::string::npos, run.err.find("  0x0114          2          0        0         1  AIT\n")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0027          2          0        0         2  EIT\n")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0115          2          0        0         2  data carousel\n"))
+      << run.err;
+
+  // The broadcast standard decides how the ratings read (ARIB: rating + 3 years).
+  ToolRun japan = Run({"--standard", "japan", "--summary", file});
+  EXPECT_NE(std::string::npos, japan.out.find("Standard: japan\n"));
+  EXPECT_NE(std::string::npos, japan.out.find("\"Jornal\" rating BRA age 0 (event 0x0001)"));
+  EXPECT_NE(std::string::npos, japan.out.find("\"Novela\" rating BRA age 8 (event 0x0002)"));
+}
+
+TEST_F(RavelDumpTest, DumpShowsEachTableOnceInFirstSeenOrder) {
+  ToolRun run = Run({Write("oneseg.ts", ReceiverStream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  std::vector<std::string> headers;
+  for (size_t at = 0; (at = run.out.find("== ", at)) != std::string::npos;) {
+    if (at == 0 || run.out[at - 1] == '\n') headers.push_back(run.out.substr(at, run.out.find(':', at) - at));
+    at = run.out.find('\n', at);
+  }
+  EXPECT_EQ((std::vector<std::string>{"== PAT on PID 0x0000", "== PMT on PID 0x1fc8", "== NIT on PID 0x0010",
+                                      "== SDT on PID 0x0011", "== EIT p/f on PID 0x0027", "== TOT on PID 0x0014",
+                                      "== AIT on PID 0x0114", "== DII on PID 0x0115", "== DDB on PID 0x0115"}),
+            headers)
+      << run.out;
+  EXPECT_NE(std::string::npos, run.out.find("== EIT p/f on PID 0x0027: table_id 0x4e, id 0x0642, version 0, "
+                                            "2 sections up to number 1, seen 1 time\n"));
+  // The two EIT sections are joined with the table's operator+=: one dump, both events.
+  EXPECT_NE(std::string::npos, run.out.find("##################### Event Information [1] #####################\n"));
+  EXPECT_NE(std::string::npos, run.out.find("Stream Information. Size=[5]\n"));
+  EXPECT_NE(std::string::npos, run.out.find("\tNetwork Name=[Rede Teste]\n"));
 }
 
 // --- Real captures --------------------------------------------------------------

@@ -82,12 +82,16 @@ void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceO
     }
     line += refused;
     if (!joined && refused.empty()) line += " (no parser for this table)";
+    // The tool's own line starts on a line of its own, even after a dump
+    // whose last line was left open.
+    if (!trace.ShowEndedLine()) std::fputc('\n', out);
     std::fprintf(out, "%s\n", line.c_str());
     if (joined) {
       TraceOutput::ShowScope show(trace, out);
       joined->Show();
     }
   }
+  if (!trace.ShowEndedLine()) std::fputc('\n', out);
 }
 
 }  // namespace ravel_dump

@@ -6,7 +6,7 @@
 
 namespace ravel_dump {
 
-TraceOutput::TraceOutput(unsigned int levels, Stats& stats) : levels_(levels), stats_(stats), showOut_(nullptr), quiet_(false) {
+TraceOutput::TraceOutput(unsigned int levels, Stats& stats) : levels_(levels), stats_(stats), showOut_(nullptr), showEndedLine_(true), quiet_(false) {
   RavelPGL_SetTraceHook(&TraceOutput::OnTrace, this);
   RavelPGL_SetPanicHook(&TraceOutput::OnPanic, this);
 }
@@ -31,7 +31,11 @@ TraceOutput::QuietScope::~QuietScope() { trace_.quiet_ = previous_; }
 void TraceOutput::OnTrace(unsigned int mask, const char* file, int line, const char* text, void* context) {
   TraceOutput* self = static_cast<TraceOutput*>(context);
   if (self->showOut_ != nullptr && (mask & kTraceLevels) == kTraceLevelDump) {
-    std::fputs(EscapeTraceText(text).c_str(), self->showOut_);
+    std::string escaped = EscapeTraceText(text);
+    if (!escaped.empty()) {
+      std::fputs(escaped.c_str(), self->showOut_);
+      self->showEndedLine_ = escaped.back() == '\n';
+    }
     return;
   }
   if (!self->quiet_ && (mask & self->levels_ & kTraceLevels) != 0) {

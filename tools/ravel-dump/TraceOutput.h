@@ -33,6 +33,10 @@ class TraceOutput {
     std::FILE* previous_;
   };
 
+  // Whether the last dump text written ended its line (some dumps leave their
+  // last line open).
+  bool ShowEndedLine() const { return showEndedLine_; }
+
   // While alive, traces are dropped: for the parses that build the outputs,
   // whose traces were shown (with --trace) when the sections first arrived.
   class QuietScope {
@@ -52,6 +56,7 @@ class TraceOutput {
   unsigned int levels_;
   Stats& stats_;
   std::FILE* showOut_;
+  bool showEndedLine_;
   bool quiet_;
 };
 
