@@ -149,6 +149,9 @@ int main(int argc, char** argv) {
       demux.RestrictTo(options.pids);
     }
     if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (options.pids.empty() && stats.pids[0].sections == 0) {
+      stats.Problem("no PAT read: only the PIDs every receiver reads were read; name others with --pid");
+    }
   }
 
   // Everything is read: now the outputs, modules first so that a failure to
