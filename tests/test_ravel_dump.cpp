@@ -456,6 +456,60 @@ TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
   EXPECT_NE(std::string::npos, run.err.find("  0x0000          3          1        0         3  PAT\n")) << run.err;
 }
 
+TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
+  // Each section has a good CRC; one declared length points past its parent.
+  sb::SectionOptions pmt;
+  pmt.tableId = 0x02;
+  sb::SectionOptions sdt;
+  sdt.tableId = 0x42;
+  sb::SectionOptions eit;
+  eit.tableId = 0x4E;
+  sb::SectionOptions ait;
+  ait.tableId = 0x74;
+  sb::SectionOptions dii;
+  dii.tableId = 0x3B;
+  Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(1), sb::U8(0), sb::U8(3), sb::Text("abc")}));
+  service[1] = 40;  // the descriptor claims more than its loop holds
+  Bytes diiBody = sb::Cat({sb::U32(1), sb::U16(512), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0), sb::U16(0),
+                           sb::U16(3), sb::U16(1), sb::U32(10), sb::U8(1), sb::U8(0), sb::U16(0)});
+  Bytes ddb = DdbSection(1, 1, 1, 0, ModuleBytes(10, 0));
+  ddb[8 + 10] = 0x01;  // messageLength: 256 more than the section holds
+  sb::FixCrc(ddb);
+  struct Case {
+    const char* what;
+    Bytes section;
+    const char* kind;
+    const char* reason;
+  } cases[] = {
+      {"PMT program info", sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(200)})), "PMT",
+       "loop runs past its parent's end at byte 10"},
+      {"PMT stream", sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
+                                                   sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
+       "PMT", "loop entry runs past its loop's end at byte 12"},
+      {"SDT service descriptor", sb::LongSection(sdt, sb::Cat({sb::U16(1), sb::U8(0xFF), sb::U16(1), sb::U8(0xFC),
+                                                              sb::U16(0x8000 | service.size()), service})),
+       "SDT", "descriptor runs past its loop's end at byte 16"},
+      {"EIT event", sb::LongSection(eit, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x4E), sb::U16(1),
+                                                 sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
+                                                 sb::U16(0x8000 | 60)})),
+       "EIT p/f", "loop entry runs past its loop's end at byte 14"},
+      {"AIT application loop", sb::LongSection(ait, sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | 90)})), "AIT",
+       "application loop runs past the section at byte 10"},
+      {"DII module list", sb::LongSection(dii, DsmccMessage(0x1002, 2, diiBody)), "DII",
+       "DII module record cut by the message end"},
+      {"DDB message", ddb, "DDB", "DSM-CC message runs past the section at byte 18"},
+      {"TOT loop", sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::Length12(20)}), true), "TOT",
+       "loop runs past its parent's end at byte 8"},
+  };
+  for (const Case& c : cases) {
+    ToolRun run = Run({"--sections", Write("bad.sections", sb::Cat({PatSection(1, 0, {{1, 0x100}}), c.section}))});
+    ASSERT_EQ(0, run.status) << c.what << run.err;
+    EXPECT_EQ(std::string::npos, run.out.find(std::string("== ") + c.kind)) << c.what;
+    EXPECT_NE(std::string::npos, run.err.find(", 1 malformed,")) << c.what << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.reason)) << c.what << run.err;
+  }
+}
+
 // --- Texts, summary, JSON, filters -------------------------------------------
 
 TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
