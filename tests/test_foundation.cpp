@@ -219,6 +219,8 @@ TEST(CArray, GrowsByEightAndChecksItsBounds) {
     EXPECT_EQ(0x40000001u, recorder.Records()[0].mask);
     EXPECT_EQ("Argument Invalid! aPos=[" + std::to_string(c.pos) + "], iCount=[" + std::to_string(count) + "]\n",
               recorder.Records()[0].text);
+    EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.Records()[0].file);
+    EXPECT_EQ(0, recorder.PanicCount());
   }
   for (int index : {-1, array.iCount}) {
     recorder.Clear();
@@ -230,6 +232,8 @@ TEST(CArray, GrowsByEightAndChecksItsBounds) {
               recorder.Records()[0].text);
     EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.Records()[0].file);
     EXPECT_EQ(1, recorder.PanicCount());
+    // The panic reports the template's own location, as the trace before it.
+    EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.LastPanicFile());
   }
 }
 
