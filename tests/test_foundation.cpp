@@ -104,7 +104,9 @@ TEST(BitInputStream, ReadsMsbFirstAndNeverPastItsBuffer) {
   const unsigned char data[] = {0xA5, 0x3C, 0xFF};
   RavelCBitInputStream reader(data, 2, 0);
   unsigned char status = 0;
+  EXPECT_EQ(0u, reader.GetByteIndex());
   EXPECT_EQ(1, reader.ReadBit(status));
+  EXPECT_EQ(1u, reader.GetByteIndex());  // a byte begun counts as taken
   EXPECT_EQ(0x02, reader.ReadByte(3, status));
   EXPECT_EQ(0x053Cu, reader.ReadShort(12, status));
   EXPECT_EQ(0, status);
