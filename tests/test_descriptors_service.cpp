@@ -403,15 +403,29 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
     EXPECT_EQ(kRavelErrInvalidArgument, stream.ParseRawData(bad));
     EXPECT_EQ(0, stream.GetComponentTag());
 
-    // The TS information descriptor zeroes its key id on null only; its name and
-    // records are released either way.
+    // The TS information descriptor zeroes its key id and its record count on
+    // null only: a foreign tag keeps both, with the records they count. The name
+    // is released either way.
     RavelCTSInformationDescriptor ts(tsRaw.data());
     EXPECT_EQ(kRavelErrInvalidArgument, ts.ParseRawData(bad));
     EXPECT_EQ(useNull ? 0 : 0x05, ts.GetRemoteControlKeyId());
-    EXPECT_EQ(0, ts.GetTransmissionTypeCount());
+    EXPECT_EQ(useNull ? 0 : 1, ts.GetTransmissionTypeCount());
     EXPECT_STREQ("", ts.GetTsName());
-    EXPECT_EQ(0, ts.cTxTypes[0].GetNumOfService());
-    EXPECT_EQ(nullptr, ts.cTxTypes[0].pServiceIds);
+    EXPECT_EQ(useNull ? 0 : 0x0F, ts.cTxTypes[0].GetTransmissionTypeInfo());
+    EXPECT_EQ(useNull ? 0 : 1, ts.cTxTypes[0].GetNumOfService());
+    if (useNull) {
+      EXPECT_EQ(nullptr, ts.cTxTypes[0].pServiceIds);
+    } else {
+      EXPECT_EQ(0x4800, ts.cTxTypes[0].GetServiceId(0));
+      recorder.Clear();
+      ts.Show();
+      EXPECT_EQ((TraceLines{{kDump, Banner("TS Information Descriptor")},
+                            {kDump, BaseLine(0x42, 7, "Unknown Descriptor")},
+                            {kDump, "\tRemote Control Key Id=[0x05], Ts Name=[], Tx Type Count=[1]\n"},
+                            {kDump, "\t\tTramsmission Type Info=[0x0f], Num of Service=[1]\n"},
+                            {kDump, "\t\t\tTS Info: Service Id=[0x4800]\n"}}),
+                recorder.Lines());
+    }
 
     // The others keep their scalar fields and lose their lists.
     RavelCSystemManagementDescriptor system(systemRaw.data());
