@@ -599,6 +599,36 @@ TEST(LogoTransmissionDescriptor, DecodesEachTransmissionType) {
   }
 }
 
+TEST(LogoTransmissionDescriptor, CopiesTheCharactersUpToTheirFirstZeroByte) {
+  // Like every owned text, the characters are duplicated as a C text: a 0 byte
+  // among them ends the copy, and the rest of the copy's characters are 0.
+  struct Case {
+    Bytes characters;
+    Bytes copied;
+  } cases[] = {
+      {Bytes{'a', 'b', 'c'}, Bytes{'a', 'b', 'c'}},
+      {Bytes{'a', 0x00, 'c', 'd'}, Bytes{'a', 0x00, 0x00, 0x00}},
+      {Bytes{0x00, 'b'}, Bytes{0x00, 0x00}},
+      {Bytes{0x1B, 0xE9}, Bytes{0x1B, 0xE9}},
+  };
+  for (const Case& c : cases) {
+    Bytes raw = Descriptor(0xCF, Cat({U8(0x03), c.characters}));
+    RavelCLogoTransmissionDescriptor source(raw.data());
+    RavelCLogoTransmissionDescriptor constructed(source);
+    Bytes other = Descriptor(0xCF, Bytes{0x03, 'z'});
+    RavelCLogoTransmissionDescriptor assigned(other.data());
+    assigned = source;
+    const int count = static_cast<int>(c.characters.size());
+    ASSERT_EQ(count, source.GetLogoCharactersLength());
+    EXPECT_EQ(c.characters, Bytes(source.GetLogoCharacters(), source.GetLogoCharacters() + count));
+    for (RavelCLogoTransmissionDescriptor* copy : {&constructed, &assigned}) {
+      ASSERT_EQ(count, copy->GetLogoCharactersLength());
+      EXPECT_EQ(c.copied, Bytes(copy->GetLogoCharacters(), copy->GetLogoCharacters() + count));
+      EXPECT_EQ(0, copy->GetLogoCharacters()[count]);
+    }
+  }
+}
+
 TEST(LogoTransmissionDescriptor, CharactersAreTheLengthMinusOneBytesAfterTheType) {
   // Bytes after the descriptor must not leak into the text, and a copy holds the same characters.
   Bytes raw = Cat({Descriptor(0xCF, Bytes{0x03, 'a', 'b', 'c'}), Bytes{'X', 'Y', 'Z'}});
