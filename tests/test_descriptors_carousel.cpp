@@ -457,7 +457,9 @@ std::vector<bitwalk::Field> GeneralEventLayout(int mode) {
   const bool jst = mode == 1 || mode == 5;
   const bool npt = mode == 2;
   const bool relative = mode == 3;
-  auto bcd = [](bool read, int at) { return std::vector<bitwalk::Segment>{{at, read ? 4 : 0, 10}, {at + 4, read ? 4 : 0}}; };
+  auto bcd = [](bool read, int at) {
+    return std::vector<bitwalk::Segment>{{at, read ? 4 : 0, 10}, {at + 4, read ? 4 : 0}};
+  };
   auto bits = [](bool read, int at, int width) { return std::vector<bitwalk::Segment>{{at, read ? width : 0}}; };
   return {{"event message group id", {{16, 12}}},
           {"MJD/JST hour", bcd(jst, 56)},
