@@ -387,6 +387,9 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
   Bytes tsRaw = Descriptor(0xCD, Cat({Bytes{0x05, (1 << 2) | 1}, Text("A"), Bytes{0x0F, 1}, U16(0x4800)}));
   Bytes systemRaw = Descriptor(0xFE, Bytes{0xC5, 0x02});
   Bytes terrRaw = Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234)}));
+  Bytes broadcasterRaw = Descriptor(0xCE, Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05});
+  Bytes logoRaw = Descriptor(0xCF, Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A});
+  Bytes logoTextRaw = Descriptor(0xCF, Bytes{0x03, 'a', 'b'});
 
   for (bool useNull : {false, true}) {
     SCOPED_TRACE(useNull ? "null" : "foreign tag");
@@ -428,7 +431,7 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
                 recorder.Lines());
     }
 
-    // The others keep their scalar fields and lose their lists.
+    // The others keep their scalar fields and lose their texts and lists.
     RavelCSystemManagementDescriptor system(systemRaw.data());
     EXPECT_EQ(kRavelErrInvalidArgument, system.ParseRawData(bad));
     EXPECT_EQ(0x01, system.GetBroadcastingFlag());
@@ -440,6 +443,66 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
     EXPECT_EQ(0x801, terr.GetAreaCode());
     EXPECT_EQ(0, terr.GetFrequencyCount());
     EXPECT_EQ(nullptr, terr.pFrequencies);
+
+    RavelCExtendedBroadcasterDescriptor broadcaster(broadcasterRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, broadcaster.ParseRawData(bad));
+    EXPECT_EQ(1, broadcaster.GetBroadcasterType());
+    EXPECT_EQ(0x0123, broadcaster.GetTerrestrialBroadcasterId());
+    EXPECT_EQ(0, broadcaster.GetNumberOfAffiliationIds());
+    EXPECT_EQ(0, broadcaster.GetNumberOfBroadcasterIds());
+    EXPECT_EQ(0, broadcaster.GetAffiliationId(0));
+    EXPECT_EQ(0, broadcaster.GetOriginalNetworkId(0));
+    EXPECT_EQ(0, broadcaster.GetBroadcasterId(0));
+
+    RavelCLogoTransmissionDescriptor logo(logoRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, logo.ParseRawData(bad));
+    EXPECT_EQ(1, logo.GetLogoTransmissionType());
+    EXPECT_EQ(0x123, logo.GetLogoId());
+    EXPECT_EQ(0x456, logo.GetLogoVersion());
+    EXPECT_EQ(0x789A, logo.GetDownloadDataId());
+
+    RavelCLogoTransmissionDescriptor logoText(logoTextRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, logoText.ParseRawData(bad));
+    EXPECT_EQ(3, logoText.GetLogoTransmissionType());
+    EXPECT_EQ(nullptr, logoText.GetLogoCharacters());
+    EXPECT_EQ(0, logoText.GetLogoCharactersLength());
+  }
+}
+
+TEST(ServiceDescriptorFailure, ADescriptorOfAnotherTypeKeepsNothingOfTheLastOne) {
+  // Only types 1 and 2 carry a broadcaster id, only types 1 and 2 a logo id and
+  // only type 1 a version and a download data id.
+  Bytes broadcasterRaw = Descriptor(0xCE, Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05});
+  Bytes logoRaw = Descriptor(0xCF, Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A});
+  struct Case {
+    uint8_t type;
+  } broadcasterTypes[] = {{0x0}, {0x3}, {0xF}};
+  for (const Case& c : broadcasterTypes) {
+    RavelCExtendedBroadcasterDescriptor d(broadcasterRaw.data());
+    Bytes other = Descriptor(0xCE, Bytes{static_cast<uint8_t>(c.type << 4), 0x45, 0x67, 0x11, 0x01, 0x02, 0x03, 0x04});
+    EXPECT_EQ(kRavelOk, d.ParseRawData(other.data()));
+    EXPECT_EQ(c.type, d.GetBroadcasterType());
+    EXPECT_EQ(0, d.GetTerrestrialBroadcasterId()) << int(c.type);
+    EXPECT_EQ(0, d.GetNumberOfAffiliationIds());
+    EXPECT_EQ(0, d.GetAffiliationId(0));
+    EXPECT_EQ(0, d.GetOriginalNetworkId(0));
+  }
+  struct LogoCase {
+    Bytes body;
+    uint16_t id, version, download;
+  } logoCases[] = {
+      {Bytes{0x02, 0xFE, 0x07}, 0x007, 0, 0},
+      {Bytes{0x03, 'a'}, 0, 0, 0},
+      {Bytes{0x04, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF}, 0, 0, 0},
+  };
+  for (const LogoCase& c : logoCases) {
+    RavelCLogoTransmissionDescriptor d(logoRaw.data());
+    Bytes other = Descriptor(0xCF, c.body);
+    EXPECT_EQ(kRavelOk, d.ParseRawData(other.data()));
+    EXPECT_EQ(c.body[0], d.GetLogoTransmissionType());
+    EXPECT_EQ(c.id, d.GetLogoId()) << int(c.body[0]);
+    EXPECT_EQ(c.version, d.GetLogoVersion()) << int(c.body[0]);
+    EXPECT_EQ(c.download, d.GetDownloadDataId()) << int(c.body[0]);
   }
 }
 

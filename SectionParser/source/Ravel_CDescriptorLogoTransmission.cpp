@@ -79,14 +79,7 @@ RavelCLogoTransmissionDescriptor& RavelCLogoTransmissionDescriptor::operator=(
 
 RavelCLogoTransmissionDescriptor::~RavelCLogoTransmissionDescriptor() { Release(); }
 
-// Everything but the type, so that a descriptor of another transmission type
-// keeps nothing of an earlier parse.
-void RavelCLogoTransmissionDescriptor::Release() {
-  iLogoId = 0;
-  iLogoVersion = 0;
-  iDownloadDataId = 0;
-  RavelText_FreeCText(pLogoCharacters);
-}
+void RavelCLogoTransmissionDescriptor::Release() { RavelText_FreeCText(pLogoCharacters); }
 
 int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
   if (pLogoCharacters == 0 || iDescriptorLength == 0) return 0;
@@ -96,7 +89,12 @@ int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
 int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
   Release();
   int result = ParseHeader(raw, kKind);
+  // A refused descriptor keeps the type, ids and version it had.
   if (result != kRavelOk) return result;
+  // A descriptor of another transmission type keeps nothing of an earlier one.
+  iLogoId = 0;
+  iLogoVersion = 0;
+  iDownloadDataId = 0;
   iLogoTransmissionType = raw[2];
   switch (iLogoTransmissionType) {
     case 1:
