@@ -15,8 +15,13 @@
 // Foundation.
 #include "Ravel_CArray.h"
 #include "Ravel_ResultCode.h"
-#include "Ravel_ByteOrder.h"
 #include "Ravel_CDateCode.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_DescriptorText.h"
+#include "Ravel_FixedText.h"
+#include "Ravel_RecordList.h"
+#include "Ravel_TableMerge.h"
+#include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
 
 // Transport stream layer.
@@ -26,9 +31,16 @@
 
 // Tables.
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableBIT.h"
 #include "Ravel_CTableBase.h"
+#include "Ravel_CTableEIT.h"
+#include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 
 // DSM-CC data carousel.
 #include "Ravel_CDsmccDDB.h"
@@ -81,7 +93,5 @@
 #include "Ravel_CDescriptors.h"
 #include "Ravel_CObjectCarouselTransmissionFormat.h"
 #include "Ravel_CTxType.h"
-#include "Ravel_DescriptorText.h"
-#include "Ravel_FixedText.h"
 
 #endif

@@ -7,8 +7,9 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableBase");
 
-RavelCTableBase::RavelCTableBase(unsigned char* section) : sTableName() {
+RavelCTableBase::RavelCTableBase(unsigned char* section) : iSession(0), sTableName() {
   // Runs the base parse: derived constructors pass null here to clear the header.
+  // A parse never writes the caller's tag, so it starts cleared either way.
   RavelCTableBase::ParseRawData(section);
 }
 
@@ -62,9 +63,12 @@ int RavelCTableBase::SetTableName(const char* name) {
   return 1;
 }
 
-int RavelCTableBase::CheckCrcAndParseHeader(unsigned char* section, const char* crcMessage) {
+int RavelCTableBase::CheckCrcAndParseHeader(unsigned char* section, const char* sourcePath,
+                                            const char* crcMessage) {
   if (!RavelUtil_CheckSectionCRC32(section)) {
-    RAVEL_TRACE(RAVEL_PARSER_WARNING, "%s", crcMessage);
+    gszRavelDbgFilePath = sourcePath;
+    gRavelDbgLineNum = __LINE__;
+    RavelPGL_TraceOut(RAVEL_PARSER_WARNING, "%s", crcMessage);
     return kRavelErrCorruptSection;
   }
   RavelCTableBase::ParseRawData(section);
