@@ -18,6 +18,8 @@
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 #include "Ravel_ResultCode.h"
 #include "SectionReassembly.h"
 #include "StreamBuilder.h"
@@ -200,7 +202,7 @@ TEST(SafeSection, GivesTheMatchingResultForEachDamage) {
   Bytes badCrc = pat;
   badCrc.back() ^= 0x01;
   Bytes unknownTable = pat;
-  unknownTable[0] = 0x01;  // CAT: no class here
+  unknownTable[0] = 0x01;  // CAT: no class
   sb::FixCrc(unknownTable);
   Bytes trailing = pat;
   trailing.insert(trailing.end(), {0xFF, 0xFF, 0x47});
@@ -246,10 +248,21 @@ TEST(SafeSection, KnowsWhichTablesItMakesAndWhichVerifyTheirCrc) {
     unsigned char tableId;
     bool known;
     bool crc;
-  } cases[] = {{0x00, true, true}, {0x74, true, true}, {0x01, false, false}, {0xFF, false, false}};
+    bool crcWithoutSyntaxIndicator;
+  } cases[] = {
+      {0x00, true, true, true},   {0x01, false, false, false}, {0x02, true, true, true},
+      {0x3B, true, false, false}, {0x3C, true, false, false},  {0x3D, true, true, false},
+      {0x40, true, true, true},   {0x41, true, true, true},    {0x42, true, true, true},
+      {0x43, false, false, false}, {0x46, true, true, true},   {0x4E, true, true, true},
+      {0x4F, true, true, true},   {0x50, true, true, true},    {0x51, false, false, false},
+      {0x5F, false, false, false}, {0x60, true, true, true},   {0x6F, true, true, true},
+      {0x70, true, false, false}, {0x73, true, false, false},  {0x74, true, true, true},
+      {0xC4, true, true, true},   {0xFF, false, false, false},
+  };
   for (const Case& c : cases) {
     EXPECT_EQ(c.known, RavelCSafeSection::IsKnownTable(c.tableId)) << int(c.tableId);
     EXPECT_EQ(c.crc, RavelCSafeSection::ChecksCrc(c.tableId, 1)) << int(c.tableId);
+    EXPECT_EQ(c.crcWithoutSyntaxIndicator, RavelCSafeSection::ChecksCrc(c.tableId, 0)) << int(c.tableId);
   }
   EXPECT_STREQ("length mismatch", RavelCSafeSection::GetResultText(kRavelSafeLengthMismatch));
   EXPECT_STREQ("refused by the parser", RavelCSafeSection::GetResultText(kRavelSafeRefused));
@@ -269,7 +282,15 @@ TEST(SafeSection, ParsesAsADirectParseWouldWithTheSameTraces) {
 
     // A direct parse of the padded copy (some classes trace the address they parse).
     TraceRecorder direct;
-    if (safe.GetTable() != nullptr) {
+    if (safe.GetTDT() != nullptr) {
+      RavelCTDT tdt(safe.GetData());
+      tdt.Show();
+    } else if (safe.GetTOT() != nullptr) {
+      std::unique_ptr<RavelCTOT> tot(safe.CopyTOT());
+      direct.Clear();
+      EXPECT_EQ(kRavelOk, tot->ParseRawData(safe.GetData()));
+      tot->Show();
+    } else if (safe.GetTable() != nullptr) {
       std::unique_ptr<RavelCTableBase> table(safe.CopyTable());
       ASSERT_NE(nullptr, table);
       direct.Clear();
@@ -411,6 +432,41 @@ TEST(SafeSection, ParsesIntoTheCallersObjectAndReportsItsRefusal) {
   EXPECT_EQ(kRavelErrInvalidArgument, safe.GetParseResult());
   EXPECT_EQ((TraceLines{{kError, "Table ID isn't for PAT! Table ID=[127]\n"}}), recorder.Lines());
   EXPECT_EQ(0, table.GetProgramCount());
+}
+
+TEST(SafeSection, ARefusalByTheTablesOwnParseLeavesNoTable) {
+  // A PMT whose program info loop holds a descriptor of length 0: its CRC is
+  // good, the PMT's own parse refuses it.
+  sb::SectionOptions o;
+  o.tableId = 0x02;
+  Bytes pmt = sb::LongSection(o, sb::Cat({sb::U16(0xE100), sb::Length12(2), Bytes{0x55, 0x00}}));
+  RavelCSafeSection safe;
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelSafeRefused, safe.Parse(pmt.data(), static_cast<int>(pmt.size())));
+  EXPECT_EQ(kRavelErrCorruptSection, safe.GetParseResult());
+  EXPECT_EQ(nullptr, safe.GetTable());
+  EXPECT_EQ((TraceLines{{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x55], descrLen=[0]\n"}}),
+            recorder.Lines());
+
+  // The time tables, by table_id or into the caller's object.
+  Bytes tdt = sb::ShortSection(0x70, sb::UtcTime(2013, 3, 2, 12, 34, 56), false);
+  recorder.Clear();
+  ASSERT_EQ(kRavelSafeOk, safe.Parse(tdt.data(), static_cast<int>(tdt.size())));
+  ASSERT_NE(nullptr, safe.GetTDT());
+  EXPECT_EQ(34, safe.GetTDT()->iMinute);
+  EXPECT_EQ(nullptr, safe.GetTable());
+  RavelCTOT tot(nullptr);
+  EXPECT_EQ(kRavelSafeRefused, safe.ParseInto(tdt.data(), static_cast<int>(tdt.size()), tot));
+  EXPECT_EQ(kRavelErrInvalidArgument, safe.GetParseResult());
+  EXPECT_EQ(nullptr, safe.GetTDT());
+  RavelCTDT time(nullptr);
+  EXPECT_EQ(kRavelSafeOk, safe.ParseInto(tdt.data(), static_cast<int>(tdt.size()), time));
+  EXPECT_EQ(56, time.iSecond);
+  std::unique_ptr<RavelCTDT> taken;
+  ASSERT_EQ(kRavelSafeOk, safe.Parse(tdt.data(), static_cast<int>(tdt.size())));
+  taken.reset(safe.TakeTDT());
+  EXPECT_EQ(nullptr, safe.GetTDT());
+  EXPECT_EQ(12, taken->iHour);
 }
 
 TEST(SafeSection, InnerLengthsPastTheSectionReadOnlyTheZeroedPadding) {

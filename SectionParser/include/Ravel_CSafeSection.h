@@ -23,6 +23,8 @@
 #define RAVEL_CSAFESECTION_H
 
 class RavelCTableBase;
+class RavelCTDT;
+class RavelCTOT;
 class RavelCDsmccBase;
 class RavelCDsmccDSI;
 class RavelCDsmccDII;
@@ -72,6 +74,8 @@ class RavelCSafeSection {
   // Checks a section, then the caller's table parses the copy. The CRC is checked
   // first when the class that the table_id selects verifies it.
   RavelSafeResult ParseInto(const unsigned char* bytes, int count, RavelCTableBase& table);
+  RavelSafeResult ParseInto(const unsigned char* bytes, int count, RavelCTDT& table);
+  RavelSafeResult ParseInto(const unsigned char* bytes, int count, RavelCTOT& table);
 
   // The same for a DSM-CC message alone: `bytes` starts at its message header.
   RavelSafeResult LoadMessage(const unsigned char* bytes, int count);
@@ -84,16 +88,23 @@ class RavelCSafeSection {
 
   // What the last ParseRawData returned (0 when nothing was parsed).
   int GetParseResult() const { return iParseResult; }
-  // The table or DSM-CC message held, or null.
+  // The object held, or null: a table, one of the time tables (which have a
+  // header of their own), or a DSM-CC message. One at most is held.
   RavelCTableBase* GetTable() const { return pTable; }
+  RavelCTDT* GetTDT() const { return pTDT; }
+  RavelCTOT* GetTOT() const { return pTOT; }
   RavelCDsmccBase* GetMessage() const { return pMessage; }
   // Hand the held object to the caller, who deletes it. A DSI's private data
   // points into this object's copy (GetData) and lives only as long as it.
   RavelCTableBase* TakeTable();
+  RavelCTDT* TakeTDT();
+  RavelCTOT* TakeTOT();
   RavelCDsmccBase* TakeMessage();
   // A deep copy of the held object through its class's copy operation, owned by
-  // the caller; null when none is held or the class has no copy (the DSI).
+  // the caller; null when none is held or the class has no copy (the TDT, the
+  // DSI).
   RavelCTableBase* CopyTable() const;
+  RavelCTOT* CopyTOT() const;
   RavelCDsmccBase* CopyMessage() const;
   // The Show() of the held object, if any.
   void Show();
@@ -125,13 +136,19 @@ class RavelCSafeSection {
   RavelSafeResult ParseMessageAt(unsigned char* message, int count);
   RavelSafeResult ParseMessageInto(const unsigned char* bytes, int count, unsigned short messageId,
                                    RavelCDsmccBase& message);
+  template <class T>
+  RavelSafeResult ParseTimeTable(T*& held);
+  template <class T>
+  RavelSafeResult ParseCallers(const unsigned char* bytes, int count, T& table);
 
   unsigned char* pBuffer;  // iDataSize bytes, then kPadding zeroed bytes
   int iDataSize;
   int iParseResult;
   RavelCTableBase* pTable;
+  RavelCTDT* pTDT;
+  RavelCTOT* pTOT;
   RavelCDsmccBase* pMessage;
-  int iRow;  // row of the class that made the held object, -1 when none
+  int iRow;  // row of the class that made pTable or pMessage, -1 when none
 };
 
 #endif

@@ -7,9 +7,16 @@
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CDsmccDSI.h"
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableBIT.h"
 #include "Ravel_CTableBase.h"
+#include "Ravel_CTableEIT.h"
+#include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Util.h"
 
@@ -56,11 +63,30 @@ RavelCTableBase* CopyTable(RavelCTableBase& table) {
   return new T(static_cast<T&>(table));
 }
 
+// The PMT has an assignment and no copy constructor.
+RavelCTableBase* CopyPMT(RavelCTableBase& table) {
+  RavelCPMT* copy = new RavelCPMT(0);
+  *copy = static_cast<RavelCPMT&>(table);
+  return copy;
+}
+
+// The EIT takes 0x4E, 0x4F, 0x50 and 0x60 to 0x6F; 0x51 to 0x5F have no class.
 const TableRow kTableRows[] = {
     {0x00, 0x00, kCrcAlways, ParseNewTable<RavelCPAT>, CopyTable<RavelCPAT>},
+    {0x02, 0x02, kCrcAlways, ParseNewTable<RavelCPMT>, CopyPMT},
     {0x3D, 0x3D, kCrcWithSyntaxIndicator, ParseNewTable<RavelCDsmccStreamEvent>, CopyTable<RavelCDsmccStreamEvent>},
+    {0x40, 0x41, kCrcAlways, ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>},
+    {0x42, 0x42, kCrcAlways, ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>},
+    {0x46, 0x46, kCrcAlways, ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>},
+    {0x4E, 0x50, kCrcAlways, ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>},
+    {0x60, 0x6F, kCrcAlways, ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>},
     {0x74, 0x74, kCrcAlways, ParseNewAIT, CopyTable<RavelCAIT>},
+    {0xC4, 0xC4, kCrcAlways, ParseNewTable<RavelCBIT>, CopyTable<RavelCBIT>},
 };
+
+// The time tables keep their own short header and check no CRC_32.
+const unsigned char kTDTTableId = 0x70;
+const unsigned char kTOTTableId = 0x73;
 
 const int kTableRowCount = static_cast<int>(sizeof(kTableRows) / sizeof(kTableRows[0]));
 
@@ -174,7 +200,7 @@ const int RavelCSafeSection::kPadding;
 const int RavelCSafeSection::kMaxSectionSize;
 
 RavelCSafeSection::RavelCSafeSection()
-    : pBuffer(0), iDataSize(0), iParseResult(0), pTable(0), pMessage(0), iRow(-1) {}
+    : pBuffer(0), iDataSize(0), iParseResult(0), pTable(0), pTDT(0), pTOT(0), pMessage(0), iRow(-1) {}
 
 RavelCSafeSection::~RavelCSafeSection() {
   Clear();
@@ -184,6 +210,10 @@ RavelCSafeSection::~RavelCSafeSection() {
 void RavelCSafeSection::Clear() {
   delete pTable;
   pTable = 0;
+  delete pTDT;
+  pTDT = 0;
+  delete pTOT;
+  pTOT = 0;
   delete pMessage;
   pMessage = 0;
   iRow = -1;
@@ -200,14 +230,26 @@ void RavelCSafeSection::Reset() {
 RavelCTableBase* RavelCSafeSection::TakeTable() {
   RavelCTableBase* table = pTable;
   pTable = 0;
-  if (pMessage == 0) iRow = -1;
+  iRow = pMessage != 0 ? iRow : -1;
+  return table;
+}
+
+RavelCTDT* RavelCSafeSection::TakeTDT() {
+  RavelCTDT* table = pTDT;
+  pTDT = 0;
+  return table;
+}
+
+RavelCTOT* RavelCSafeSection::TakeTOT() {
+  RavelCTOT* table = pTOT;
+  pTOT = 0;
   return table;
 }
 
 RavelCDsmccBase* RavelCSafeSection::TakeMessage() {
   RavelCDsmccBase* message = pMessage;
   pMessage = 0;
-  if (pTable == 0) iRow = -1;
+  iRow = pTable != 0 ? iRow : -1;
   return message;
 }
 
@@ -216,6 +258,8 @@ RavelCTableBase* RavelCSafeSection::CopyTable() const {
   return kTableRows[iRow].pCopy(*pTable);
 }
 
+RavelCTOT* RavelCSafeSection::CopyTOT() const { return pTOT != 0 ? new RavelCTOT(*pTOT) : 0; }
+
 RavelCDsmccBase* RavelCSafeSection::CopyMessage() const {
   if (pMessage == 0 || kMessageRows[iRow].pCopy == 0) return 0;
   return kMessageRows[iRow].pCopy(*pMessage);
@@ -223,6 +267,8 @@ RavelCDsmccBase* RavelCSafeSection::CopyMessage() const {
 
 void RavelCSafeSection::Show() {
   if (pTable != 0) pTable->Show();
+  if (pTDT != 0) pTDT->Show();
+  if (pTOT != 0) pTOT->Show();
   if (pMessage != 0) pMessage->Show();
 }
 
@@ -255,6 +301,8 @@ RavelSafeResult RavelCSafeSection::Parse(const unsigned char* bytes, int count) 
     if (messageCount < kMessageHeaderSize) return kRavelSafeTooShort;
     return ParseMessageAt(pBuffer + kSectionHeaderSize, messageCount);
   }
+  if (pBuffer[0] == kTDTTableId) return ParseTimeTable(pTDT);
+  if (pBuffer[0] == kTOTTableId) return ParseTimeTable(pTOT);
   int row = FindTableRow(pBuffer[0]);
   if (row < 0) return kRavelSafeUnknownTable;
   RavelCTableBase* table = kTableRows[row].pCreate(pBuffer, iParseResult);
@@ -267,11 +315,37 @@ RavelSafeResult RavelCSafeSection::Parse(const unsigned char* bytes, int count) 
   return kRavelSafeOk;
 }
 
-RavelSafeResult RavelCSafeSection::ParseInto(const unsigned char* bytes, int count, RavelCTableBase& table) {
+// Built over a null section (which traces nothing), then parsed once.
+template <class T>
+RavelSafeResult RavelCSafeSection::ParseTimeTable(T*& held) {
+  T* table = new T(0);
+  iParseResult = table->ParseRawData(pBuffer);
+  if (iParseResult != kRavelOk) {
+    delete table;
+    return kRavelSafeRefused;
+  }
+  held = table;
+  return kRavelSafeOk;
+}
+
+template <class T>
+RavelSafeResult RavelCSafeSection::ParseCallers(const unsigned char* bytes, int count, T& table) {
   RavelSafeResult result = Load(bytes, count);
   if (result != kRavelSafeOk) return result;
   iParseResult = table.ParseRawData(pBuffer);
   return iParseResult == kRavelOk ? kRavelSafeOk : kRavelSafeRefused;
+}
+
+RavelSafeResult RavelCSafeSection::ParseInto(const unsigned char* bytes, int count, RavelCTableBase& table) {
+  return ParseCallers(bytes, count, table);
+}
+
+RavelSafeResult RavelCSafeSection::ParseInto(const unsigned char* bytes, int count, RavelCTDT& table) {
+  return ParseCallers(bytes, count, table);
+}
+
+RavelSafeResult RavelCSafeSection::ParseInto(const unsigned char* bytes, int count, RavelCTOT& table) {
+  return ParseCallers(bytes, count, table);
 }
 
 // `message` lies in pBuffer, followed by at least kPadding zeroed bytes.
@@ -335,7 +409,8 @@ RavelSafeResult RavelCSafeSection::CheckMessage(const unsigned char* message, in
 }
 
 bool RavelCSafeSection::IsKnownTable(unsigned char tableId) {
-  return FindTableRow(tableId) >= 0 || IsCarouselSection(tableId);
+  return FindTableRow(tableId) >= 0 || IsCarouselSection(tableId) || tableId == kTDTTableId ||
+         tableId == kTOTTableId;
 }
 
 bool RavelCSafeSection::ChecksCrc(unsigned char tableId, unsigned char sectionSyntaxIndicator) {
