@@ -13,10 +13,12 @@ set(CMAKE_CXX_COMPILER ${RAVEL_CROSS_TRIPLE}-g++)
 set(RAVEL_CROSS_SYSROOT /usr/${RAVEL_CROSS_TRIPLE})
 set(CMAKE_CROSSCOMPILING_EMULATOR qemu-arm -L ${RAVEL_CROSS_SYSROOT})
 
-# Libraries and headers of the target only (GoogleTest comes from a prefix built
-# for the target, added to CMAKE_FIND_ROOT_PATH by the caller); programs of the host.
+# Libraries of the target only (GoogleTest comes from a prefix built for the
+# target: the caller gives GTest_DIR); programs of the host. Headers and CMake
+# packages are looked for on the host too: the tools' JSON and command-line
+# libraries are header-only and serve any target.
 list(APPEND CMAKE_FIND_ROOT_PATH ${RAVEL_CROSS_SYSROOT})
 set(CMAKE_FIND_ROOT_PATH_MODE_PROGRAM NEVER)
 set(CMAKE_FIND_ROOT_PATH_MODE_LIBRARY ONLY)
-set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE ONLY)
-set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE ONLY)
+set(CMAKE_FIND_ROOT_PATH_MODE_INCLUDE BOTH)
+set(CMAKE_FIND_ROOT_PATH_MODE_PACKAGE BOTH)

@@ -14,6 +14,7 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -82,11 +83,18 @@ class RavelDumpTest : public ::testing::Test {
       dup2(fdIn, 0);
       dup2(fdOut, 1);
       dup2(fdErr, 2);
+      // A cross build's tool runs through its emulator, named first.
+      std::vector<std::string> words;
+#ifdef RAVEL_DUMP_EMULATOR
+      std::istringstream emulator(RAVEL_DUMP_EMULATOR);
+      for (std::string word; emulator >> word;) words.push_back(word);
+#endif
+      words.push_back(RAVEL_DUMP_PATH);
+      words.insert(words.end(), args.begin(), args.end());
       std::vector<char*> argv;
-      argv.push_back(const_cast<char*>(RAVEL_DUMP_PATH));
-      for (const std::string& a : args) argv.push_back(const_cast<char*>(a.c_str()));
+      for (std::string& w : words) argv.push_back(const_cast<char*>(w.c_str()));
       argv.push_back(nullptr);
-      execv(RAVEL_DUMP_PATH, argv.data());
+      execvp(argv[0], argv.data());
       _exit(127);
     }
     ToolRun run;

@@ -1,8 +1,10 @@
 # Runs ravel-dump over a capture and compares what it prints with the committed
 # golden file. With -DUPDATE=ON it rewrites the golden file instead (on purpose
 # only, after reading the difference).
+# A cross build's tool runs through its emulator ("|"-separated words).
+string(REPLACE "|" ";" emulator "${EMULATOR}")
 execute_process(
-  COMMAND ${TOOL} ${ARGS} ${CAPTURE}
+  COMMAND ${emulator} ${TOOL} ${ARGS} ${CAPTURE}
   RESULT_VARIABLE status
   OUTPUT_VARIABLE printed
   ERROR_VARIABLE report)

@@ -1,5 +1,6 @@
 # Runs ravel-make-sample into OUTPUT and fails unless the file equals EXPECTED.
-execute_process(COMMAND ${TOOL} ${OUTPUT} RESULT_VARIABLE result)
+string(REPLACE "|" ";" emulator "${EMULATOR}")
+execute_process(COMMAND ${emulator} ${TOOL} ${OUTPUT} RESULT_VARIABLE result)
 if(NOT result EQUAL 0)
   message(FATAL_ERROR "ravel-make-sample failed: ${result}")
 endif()

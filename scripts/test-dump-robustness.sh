@@ -1,0 +1,108 @@
+#!/usr/bin/env bash
+# ravel-dump over damaged input, under AddressSanitizer, UndefinedBehaviorSanitizer
+# and LeakSanitizer (the build of scripts/test-sanitizers.sh): every shared
+# capture and the sample cut at random points, captures with random bytes
+# written over them, and files of random bytes. Each run must end cleanly:
+# status 0, or 1 with ravel-dump's own message; no sanitizer report, no hang.
+#
+#   scripts/test-dump-robustness.sh [CUTS_PER_FILE]      default 30
+#
+# RAVEL_SEED repeats a run (the seed is printed); inputs that fail are kept in
+# build-asan/dump-robustness/failures.
+set -euo pipefail
+cd "$(dirname "$0")/.."
+cuts="${1:-30}"
+dump="${RAVEL_DUMP:-build-asan/tools/ravel-dump/ravel-dump}"
+if [ ! -x "$dump" ]; then
+  echo "$dump is missing: run scripts/test-sanitizers.sh first" >&2
+  exit 2
+fi
+captures="${RAVEL_CAPTURES:-../shared/captures}"
+seed="${RAVEL_SEED:-$(date +%s)}"
+RANDOM=$((seed % 32768))
+work=build-asan/dump-robustness
+rm -rf "$work"
+mkdir -p "$work/failures" "$work/modules"
+
+# Distinct exit statuses for the sanitizers, which otherwise exit with 1 like a
+# refused input.
+export ASAN_OPTIONS="detect_leaks=1:exitcode=86${ASAN_OPTIONS:+:$ASAN_OPTIONS}"
+export UBSAN_OPTIONS="halt_on_error=1:print_stacktrace=1:exitcode=87${UBSAN_OPTIONS:+:$UBSAN_OPTIONS}"
+
+runs=0
+failures=0
+modes=("" "--summary" "--json" "--extract-modules $work/modules" "--standard japan" "--trace all")
+
+# A random number below $1 (up to 2^30).
+below() { echo $(((RANDOM * 32768 + RANDOM) % $1)); }
+
+# Runs ravel-dump on $1 with the options that follow; $label names the case.
+check() {
+  local input=$1
+  shift
+  local rc=0
+  runs=$((runs + 1))
+  # shellcheck disable=SC2068
+  timeout 120 "$dump" --no-progress $@ "$input" >"$work/out" 2>"$work/err" || rc=$?
+  local why=""
+  if grep -qE "Sanitizer|runtime error:" "$work/err"; then
+    why="sanitizer report"
+  elif [ "$rc" -eq 1 ]; then
+    grep -q "^ravel-dump: " "$work/err" || why="status 1 without a message"
+  elif [ "$rc" -ne 0 ]; then
+    why="status $rc"
+  fi
+  if [ -n "$why" ]; then
+    failures=$((failures + 1))
+    local kept="$work/failures/$failures-$(basename "$input")"
+    cp "$input" "$kept"
+    echo "FAILED ($why): ravel-dump $* $kept [$label]" >&2
+    head -n 30 "$work/err" >&2
+  fi
+}
+
+files=()
+for f in "$captures"/*.ts "$captures"/*.sections samples/*.ts; do
+  [ -f "$f" ] && files+=("$f")
+done
+if [ ${#files[@]} -eq 0 ]; then
+  echo "no captures found in $captures" >&2
+  exit 2
+fi
+
+for f in "${files[@]}"; do
+  size=$(stat -c %s "$f")
+  options=""
+  case "$f" in *.sections) options="--sections" ;; esac
+  points=(0 1 3 187 188 189 $((size - 1)))
+  for ((i = 0; i < cuts; i++)); do points+=("$(below "$size")"); done
+  for point in "${points[@]}"; do
+    [ "$point" -ge 0 ] || continue
+    head -c "$point" "$f" >"$work/input"
+    label="$(basename "$f") cut at $point"
+    check "$work/input" "$options ${modes[$((runs % ${#modes[@]}))]}"
+  done
+  # Random bytes written over the capture, in 1 to 64 places.
+  for ((i = 0; i < cuts / 3 + 1; i++)); do
+    cp "$f" "$work/input"
+    spots=$((1 + $(below 64)))
+    for ((s = 0; s < spots; s++)); do
+      head -c $((1 + $(below 16))) /dev/urandom |
+        dd of="$work/input" bs=1 seek="$(below "$size")" conv=notrunc status=none
+    done
+    label="$(basename "$f") with $spots damaged spots"
+    check "$work/input" "$options ${modes[$((runs % ${#modes[@]}))]}"
+  done
+done
+
+# Files of random bytes, read as a stream and as raw sections.
+for ((i = 0; i < cuts; i++)); do
+  if [ $((i % 3)) -eq 0 ]; then n=$(below 400); else n=$(below 262144); fi
+  head -c "$n" /dev/urandom >"$work/input"
+  label="$n random bytes"
+  check "$work/input" "${modes[$((i % ${#modes[@]}))]}"
+  check "$work/input" "--sections"
+done
+
+echo "ravel-dump robustness: $runs runs, $failures failed (RAVEL_SEED=$seed)"
+[ "$failures" -eq 0 ]
