@@ -74,7 +74,7 @@ std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, unsign
   for (const std::string& name : names) {
     Bytes contents;
     if (!captures::Load(name, contents)) {
-      missing += (missing.empty() ? "" : ", ") + name;
+      missing += (missing.empty() ? "" : " ") + name;
       continue;
     }
     const bool isTs = name.size() > 3 && name.compare(name.size() - 3, 3, ".ts") == 0;
