@@ -19,6 +19,7 @@ struct RavelCDescriptorKind {
   const char* szBanner;          // first line of Show
   unsigned int iWrongTagMask;    // trace mask of the wrong-tag message
   bool bTraceNullArgument;       // "Invalid Argument!\n" before refusing a null descriptor
+  const char* szSourcePath;      // the class's source, reported with its traces
 };
 
 // The mask of almost every wrong-tag message.

@@ -11,7 +11,7 @@ static const unsigned int kShowMask = RAVEL_PARSER_WARNING;
 
 const RavelCDescriptorKind RavelCApplicationDescriptor::kKind = {
     0x00, "Application Descriptor", 0 /* any tag */,
-    "\t=================== Application Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Application Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCApplicationDescriptor::RavelCApplicationDescriptor(unsigned char* raw) {
   Clear();

@@ -16,7 +16,7 @@ static const unsigned int kShowMask = RAVEL_PARSER_WARNING;
 // "Application Descriptor".
 const RavelCDescriptorKind RavelCApplicationNameDescriptor::kKind = {
     0x01, "Application Descriptor", 0 /* any tag */,
-    "\t=================== Application Name Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Application Name Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCApplicationNameDescriptor::RavelCApplicationNameDescriptor(unsigned char* raw) {
   Clear();

@@ -11,7 +11,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorAudioComponent");
 // The audio class reuses the component descriptor's message and banner.
 const RavelCDescriptorKind RavelCAudioComponentDescriptor::kKind = {
     0xC4, "Audio Component Descriptor", "This Descriptor isn't Component Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 namespace {
 

@@ -40,14 +40,22 @@ void RavelCDescriptorBase::Show() {
               iDescriptorLength, sDescriptorName.GetString());
 }
 
+// Traces of the shared steps are reported from the descriptor class's own source.
+#define RAVEL_TRACE_KIND(kind, mask, ...)           \
+  do {                                              \
+    gszRavelDbgFilePath = (kind).szSourcePath;      \
+    gRavelDbgLineNum = __LINE__;                    \
+    RavelPGL_TraceOut((mask), __VA_ARGS__);         \
+  } while (0)
+
 int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind) {
   RavelCDescriptorBase::ParseRawData(raw);
   if (raw == 0) {
-    if (kind.bTraceNullArgument) RAVEL_TRACE(RAVEL_PARSER_ERROR, "Invalid Argument!\n");
+    if (kind.bTraceNullArgument) RAVEL_TRACE_KIND(kind, RAVEL_PARSER_ERROR, "Invalid Argument!\n");
     return kRavelErrInvalidArgument;
   }
   if (kind.szWrongTagFormat != 0 && iDescriptorTag != kind.iTag) {
-    RAVEL_TRACE(kind.iWrongTagMask, kind.szWrongTagFormat, iDescriptorTag);
+    RAVEL_TRACE_KIND(kind, kind.iWrongTagMask, kind.szWrongTagFormat, iDescriptorTag);
     return kRavelErrInvalidArgument;
   }
   sDescriptorName = kind.szDisplayName;
@@ -55,6 +63,6 @@ int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptor
 }
 
 void RavelCDescriptorBase::ShowHeader(const RavelCDescriptorKind& kind, unsigned int mask) {
-  RAVEL_TRACE(mask, "%s", kind.szBanner);
+  RAVEL_TRACE_KIND(kind, mask, "%s", kind.szBanner);
   RavelCDescriptorBase::Show();
 }

@@ -9,7 +9,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorContent");
 
 const RavelCDescriptorKind RavelCContentDescriptor::kKind = {
     0x54, "Content Descriptor", "This Descriptor isn't Content Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Content Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Content Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCContentDescriptor::RavelCContentDescriptor(unsigned char* raw) : pGenre(0), pUserGenre(0), iGenreCount(0) {
   ParseRawData(raw);

@@ -12,7 +12,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorCopyright");
 
 const RavelCDescriptorKind RavelCCopyrightDescriptor::kKind = {
     0x0D, "Copyright Descriptor", "This Descriptor isn't Copyright Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Copyright Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Copyright Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCCopyrightDescriptor::RavelCCopyrightDescriptor(unsigned char* raw) : iCopyrightId(0), pCopyrightInfo(0) {
   ParseRawData(raw);

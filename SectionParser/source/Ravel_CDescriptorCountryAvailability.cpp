@@ -9,7 +9,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorCountryAvailability");
 const RavelCDescriptorKind RavelCCountryAvailabilityDescriptor::kKind = {
     0x49, "Country Availabilty Descriptor",
     "This Descriptor isn't Country Availability Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Country Availability Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Country Availability Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCCountryAvailabilityDescriptor::RavelCCountryAvailabilityDescriptor(unsigned char* raw)
     : iCountryAvailabilityFlag(0), aCountryCodes() {

@@ -8,7 +8,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorDataComponent");
 
 const RavelCDescriptorKind RavelCDataComponentDescriptor::kKind = {
     0xFD, "Data Component Descriptor", "This Descriptor isn't Data Component Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Data Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Data Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(unsigned char* raw) : iDataComponentId(0) {
   ParseRawData(raw);

@@ -11,7 +11,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorExtendedBroadcaster");
 const RavelCDescriptorKind RavelCExtendedBroadcasterDescriptor::kKind = {
     0xCE, "Extended Braodcaster Descriptor",
     "This Descriptor isn't Extended Broadcaster Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Extended Broadcaster Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Extended Broadcaster Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(unsigned char* raw) : iBroadcasterType(0) {
   Release();

@@ -32,7 +32,7 @@ RavelCExtendedEvent::~RavelCExtendedEvent() {
 
 const RavelCDescriptorKind RavelCExtendedEventDescriptor::kKind = {
     0x4E, "Extended Event Descriptor", "This Descriptor isn't Extended Event Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Extended Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Extended Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCExtendedEventDescriptor::RavelCExtendedEventDescriptor(unsigned char* raw)
     : iDescriptorNumber(0), iLastDescriptorNumber(0), aItems(), pText(0) {

@@ -13,7 +13,7 @@ static const unsigned int kShowMask = RAVEL_PARSER_WARNING;
 
 const RavelCDescriptorKind RavelCGingaAppDescriptor::kKind = {
     0x06, "Ginga Application Descriptor", 0 /* any tag */,
-    "\t=================== Ginga Application Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Ginga Application Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(unsigned char* raw) {
   std::memset(szParameter, 0, sizeof(szParameter));

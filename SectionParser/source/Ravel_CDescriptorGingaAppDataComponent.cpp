@@ -11,7 +11,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorGingaAppDataComponent"
 const RavelCDescriptorKind RavelCGingaAppDataComponentDescriptor::kKind = {
     0xFD, "Unknown Descriptor",
     "This Descriptor isn't Ginga Application Data Component! Descriptor Tag=[0x%x]\n", 0 /* no Show */,
-    RAVEL_WRONG_TAG_MASK, false};
+    RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCGingaAppDataComponentDescriptor::RavelCGingaAppDataComponentDescriptor(unsigned char* raw)
     : iDataComponentId(0), pAdditionalGingaInfo(0) {

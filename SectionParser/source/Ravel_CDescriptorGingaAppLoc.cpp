@@ -14,7 +14,7 @@ static const unsigned int kShowMask = RAVEL_PARSER_WARNING;
 const RavelCDescriptorKind RavelCGingaAppLocDescriptor::kKind = {
     0x07, "Ginga Application Location Descriptor", 0 /* any tag */,
     "\t=================== Ginga Application Location Descriptor ===================\n", RAVEL_WRONG_TAG_MASK,
-    false};
+    false, kRavelTraceSourcePath};
 
 RavelCGingaAppLocDescriptor::RavelCGingaAppLocDescriptor(unsigned char* raw) {
   Clear();

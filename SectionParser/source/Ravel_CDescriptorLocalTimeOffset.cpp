@@ -69,7 +69,7 @@ void RavelCLocalTimeOffset::Show() {
 
 const RavelCDescriptorKind RavelCLocalTimeOffsetDescriptor::kKind = {
     0x58, "Time Offset Descriptor", "This Descriptor isn't LocalTimeOffset Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Local Time Offset Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Local Time Offset Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCLocalTimeOffsetDescriptor::RavelCLocalTimeOffsetDescriptor(unsigned char* raw) : aLocalTimeOffsets() {
   ParseRawData(raw);

@@ -13,7 +13,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorLogoTransmission");
 const RavelCDescriptorKind RavelCLogoTransmissionDescriptor::kKind = {
     0xCF, "Logo Transmission Descriptor",
     "This Descriptor isn't LogoTransmission Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== LogoTransmission Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== LogoTransmission Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 namespace {
 

@@ -9,7 +9,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorNetworkName");
 const RavelCDescriptorKind RavelCNetworkNameDescriptor::kKind = {
     0x40, "Network Name Descriptor",
     "This Descriptor isn't Network Name Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Network Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Network Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCNetworkNameDescriptor::RavelCNetworkNameDescriptor(unsigned char* raw) : sNetworkName() {
   ParseRawData(raw);

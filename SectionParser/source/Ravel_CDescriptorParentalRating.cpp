@@ -53,7 +53,7 @@ void RavelCParentalRating::Show() {
 
 const RavelCDescriptorKind RavelCParentalRatingDescriptor::kKind = {
     0x55, "Parental Rating Descriptor", "This Descriptor isn't ParentalRating Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Parental Rating Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Parental Rating Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCParentalRatingDescriptor::RavelCParentalRatingDescriptor(unsigned char* raw) : aParentalRatings() {
   ParseRawData(raw);

@@ -8,7 +8,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorPartialReception");
 const RavelCDescriptorKind RavelCPartialReceptionDescriptor::kKind = {
     0xFB, "Partial Reception Descriptor",
     "This Descriptor isn't Partial Reception Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Partial Reception Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Partial Reception Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCPartialReceptionDescriptor::RavelCPartialReceptionDescriptor(unsigned char* raw) : aServiceIds() {
   ParseRawData(raw);

@@ -9,7 +9,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorSeries");
 
 const RavelCDescriptorKind RavelCSeriesDescriptor::kKind = {
     0xD5, "Series Descriptor", "This Descriptor isn't Series Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Series Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Series Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCSeriesDescriptor::RavelCSeriesDescriptor(unsigned char* raw)
     : iSeriesId(0),

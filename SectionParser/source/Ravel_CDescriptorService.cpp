@@ -8,7 +8,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorService");
 
 const RavelCDescriptorKind RavelCServiceDescriptor::kKind = {
     0x48, "Service Descriptor", "This Descriptor isn't Service Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Service Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Service Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCServiceDescriptor::RavelCServiceDescriptor(unsigned char* raw)
     : iServiceType(0), pServiceProviderName(0), pServiceName(0) {

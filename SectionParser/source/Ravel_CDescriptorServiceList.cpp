@@ -9,7 +9,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorServiceList");
 const RavelCDescriptorKind RavelCServiceListDescriptor::kKind = {
     0x41, "Service List Descriptor",
     "This Descriptor isn't Service List Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Service List Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Service List Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCServiceListDescriptor::RavelCServiceListDescriptor(unsigned char* raw)
     : pServiceIds(0), pServiceTypes(0), iServiceCount(0) {

@@ -10,7 +10,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorShortEvent");
 
 const RavelCDescriptorKind RavelCShortEventDescriptor::kKind = {
     0x4D, "Short Event Descriptor", "This Descriptor isn't Short Event Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Short Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Short Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCShortEventDescriptor::RavelCShortEventDescriptor(unsigned char* raw) : pEventName(0), pEventDescription(0) {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));

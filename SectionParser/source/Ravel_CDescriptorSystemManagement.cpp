@@ -8,7 +8,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorSystemManagement");
 const RavelCDescriptorKind RavelCSystemManagementDescriptor::kKind = {
     0xFE, "System Management Descriptor",
     "This Descriptor isn't System Management Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== System Management Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true};
+    "\t=================== System Management Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true, kRavelTraceSourcePath};
 
 RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(unsigned char* raw)
     : iBroadcastingFlag(0), iBroadcastingIdentifier(0), iAdditionalBroadcastingIdentification(0) {

@@ -8,7 +8,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorTSInformation");
 
 const RavelCDescriptorKind RavelCTSInformationDescriptor::kKind = {
     0xCD, "TS Information Descriptor", "This Descriptor isn't TS Information Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== TS Information Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== TS Information Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(unsigned char* raw)
     : iRemoteControlKeyId(0), sTsName(), iTransmissionTypeCount(0) {

@@ -11,7 +11,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorTargetRegion");
 
 const RavelCDescriptorKind RavelCTargetRegionDescriptor::kKind = {
     0xC6, "Region Descriptor", "This Descriptor isn't Target Region Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Target Region Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false};
+    "\t=================== Target Region Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCTargetRegionDescriptor::RavelCTargetRegionDescriptor(unsigned char* raw) : pRegionSpec(0), iRegionSpecType(0) {
   ParseRawData(raw);

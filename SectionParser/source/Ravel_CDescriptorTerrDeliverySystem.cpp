@@ -10,7 +10,7 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorTerrDeliverySystem");
 const RavelCDescriptorKind RavelCTerrDeliverySystemDescriptor::kKind = {
     0xFA, "Terrestrial Delivery System Descriptor",
     "This Descriptor isn't Terrestrial Delivery System Descriptor! Descriptor Tag=[0x%x]\n",
-    "\t=================== Terrestrial Delivery Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true};
+    "\t=================== Terrestrial Delivery Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true, kRavelTraceSourcePath};
 
 RavelCTerrDeliverySystemDescriptor::RavelCTerrDeliverySystemDescriptor(unsigned char* raw)
     : iAreaCode(0), iGuardInterval(0), iTransmissionMode(0), iFrequencyCount(0), pFrequencies(0) {

@@ -1,0 +1,50 @@
+#include "Ravel_CDescriptorCompressionType.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorCompressionType");
+
+const RavelCDescriptorKind RavelCCompressionTypeDescriptor::kKind = {
+    0xC2,
+    "Compression Type Descriptor",
+    "This Descriptor isn't Compression Type Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Compression Type Descriptor ===================\n",
+    RAVEL_WRONG_TAG_MASK,
+    false, kRavelTraceSourcePath};
+
+RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(unsigned char* raw)
+    : iCompressionType(0), iOriginalSize(0) {
+  ParseRawData(raw);
+}
+
+RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(RavelCCompressionTypeDescriptor& other)
+    : RavelCDescriptorBase(other), iCompressionType(0), iOriginalSize(0) {
+  *this = other;
+}
+
+RavelCCompressionTypeDescriptor& RavelCCompressionTypeDescriptor::operator=(RavelCCompressionTypeDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iCompressionType = other.iCompressionType;
+  iOriginalSize = other.iOriginalSize;
+  return *this;
+}
+
+RavelCCompressionTypeDescriptor::~RavelCCompressionTypeDescriptor() {}
+
+int RavelCCompressionTypeDescriptor::ParseRawData(unsigned char* raw) {
+  iCompressionType = 0;
+  iOriginalSize = 0;
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) return result;
+  iCompressionType = raw[2];
+  iOriginalSize = RavelRead32(raw + 3);
+  return kRavelOk;
+}
+
+void RavelCCompressionTypeDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiCompressionType=[%d], iOriginalSize=[%d]\n", iCompressionType,
+              static_cast<int>(iOriginalSize));
+}

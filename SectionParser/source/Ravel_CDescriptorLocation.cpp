@@ -1,0 +1,42 @@
+#include "Ravel_CDescriptorLocation.h"
+
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorLocation");
+
+const RavelCDescriptorKind RavelCLocationDescriptor::kKind = {
+    0x06,
+    "Location Descriptor",
+    "This Descriptor isn't Location Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Location Descriptor ===================\n",
+    RAVEL_WRONG_TAG_MASK,
+    false, kRavelTraceSourcePath};
+
+RavelCLocationDescriptor::RavelCLocationDescriptor(unsigned char* raw) : iLocationTag(0) { ParseRawData(raw); }
+
+RavelCLocationDescriptor::RavelCLocationDescriptor(RavelCLocationDescriptor& other)
+    : RavelCDescriptorBase(other), iLocationTag(0) {
+  *this = other;
+}
+
+RavelCLocationDescriptor& RavelCLocationDescriptor::operator=(RavelCLocationDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iLocationTag = other.iLocationTag;
+  return *this;
+}
+
+RavelCLocationDescriptor::~RavelCLocationDescriptor() {}
+
+int RavelCLocationDescriptor::ParseRawData(unsigned char* raw) {
+  iLocationTag = 0;
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) return result;
+  iLocationTag = raw[2];
+  return kRavelOk;
+}
+
+void RavelCLocationDescriptor::Show() {
+  ShowHeader(kKind);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiLocationTag=[%d]\n", iLocationTag);
+}

@@ -1,0 +1,49 @@
+#include "Ravel_CDescriptorModuleLink.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorModuleLink");
+
+const RavelCDescriptorKind RavelCModuleLinkDescriptor::kKind = {
+    0x04,
+    "Module Link Descriptor",
+    "This Descriptor isn't Module Link Descriptor! Descriptor Tag=[0x%x]\n",
+    "\t=================== Module Link Descriptor ===================\n",
+    RAVEL_WRONG_TAG_MASK,
+    false, kRavelTraceSourcePath};
+
+RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(unsigned char* raw) : iPosition(0), iModuleId(0) {
+  ParseRawData(raw);
+}
+
+RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(RavelCModuleLinkDescriptor& other)
+    : RavelCDescriptorBase(other), iPosition(0), iModuleId(0) {
+  *this = other;
+}
+
+RavelCModuleLinkDescriptor& RavelCModuleLinkDescriptor::operator=(RavelCModuleLinkDescriptor& other) {
+  RavelCDescriptorBase::operator=(other);
+  iPosition = other.iPosition;
+  iModuleId = other.iModuleId;
+  return *this;
+}
+
+RavelCModuleLinkDescriptor::~RavelCModuleLinkDescriptor() {}
+
+int RavelCModuleLinkDescriptor::ParseRawData(unsigned char* raw) {
+  iPosition = 0;
+  iModuleId = 0;
+  int result = ParseHeader(raw, kKind);
+  if (result != kRavelOk) return result;
+  iPosition = raw[2];
+  iModuleId = RavelRead16(raw + 3);
+  return kRavelOk;
+}
+
+void RavelCModuleLinkDescriptor::Show() {
+  ShowHeader(kKind);
+  // The module id is a number: printed in decimal under its usual label.
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiPosition=[%d], iModuleId=[%d]\n", iPosition, iModuleId);
+}

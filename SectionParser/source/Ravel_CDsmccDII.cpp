@@ -1,0 +1,267 @@
+#include "Ravel_CDsmccDII.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDsmccDII");
+
+namespace {
+
+// Replaces the descriptor held in `slot` by a copy of the one in `source`.
+template <class T>
+void CopyDescriptor(T*& slot, T* source) {
+  delete slot;
+  slot = source != 0 ? new T(*source) : 0;
+}
+
+// Replaces the descriptor held in `slot` by one parsed from `raw` (a later
+// descriptor of the same kind wins).
+template <class T>
+void ReplaceDescriptor(T*& slot, unsigned char* raw) {
+  delete slot;
+  slot = new T(raw);
+}
+
+}  // namespace
+
+// ---------------------------------------------------------------------------
+// RavelCModuleInfo
+
+RavelCModuleInfo::RavelCModuleInfo(unsigned char* record)
+    : iModuleId(0),
+      iModuleSize(0),
+      iModuleVersion(0),
+      iModuleInfoLength(0),
+      pTypeDescriptor(0),
+      pNameDescriptor(0),
+      pInfoDescriptor(0),
+      pModuleLinkDescriptor(0),
+      pCRC32Descriptor(0),
+      pEstDownloadTimeDescriptor(0),
+      pCompressionTypeDescriptor(0) {
+  ParseRawData(record);
+}
+
+RavelCModuleInfo::RavelCModuleInfo(RavelCModuleInfo& other)
+    : iModuleId(0),
+      iModuleSize(0),
+      iModuleVersion(0),
+      iModuleInfoLength(0),
+      pTypeDescriptor(0),
+      pNameDescriptor(0),
+      pInfoDescriptor(0),
+      pModuleLinkDescriptor(0),
+      pCRC32Descriptor(0),
+      pEstDownloadTimeDescriptor(0),
+      pCompressionTypeDescriptor(0) {
+  *this = other;
+}
+
+RavelCModuleInfo& RavelCModuleInfo::operator=(RavelCModuleInfo& other) {
+  if (this == &other) return *this;
+  iModuleId = other.iModuleId;
+  iModuleSize = other.iModuleSize;
+  iModuleVersion = other.iModuleVersion;
+  iModuleInfoLength = other.iModuleInfoLength;
+  CopyDescriptor(pTypeDescriptor, other.pTypeDescriptor);
+  CopyDescriptor(pNameDescriptor, other.pNameDescriptor);
+  CopyDescriptor(pInfoDescriptor, other.pInfoDescriptor);
+  CopyDescriptor(pModuleLinkDescriptor, other.pModuleLinkDescriptor);
+  CopyDescriptor(pCRC32Descriptor, other.pCRC32Descriptor);
+  CopyDescriptor(pEstDownloadTimeDescriptor, other.pEstDownloadTimeDescriptor);
+  CopyDescriptor(pCompressionTypeDescriptor, other.pCompressionTypeDescriptor);
+  return *this;
+}
+
+RavelCModuleInfo::~RavelCModuleInfo() { DeleteDescriptors(); }
+
+void RavelCModuleInfo::DeleteDescriptors() {
+  delete pTypeDescriptor;
+  pTypeDescriptor = 0;
+  delete pNameDescriptor;
+  pNameDescriptor = 0;
+  delete pInfoDescriptor;
+  pInfoDescriptor = 0;
+  delete pModuleLinkDescriptor;
+  pModuleLinkDescriptor = 0;
+  delete pCRC32Descriptor;
+  pCRC32Descriptor = 0;
+  delete pEstDownloadTimeDescriptor;
+  pEstDownloadTimeDescriptor = 0;
+  delete pCompressionTypeDescriptor;
+  pCompressionTypeDescriptor = 0;
+}
+
+int RavelCModuleInfo::ParseRawData(unsigned char* record) {
+  DeleteDescriptors();
+  if (record == 0) {
+    RAVEL_TRACE(RAVEL_CAROUSEL_ERROR, "Module Info Parsing Error. Input Data is NULL!\n");
+    iModuleId = 0;
+    iModuleSize = 0;
+    iModuleVersion = 0;
+    iModuleInfoLength = 0;
+    return kRavelErrInvalidArgument;
+  }
+  iModuleId = RavelRead16(record);
+  iModuleSize = RavelRead32(record + 2);
+  iModuleVersion = record[6];
+  iModuleInfoLength = record[7];
+  if (iModuleInfoLength == 0) return kRavelOk;
+
+  // The descriptor lengths are trusted; the walk stops once past the record.
+  unsigned char* at = record + 8;
+  unsigned char* end = at + iModuleInfoLength;
+  do {
+    unsigned char tag = at[0];
+    switch (tag) {
+      case 0x01:
+        ReplaceDescriptor(pTypeDescriptor, at);
+        break;
+      case 0x02:
+        ReplaceDescriptor(pNameDescriptor, at);
+        break;
+      case 0x03:
+        ReplaceDescriptor(pInfoDescriptor, at);
+        break;
+      case 0x04:
+        ReplaceDescriptor(pModuleLinkDescriptor, at);
+        break;
+      case 0x05:
+        ReplaceDescriptor(pCRC32Descriptor, at);
+        break;
+      case 0x07:
+        ReplaceDescriptor(pEstDownloadTimeDescriptor, at);
+        break;
+      case 0xC2:
+        ReplaceDescriptor(pCompressionTypeDescriptor, at);
+        break;
+      default:  // the location descriptor (0x06) included
+        RAVEL_TRACE(RAVEL_PARSER_WARNING, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x%02x]\n", tag);
+        break;
+    }
+    at += at[1] + 2;
+  } while (at < end);
+  return kRavelOk;
+}
+
+void RavelCModuleInfo::Show() {
+  RAVEL_TRACE(RAVEL_CAROUSEL_DUMP,
+              "\tModule Info: moduleId=[0x%04x], moduleSize=[%d], moduleVersion=[0x%02x], moduleInfoLength=[%d]\n",
+              iModuleId, static_cast<int>(iModuleSize), iModuleVersion, iModuleInfoLength);
+  if (pTypeDescriptor != 0) pTypeDescriptor->Show();
+  if (pNameDescriptor != 0) pNameDescriptor->Show();
+  if (pInfoDescriptor != 0) pInfoDescriptor->Show();
+  if (pModuleLinkDescriptor != 0) pModuleLinkDescriptor->Show();
+  if (pCRC32Descriptor != 0) pCRC32Descriptor->Show();
+  if (pEstDownloadTimeDescriptor != 0) pEstDownloadTimeDescriptor->Show();
+  if (pCompressionTypeDescriptor != 0) pCompressionTypeDescriptor->Show();
+}
+
+// ---------------------------------------------------------------------------
+// RavelCDsmccDII
+
+RavelCDsmccDII::RavelCDsmccDII(unsigned char* data) : RavelCDsmccBase(0), cModuleInfos() {
+  ClearDownloadParameters();
+  ParseRawData(data);
+}
+
+RavelCDsmccDII::RavelCDsmccDII(RavelCDsmccDII& other) : RavelCDsmccBase(0), cModuleInfos() {
+  ClearDownloadParameters();
+  *this = other;
+}
+
+RavelCDsmccDII& RavelCDsmccDII::operator=(RavelCDsmccDII& other) {
+  if (this == &other) return *this;
+  cModuleInfos.RemoveAll();
+  iProtocolDiscriminator = other.iProtocolDiscriminator;
+  iDsmccType = other.iDsmccType;
+  iMessageId = other.iMessageId;
+  iTransactionId = other.iTransactionId;
+  iAdaptationLength = other.iAdaptationLength;
+  iMessageLength = other.iMessageLength;
+  iDownloadId = other.iDownloadId;
+  iBlockSize = other.iBlockSize;
+  iWindowSize = other.iWindowSize;
+  iAckPeriod = other.iAckPeriod;
+  iTCDownloadWindow = other.iTCDownloadWindow;
+  iTCDownloadScenario = other.iTCDownloadScenario;
+  for (int i = 0; i < other.cModuleInfos.iCount; ++i) {
+    cModuleInfos.Append(new RavelCModuleInfo(*other.cModuleInfos.ipArray[i]));
+  }
+  return *this;
+}
+
+RavelCDsmccDII::~RavelCDsmccDII() {}
+
+void RavelCDsmccDII::ClearDownloadParameters() {
+  iDownloadId = 0;
+  iBlockSize = 0;
+  iWindowSize = 0;
+  iAckPeriod = 0;
+  iTCDownloadWindow = 0;
+  iTCDownloadScenario = 0;
+}
+
+int RavelCDsmccDII::ParseRawData(unsigned char* data) {
+  cModuleInfos.RemoveAll();
+  RavelCDsmccBase::ParseRawData(data);
+  if (data == 0) {
+    ClearDownloadParameters();
+    return kRavelErrInvalidArgument;
+  }
+  unsigned char* body = data + 12 + iAdaptationLength;
+  iDownloadId = RavelRead32(body);
+  iBlockSize = RavelRead16(body + 4);
+  iWindowSize = body[6];
+  iAckPeriod = body[7];
+  iTCDownloadWindow = RavelRead32(body + 8);
+  iTCDownloadScenario = RavelRead32(body + 12);
+
+  // The compatibility descriptor is skipped by its length.
+  unsigned char* compatibilityEnd = body + 16 + RavelRead16(body + 16);
+  unsigned short numberOfModules = RavelRead16(compatibilityEnd + 2);
+  unsigned char* record = compatibilityEnd + 4;
+  for (unsigned short i = 0; i < numberOfModules; ++i) {
+    RavelCModuleInfo* module = new RavelCModuleInfo(record);
+    cModuleInfos.Append(module);
+    record += 8 + module->iModuleInfoLength;
+  }
+
+  // Nothing of the private data is kept; its descriptors are only reported.
+  unsigned short privateDataLength = RavelRead16(record);
+  if (privateDataLength != 0) {
+    unsigned char* at = record + 2;
+    unsigned char* end = at + privateDataLength;
+    while (at < end) {
+      RAVEL_TRACE(RAVEL_PARSER_WARNING, "DSMCC DII: Unsupported Descriptor. Tag=[0x%02x]\n", at[0]);
+      at += at[1] + 2;
+    }
+  }
+  return kRavelOk;
+}
+
+void RavelCDsmccDII::Show() {
+  RavelCDsmccBase::Show();
+  RAVEL_TRACE(RAVEL_CAROUSEL_DUMP, "downloadId=[0x%08x], blockSize=[%d], windowSize=[%d], ackPeriod=[%d]\n",
+              iDownloadId, iBlockSize, iWindowSize, iAckPeriod);
+  RAVEL_TRACE(RAVEL_CAROUSEL_DUMP, "tCDownloadWindow=[0x%08x], tCDownloadScenario=[0x%08x], numOfMOdules=[%d]\n",
+              iTCDownloadWindow, iTCDownloadScenario, cModuleInfos.iCount);
+  for (int i = 0; i < cModuleInfos.iCount; ++i) cModuleInfos.ipArray[i]->Show();
+}
+
+RavelCModuleInfo* RavelCDsmccDII::GetModuleInfo(int index) {
+  if (index < 0 || index >= cModuleInfos.iCount) {
+    RAVEL_TRACE(RAVEL_CAROUSEL_ERROR, "GetModuleInfo: Invalid Array Index=[%d], Module Info Len=[%d]\n", index,
+                cModuleInfos.iCount);
+    return 0;
+  }
+  return cModuleInfos.ipArray[index];
+}
+
+RavelCModuleInfo* RavelCDsmccDII::GetModuleInfoByID(unsigned short moduleId) {
+  for (int i = 0; i < cModuleInfos.iCount; ++i) {
+    if (cModuleInfos.ipArray[i]->iModuleId == moduleId) return cModuleInfos.ipArray[i];
+  }
+  return 0;
+}

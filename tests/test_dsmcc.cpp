@@ -1,0 +1,682 @@
+// DSM-CC data carousel messages: the message header, DSI, DII and DDB.
+#include <gtest/gtest.h>
+
+#include <cstring>
+#include <map>
+#include <memory>
+#include <string>
+
+#include "Captures.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CArray.h"
+#include "Ravel_CDsmccDDB.h"
+#include "Ravel_CDsmccDII.h"
+#include "Ravel_CDsmccDSI.h"
+#include "Ravel_CDsmccMsgBase.h"
+#include "Ravel_CNASP.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Util.h"
+#include "SectionReassembly.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kCarouselDump = 0x10000040u;
+const unsigned int kCarouselWarning = 0x40000040u;
+const unsigned int kCarouselError = 0x80000040u;
+
+// dsmccMessageHeader / dsmccDownloadDataHeader with its adaptation bytes.
+Bytes Header(uint16_t messageId, uint32_t transactionId, uint8_t adaptationLength, uint16_t messageLength,
+             uint8_t dsmccType = 0x03) {
+  Bytes h{0x11, dsmccType};
+  sb::Append(h, sb::U16(messageId));
+  sb::Append(h, sb::U32(transactionId));
+  h.push_back(0xFF);  // reserved
+  h.push_back(adaptationLength);
+  sb::Append(h, sb::U16(messageLength));
+  for (int i = 0; i < adaptationLength; ++i) h.push_back(static_cast<uint8_t>(0xA0 + i));
+  return h;
+}
+
+Bytes ServerId(uint32_t carouselId, uint16_t tsid, uint16_t onid, uint16_t sid) {
+  Bytes s{0x00, 0x01};  // AFI, type
+  sb::Append(s, sb::U32(carouselId));
+  sb::Append(s, sb::U32(0x00010203));
+  sb::Append(s, sb::U16(tsid));
+  sb::Append(s, sb::U16(onid));
+  sb::Append(s, sb::U16(sid));
+  sb::Append(s, Bytes{0xEE, 0xEE, 0xEE, 0xEE});  // not read
+  return s;
+}
+
+Bytes Dsi(uint8_t adaptationLength, const Bytes& privateData, uint16_t messageId = 0x1006) {
+  Bytes body = ServerId(0x0000ABCD, 0x0421, 0x0422, 0xE760);
+  sb::Append(body, sb::U16(0));  // compatibilityDescriptorLength
+  sb::Append(body, sb::U16(static_cast<unsigned int>(privateData.size())));
+  sb::Append(body, privateData);
+  Bytes message =
+      Header(messageId, 0x80000002u, adaptationLength, static_cast<uint16_t>(adaptationLength + body.size()));
+  sb::Append(message, body);
+  return message;
+}
+
+Bytes Ddb(uint16_t moduleId, uint8_t version, uint16_t block, const Bytes& data, uint8_t adaptationLength = 0) {
+  Bytes message =
+      Header(0x1003, 0x000000AB, adaptationLength, static_cast<uint16_t>(adaptationLength + 6 + data.size()));
+  sb::Append(message, sb::U16(moduleId));
+  message.push_back(version);
+  message.push_back(0xFF);  // reserved
+  sb::Append(message, sb::U16(block));
+  sb::Append(message, data);
+  return message;
+}
+
+Bytes Pattern(size_t size, uint8_t seed) {
+  Bytes b(size);
+  for (size_t i = 0; i < size; ++i) b[i] = static_cast<uint8_t>(seed + i * 7);
+  return b;
+}
+
+struct Module {
+  uint16_t id;
+  uint32_t size;
+  uint8_t version;
+  Bytes info;  // the module info descriptors
+};
+
+Bytes ModuleRecord(const Module& m) {
+  Bytes r = sb::U16(m.id);
+  sb::Append(r, sb::U32(m.size));
+  r.push_back(m.version);
+  r.push_back(static_cast<uint8_t>(m.info.size()));
+  sb::Append(r, m.info);
+  return r;
+}
+
+Bytes Dii(const std::vector<Module>& modules, const Bytes& privateData, uint8_t adaptationLength = 0,
+          const Bytes& compatibility = Bytes()) {
+  Bytes body = sb::U32(0x80000002u);  // downloadId
+  sb::Append(body, sb::U16(4066));    // blockSize
+  body.push_back(0x03);               // windowSize
+  body.push_back(0x04);               // ackPeriod
+  sb::Append(body, sb::U32(0x00000005));
+  sb::Append(body, sb::U32(0xFFFFFFFFu));
+  sb::Append(body, sb::U16(static_cast<unsigned int>(compatibility.size())));
+  sb::Append(body, compatibility);
+  sb::Append(body, sb::U16(static_cast<unsigned int>(modules.size())));
+  for (const Module& m : modules) sb::Append(body, ModuleRecord(m));
+  sb::Append(body, sb::U16(static_cast<unsigned int>(privateData.size())));
+  sb::Append(body, privateData);
+  Bytes message = Header(0x1002, 0x80000002u, adaptationLength, static_cast<uint16_t>(adaptationLength + body.size()));
+  sb::Append(message, body);
+  return message;
+}
+
+TraceLines DumpOf(RavelCDsmccDII& dii) {
+  TraceRecorder recorder;
+  dii.Show();
+  return recorder.Lines();
+}
+
+std::string Format(const char* format, int a, int b, int c, int d) {
+  char text[200];
+  std::snprintf(text, sizeof(text), format, a, b, c, d);
+  return text;
+}
+
+}  // namespace
+
+TEST(DsmccHeader, ReadsEveryMessageAndReportsUnknownIdsByTheirDsmccType) {
+  struct Case {
+    uint16_t messageId;
+    uint8_t dsmccType;
+    TraceLines trace;
+  } cases[] = {
+      {0x1002, 0x03, {}},
+      {0x1003, 0x03, {}},
+      {0x1006, 0x03, {}},
+      {0x1001, 0x03, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x03]\n"}}},
+      {0x0000, 0x7F, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x7f]\n"}}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.messageId);
+    Bytes message = Header(c.messageId, 0xFEDCBA98u, 2, 0x1234, c.dsmccType);
+    TraceRecorder recorder;
+    RavelCDsmccBase header(message.data());
+    EXPECT_EQ(c.trace, recorder.Lines());
+    if (!c.trace.empty()) {
+      EXPECT_EQ("SectionParser/source/Ravel_CDsmccMsgBase", recorder.Records()[0].file);
+    }
+    EXPECT_EQ(0x11, header.GetProtocolDiscriminator());
+    EXPECT_EQ(c.dsmccType, header.GetDsmccType());
+    EXPECT_EQ(c.messageId, header.GetMessageId());
+    EXPECT_EQ(0xFEDCBA98u, header.GetTransactionId());
+    EXPECT_EQ(2, header.GetAdaptationLength());
+    EXPECT_EQ(0x1234, header.GetMessageLength());
+    recorder.Clear();
+    EXPECT_EQ(kRavelOk, header.ParseRawData(message.data()));
+    EXPECT_EQ(c.trace, recorder.Lines());
+
+    recorder.Clear();
+    header.Show();
+    char first[160];
+    std::snprintf(first, sizeof(first),
+                  "DSMCC Header: protocolDiscriminator=[0x11], dsmccType=[0x%02x], messageID=[0x%04x]\n", c.dsmccType,
+                  c.messageId);
+    TraceLines dump{
+        {kCarouselDump, first},
+        {kCarouselDump, "DSMCC Header: transaction_id=[0xfedcba98], adaptationLength=[2], messageLength=[4660]\n"}};
+    EXPECT_EQ(dump, recorder.Lines());
+
+    recorder.Clear();
+    EXPECT_EQ(kRavelErrInvalidArgument, header.ParseRawData(nullptr));
+    EXPECT_TRUE(recorder.Records().empty());
+    EXPECT_EQ(0, header.GetMessageId());
+    EXPECT_EQ(0u, header.GetTransactionId());
+    EXPECT_EQ(0, header.GetMessageLength());
+  }
+}
+
+TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
+  struct Case {
+    const char* what;
+    uint8_t adaptationLength;
+    uint16_t messageId;
+    Bytes privateData;
+    TraceLines trace;
+  } cases[] = {
+      {"plain",
+       0,
+       0x1006,
+       Bytes{1, 2, 3},
+       {{kCarouselWarning, "NASP Input Data is NULL!\n"},
+        {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+        {kCarouselWarning, "Private data length [3]\n"}}},
+      // Server id from byte 16 of the message.
+      {"adaptation 4",
+       4,
+       0x1006,
+       Bytes(),
+       {{kCarouselWarning, "NASP Input Data is NULL!\n"},
+        {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+        {kCarouselWarning, "Private data length [0]\n"}}},
+      {"foreign message id",
+       0,
+       0x1001,
+       Bytes{9},
+       {{kCarouselWarning, "NASP Input Data is NULL!\n"},
+        {kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x03]\n"},
+        {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+        {kCarouselWarning, "Private data length [1]\n"}}},
+  };
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes message = Dsi(c.adaptationLength, c.privateData, c.messageId);
+    TraceRecorder recorder;
+    RavelCDsmccDSI dsi(message.data());
+    EXPECT_EQ(c.trace, recorder.Lines());
+    EXPECT_EQ("SectionParser/source/Ravel_CNASP", recorder.Records()[0].file);
+    EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records().back().file);
+    RavelCNASP& nasp = dsi.GetNASP();
+    EXPECT_EQ(0x00, nasp.GetAFI());
+    EXPECT_EQ(0x01, nasp.GetType());
+    EXPECT_EQ(0x0000ABCDu, nasp.GetCarouselId());
+    EXPECT_EQ(0x00010203u, nasp.GetSpecifier());
+    EXPECT_EQ(0x0421, nasp.GetTransportStreamId());
+    EXPECT_EQ(0x0422, nasp.GetOriginalNetworkId());
+    EXPECT_EQ(0xE760, nasp.GetServiceId());
+    EXPECT_EQ(static_cast<int>(c.privateData.size()), dsi.GetPrivateDataLength());
+    // Points into the message itself, after serverId, compatibility descriptor and length.
+    EXPECT_EQ(message.data() + 12 + c.adaptationLength + 24, dsi.GetPrivateData());
+
+    recorder.Clear();
+    dsi.Show();
+    TraceLines dump{
+        {kCarouselDump, Format("DSMCC Header: protocolDiscriminator=[0x%02x], dsmccType=[0x%02x], messageID=[0x%04x]\n",
+                               0x11, 0x03, c.messageId, 0)},
+        {kCarouselDump,
+         Format("DSMCC Header: transaction_id=[0x%08x], adaptationLength=[%d], messageLength=[%d]\n",
+                static_cast<int>(0x80000002u), c.adaptationLength, static_cast<int>(message.size()) - 12, 0)},
+        {kCarouselDump, "\t\tNASP: AFI=[0x00], Type=[0x01], CaourselID=[0x0000abcd], iSpecifier=[0x00010203]\n"},
+        {kCarouselDump,
+         "\t\tNASP(Ginga Service Location): Transport Stream Id=[0x0421], Original Network ID=[0x0422], Service "
+         "ID=[0xe760]\n"}};
+    EXPECT_EQ(dump, recorder.Lines());
+  }
+  TraceRecorder recorder;
+  RavelCDsmccDSI empty(nullptr);
+  TraceLines trace{{kCarouselWarning, "NASP Input Data is NULL!\n"},
+                   {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"}};
+  EXPECT_EQ(trace, recorder.Lines());
+  EXPECT_EQ(0, empty.GetMessageId());
+  EXPECT_EQ(0u, empty.GetNASP().GetCarouselId());
+  recorder.Clear();
+  EXPECT_EQ(kRavelErrInvalidArgument, empty.ParseRawData(nullptr));
+  EXPECT_EQ(TraceLines({{kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"}}), recorder.Lines());
+  RavelCNASP nasp(nullptr);
+  EXPECT_EQ(kRavelErrInvalidArgument, nasp.ParseRawData(nullptr));
+}
+
+TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
+  struct Case {
+    const char* what;
+    size_t size;
+    uint8_t adaptationLength;
+    int result;
+    int blockDataLen;
+    TraceLines trace;
+  } cases[] = {
+      {"empty block", 0, 0, kRavelOk, 0, {}},
+      {"one byte", 1, 0, kRavelOk, 1, {}},
+      {"after an adaptation header", 100, 4, kRavelOk, 100, {}},
+      {"the limit", 4096, 0, kRavelOk, 4096, {}},
+      {"one over the limit",
+       4097,
+       0,
+       kRavelErrCorruptSection,
+       0,
+       {{kCarouselError, "Invalid Block Data Length=[4097]\n"}}},
+      {"over the limit with adaptation",
+       4097,
+       8,
+       kRavelErrCorruptSection,
+       0,
+       {{kCarouselError, "Invalid Block Data Length=[4097]\n"}}},
+  };
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes data = Pattern(c.size, 3);
+    Bytes message = Ddb(0x0102, 7, 9, data, c.adaptationLength);
+    TraceRecorder recorder;
+    RavelCDsmccDDB ddb(nullptr);
+    EXPECT_EQ(c.result, ddb.ParseRawData(message.data()));
+    EXPECT_EQ(c.trace, recorder.Lines());
+    EXPECT_EQ(0x0102, ddb.GetModuleId());
+    EXPECT_EQ(7, ddb.GetModuleVersion());
+    EXPECT_EQ(9, ddb.GetBlockNumber());
+    EXPECT_EQ(c.blockDataLen, ddb.GetBlockDataLen());
+    if (c.result == kRavelOk) {
+      ASSERT_NE(nullptr, ddb.GetBlockData());
+      EXPECT_EQ(data, Bytes(ddb.GetBlockData(), ddb.GetBlockData() + ddb.GetBlockDataLen()));
+      // The block is a copy: the message may go away.
+      EXPECT_TRUE(data.empty() || ddb.GetBlockData() != message.data() + 18 + c.adaptationLength);
+    } else {
+      EXPECT_EQ(nullptr, ddb.GetBlockData());
+    }
+    recorder.Clear();
+    ddb.Show();
+    ASSERT_EQ(3u, recorder.Records().size());
+    EXPECT_EQ(kCarouselDump, recorder.Records()[2].mask);
+    EXPECT_EQ(Format("moduleId=[0x%04x], moduleVersion=[0x%02x], blockNumber=[%d], blockDataLen=[%d]\n", 0x0102, 7, 9,
+                     c.blockDataLen),
+              recorder.Records()[2].text);
+  }
+}
+
+TEST(DsmccDDB, ParsesAgainCopiesDeeplyAndClearsOnNull) {
+  Bytes first = Ddb(1, 1, 0, Pattern(50, 1));
+  Bytes second = Ddb(2, 3, 4, Pattern(20, 9));
+  RavelCDsmccDDB ddb(first.data());
+  ASSERT_EQ(kRavelOk, ddb.ParseRawData(second.data()));
+  EXPECT_EQ(2, ddb.GetModuleId());
+  EXPECT_EQ(20, ddb.GetBlockDataLen());
+  EXPECT_EQ(0, std::memcmp(second.data() + 18, ddb.GetBlockData(), 20));
+
+  RavelCDsmccDDB copy(ddb);
+  EXPECT_EQ(0x1003, copy.GetMessageId());
+  EXPECT_EQ(0xABu, copy.GetTransactionId());
+  EXPECT_EQ(26, copy.GetMessageLength());
+  EXPECT_TRUE(copy == ddb);
+  EXPECT_EQ(20, copy.GetBlockDataLen());
+  EXPECT_NE(ddb.GetBlockData(), copy.GetBlockData());
+  EXPECT_EQ(0, std::memcmp(ddb.GetBlockData(), copy.GetBlockData(), 20));
+
+  RavelCDsmccDDB assigned(first.data());
+  assigned = ddb;
+  EXPECT_EQ(4, assigned.GetBlockNumber());
+  EXPECT_EQ(0, std::memcmp(second.data() + 18, assigned.GetBlockData(), 20));
+  RavelCDsmccDDB refused(nullptr);
+  assigned = refused;
+  EXPECT_EQ(nullptr, assigned.GetBlockData());
+  EXPECT_EQ(0, assigned.GetBlockDataLen());
+
+  EXPECT_EQ(kRavelErrInvalidArgument, ddb.ParseRawData(nullptr));
+  EXPECT_EQ(nullptr, ddb.GetBlockData());
+  EXPECT_EQ(0, ddb.GetModuleId());
+  EXPECT_EQ(0, ddb.GetModuleVersion());
+  EXPECT_EQ(0, ddb.GetBlockNumber());
+  EXPECT_EQ(0, ddb.GetBlockDataLen());
+  EXPECT_EQ(0, ddb.GetMessageId());
+}
+
+TEST(DsmccDDB, OrdersBlocksOfOneModuleVersionOnly) {
+  struct Key {
+    uint16_t module;
+    uint8_t version;
+    uint16_t block;
+  };
+  struct Case {
+    const char* what;
+    Key a, b;
+    bool eq, lt, gt, le, ge;
+  } cases[] = {
+      {"3 before 5", {1, 2, 3}, {1, 2, 5}, false, true, false, true, false},
+      {"5 after 3", {1, 2, 5}, {1, 2, 3}, false, false, true, false, true},
+      {"same block", {1, 2, 3}, {1, 2, 3}, true, false, false, true, true},
+      {"other module", {1, 2, 3}, {4, 2, 5}, false, false, false, false, false},
+      {"other version", {1, 2, 3}, {1, 9, 3}, false, false, false, false, false},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes ma = Ddb(c.a.module, c.a.version, c.a.block, Bytes{1});
+    Bytes mb = Ddb(c.b.module, c.b.version, c.b.block, Bytes{1});
+    RavelCDsmccDDB a(ma.data());
+    RavelCDsmccDDB b(mb.data());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.eq, (a == b) != 0);
+    EXPECT_TRUE(recorder.Records().empty());  // equality never traces
+    EXPECT_EQ(c.lt, (a < b) != 0);
+    EXPECT_EQ(c.gt, (a > b) != 0);
+    EXPECT_EQ(c.le, (a <= b) != 0);
+    EXPECT_EQ(c.ge, (a >= b) != 0);
+    bool sameModule = c.a.module == c.b.module && c.a.version == c.b.version;
+    std::vector<std::string> expected;
+    if (!sameModule) {
+      expected.assign(4, Format("Two Messages are totally different! This module id, version=[%d, %d], Compared "
+                                "One=[%d, %d]\n",
+                                c.a.module, c.a.version, c.b.module, c.b.version));
+    }
+    EXPECT_EQ(expected, recorder.TextsAt(kCarouselWarning));
+    EXPECT_EQ(expected.size(), recorder.Records().size());
+  }
+}
+
+TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
+  const unsigned int kParserWarning = 0x40000020u;
+  Bytes allKinds = sb::Cat({sb::Descriptor(0x01, sb::Text("text/xml")), sb::Descriptor(0x02, sb::Text("a.xml")),
+                            sb::Descriptor(0x03, sb::Text("porGuia")), sb::Descriptor(0x04, Bytes{0, 0, 2}),
+                            sb::Descriptor(0x05, Bytes{1, 2, 3, 4}), sb::Descriptor(0x06, Bytes{0x40}),
+                            sb::Descriptor(0x07, sb::U32(30)), sb::Descriptor(0xC2, Bytes{1, 0, 0, 0x10, 0})});
+  Bytes twoNames = sb::Cat({sb::Descriptor(0x02, sb::Text("first")), sb::Descriptor(0x02, sb::Text("second"))});
+  struct Case {
+    const char* what;
+    std::vector<Module> modules;
+    Bytes privateData;
+    uint8_t adaptationLength;
+    Bytes compatibility;
+    TraceLines trace;
+  } cases[] = {
+      {"no modules", {}, Bytes(), 0, Bytes(), {}},
+      {"modules without descriptors", {{1, 100, 1, Bytes()}, {2, 200000, 2, Bytes()}}, Bytes(), 0, Bytes(), {}},
+      // The location descriptor is not kept by a module record.
+      {"every descriptor kind",
+       {{7, 4066, 3, allKinds}},
+       Bytes(),
+       0,
+       Bytes(),
+       {{kParserWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x06]\n"}}},
+      {"a later name wins", {{1, 1, 0, twoNames}, {2, 2, 0, Bytes()}}, Bytes(), 0, Bytes(), {}},
+      {"after adaptation and compatibility descriptor",
+       {{3, 33, 1, sb::Descriptor(0x99, Bytes{1})}, {4, 44, 1, Bytes()}},
+       Bytes(),
+       6,
+       Bytes{0, 1, 0x42, 0x42, 0x42},
+       {{kParserWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x99]\n"}}},
+      {"private data descriptors",
+       {{1, 1, 0, Bytes()}},
+       sb::Cat({sb::Descriptor(0x0A, Bytes{1, 2}), sb::Descriptor(0x01, sb::Text("x"))}),
+       0,
+       Bytes(),
+       {{kParserWarning, "DSMCC DII: Unsupported Descriptor. Tag=[0x0a]\n"},
+        {kParserWarning, "DSMCC DII: Unsupported Descriptor. Tag=[0x01]\n"}}},
+  };
+  for (Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    Bytes message = Dii(c.modules, c.privateData, c.adaptationLength, c.compatibility);
+    TraceRecorder recorder;
+    RavelCDsmccDII dii(nullptr);
+    EXPECT_EQ(kRavelOk, dii.ParseRawData(message.data()));
+    EXPECT_EQ(c.trace, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CDsmccDII", r.file);
+    EXPECT_EQ(0x80000002u, dii.GetDownloadId());
+    EXPECT_EQ(4066, dii.GetBlockSize());
+    EXPECT_EQ(3, dii.GetWindowSize());
+    EXPECT_EQ(4, dii.GetAckPeriod());
+    EXPECT_EQ(5u, dii.GetTCDownloadWindow());
+    EXPECT_EQ(0xFFFFFFFFu, dii.GetTCDownloadScenario());
+    ASSERT_EQ(static_cast<int>(c.modules.size()), dii.GetNumberOfModules());
+    for (size_t i = 0; i < c.modules.size(); ++i) {
+      RavelCModuleInfo* m = dii.GetModuleInfo(static_cast<int>(i));
+      ASSERT_NE(nullptr, m);
+      EXPECT_EQ(c.modules[i].id, m->GetModuleId());
+      EXPECT_EQ(c.modules[i].size, m->GetModuleSize());
+      EXPECT_EQ(c.modules[i].version, m->GetModuleVersion());
+      EXPECT_EQ(c.modules[i].info.size(), m->GetModuleInfoLength());
+      EXPECT_EQ(m, dii.GetModuleInfoByID(c.modules[i].id));
+    }
+  }
+
+  RavelCDsmccDII all(Dii({{7, 4066, 3, allKinds}}, Bytes()).data());
+  RavelCModuleInfo* m = all.GetModuleInfo(0);
+  ASSERT_NE(nullptr, m->GetTypeDescriptor());
+  EXPECT_STREQ("text/xml", m->GetTypeDescriptor()->GetType());
+  EXPECT_STREQ("a.xml", m->GetNameDescriptor()->GetFileName());
+  EXPECT_STREQ("Guia", m->GetInfoDescriptor()->GetText());
+  EXPECT_EQ(2, m->GetModuleLinkDescriptor()->GetModuleId());
+  EXPECT_EQ(4, m->GetCRC32Descriptor()->GetCRC32()[3]);
+  EXPECT_EQ(30u, m->GetEstDownloadTimeDescriptor()->GetEstDownloadTime());
+  EXPECT_EQ(0x1000u, m->GetCompressionTypeDescriptor()->GetOriginalSize());
+  RavelCDsmccDII names(Dii({{1, 1, 0, twoNames}}, Bytes()).data());
+  EXPECT_STREQ("second", names.GetModuleInfo(0)->GetNameDescriptor()->GetFileName());
+  EXPECT_EQ(nullptr, names.GetModuleInfo(0)->GetTypeDescriptor());
+}
+
+TEST(DsmccDII, GettersRefuseBadIndexesAndUnknownIds) {
+  Bytes message = Dii({{1, 10, 0, Bytes()}, {2, 20, 0, Bytes()}, {2, 30, 1, Bytes()}}, Bytes());
+  RavelCDsmccDII dii(message.data());
+  TraceRecorder recorder;
+  for (int index : {-1, 3, 1000}) {
+    recorder.Clear();
+    EXPECT_EQ(nullptr, dii.GetModuleInfo(index));
+    TraceLines expected{
+        {kCarouselError, "GetModuleInfo: Invalid Array Index=[" + std::to_string(index) + "], Module Info Len=[3]\n"}};
+    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ(0, recorder.PanicCount());
+  }
+  recorder.Clear();
+  EXPECT_EQ(nullptr, dii.GetModuleInfoByID(9));
+  EXPECT_EQ(20u, dii.GetModuleInfoByID(2)->GetModuleSize());  // the first with that id
+  EXPECT_TRUE(recorder.Records().empty());
+}
+
+TEST(DsmccDII, DumpsCopiesDeeplyAndParsesAgainFromScratch) {
+  Bytes info = sb::Cat({sb::Descriptor(0x02, sb::Text("m.bin")), sb::Descriptor(0x07, sb::U32(9))});
+  Bytes message = Dii({{0x0102, 754, 0x7D, info}}, Bytes());
+  RavelCDsmccDII dii(message.data());
+  TraceLines expected{
+      {kCarouselDump, "DSMCC Header: protocolDiscriminator=[0x11], dsmccType=[0x03], messageID=[0x1002]\n"},
+      {kCarouselDump, "DSMCC Header: transaction_id=[0x80000002], adaptationLength=[0], messageLength=[" +
+                          std::to_string(message.size() - 12) + "]\n"},
+      {kCarouselDump, "downloadId=[0x80000002], blockSize=[4066], windowSize=[3], ackPeriod=[4]\n"},
+      {kCarouselDump, "tCDownloadWindow=[0x00000005], tCDownloadScenario=[0xffffffff], numOfMOdules=[1]\n"},
+      {kCarouselDump,
+       "\tModule Info: moduleId=[0x0102], moduleSize=[754], moduleVersion=[0x7d], moduleInfoLength=[13]\n"},
+      {0x10000020u, "\t=================== Name Descriptor ===================\n"},
+      {0x10000020u, "\tDescriptor Tag=[0x2], Descriptor Length=[5], Name=[Name Descriptor]\n"},
+      {0x10000020u, "\tiFileName=[m.bin]\n"},
+      {0x10000020u, "\t=================== EST Download Time Descriptor ===================\n"},
+      {0x10000020u, "\tDescriptor Tag=[0x7], Descriptor Length=[4], Name=[Estimated Donwload Time Descriptor]\n"},
+      {0x10000020u, "\tiEstDownloadTime=[9]\n"}};
+  EXPECT_EQ(expected, DumpOf(dii));
+
+  RavelCDsmccDII copy(dii);
+  EXPECT_EQ(expected, DumpOf(copy));
+  ASSERT_EQ(1, copy.GetNumberOfModules());
+  EXPECT_NE(dii.GetModuleInfo(0), copy.GetModuleInfo(0));
+  EXPECT_NE(dii.GetModuleInfo(0)->GetNameDescriptor(), copy.GetModuleInfo(0)->GetNameDescriptor());
+  RavelCDsmccDII assigned(Dii({{5, 5, 5, Bytes()}, {6, 6, 6, Bytes()}}, Bytes()).data());
+  assigned = dii;
+  EXPECT_EQ(expected, DumpOf(assigned));
+
+  // A second parse replaces the records; a null parse leaves none.
+  ASSERT_EQ(kRavelOk, dii.ParseRawData(Dii({{8, 1, 1, Bytes()}, {9, 2, 2, Bytes()}}, Bytes()).data()));
+  ASSERT_EQ(2, dii.GetNumberOfModules());
+  EXPECT_EQ(8, dii.GetModuleInfo(0)->GetModuleId());
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelErrInvalidArgument, dii.ParseRawData(nullptr));
+  EXPECT_TRUE(recorder.Records().empty());
+  EXPECT_EQ(0, dii.GetNumberOfModules());
+  EXPECT_EQ(0u, dii.GetDownloadId());
+  EXPECT_EQ(0, dii.GetBlockSize());
+  EXPECT_EQ(0u, dii.GetTCDownloadScenario());
+  EXPECT_EQ(1, copy.GetNumberOfModules());  // the copy is unaffected
+
+  RavelCModuleInfo empty(nullptr);
+  TraceLines nullTrace{{kCarouselError, "Module Info Parsing Error. Input Data is NULL!\n"}};
+  EXPECT_EQ(nullTrace, recorder.Lines());
+  EXPECT_EQ(0, empty.GetModuleId());
+  EXPECT_EQ(nullptr, empty.GetNameDescriptor());
+}
+
+// --- Captured object carousel (PID 0x076A): DSI and DDB messages. ---
+
+namespace {
+
+std::vector<Bytes> CarouselSections(const Bytes& stream) {
+  return reassembly::Sections(captures::PacketsOfPid(stream, 0x076A));
+}
+
+uint16_t MessageIdOf(const Bytes& section) { return static_cast<uint16_t>((section[10] << 8) | section[11]); }
+
+}  // namespace
+
+TEST(DsmccCapture, DsiAndDdbMessagesOfTheObjectCarouselParse) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("object-carousel.ts", stream);
+  std::vector<Bytes> sections = CarouselSections(stream);
+  ASSERT_GT(sections.size(), 400u);
+  int dsiCount = 0, ddbCount = 0;
+  std::map<int, std::map<int, int> > blockSizes;  // module -> block number -> size
+  for (Bytes& section : sections) {
+    ASSERT_NE(0, RavelUtil_CheckSectionCRC32(section.data()));
+    unsigned char* message = section.data() + 8;
+    TraceRecorder recorder;
+    if (section[0] == 0x3B && MessageIdOf(section) == 0x1006) {
+      RavelCDsmccDSI dsi(message);
+      ++dsiCount;
+      TraceLines expected{{kCarouselWarning, "NASP Input Data is NULL!\n"},
+                          {kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
+                          {kCarouselWarning, "Private data length [64]\n"}};
+      EXPECT_EQ(expected, recorder.Lines());
+      // A DVB object carousel fills the server id with 0xFF.
+      EXPECT_EQ(0xFF, dsi.GetNASP().GetAFI());
+      EXPECT_EQ(0xFFFFFFFFu, dsi.GetNASP().GetCarouselId());
+      EXPECT_EQ(0xFFFF, dsi.GetNASP().GetServiceId());
+      EXPECT_EQ(dsi.GetMessageLength(), 24 + dsi.GetPrivateDataLength());
+      // The private data (the service gateway info) ends where the CRC starts.
+      EXPECT_EQ(section.data() + section.size() - 4, dsi.GetPrivateData() + dsi.GetPrivateDataLength());
+    } else if (section[0] == 0x3C) {
+      RavelCDsmccDDB ddb(nullptr);
+      ASSERT_EQ(kRavelOk, ddb.ParseRawData(message));
+      ++ddbCount;
+      EXPECT_TRUE(recorder.Records().empty());
+      EXPECT_EQ(0x1003, ddb.GetMessageId());
+      EXPECT_EQ(125, ddb.GetModuleVersion());
+      EXPECT_EQ(section.data() + section.size() - 4, message + 18 + ddb.GetBlockDataLen());
+      blockSizes[ddb.GetModuleId()][ddb.GetBlockNumber()] = ddb.GetBlockDataLen();
+    }
+  }
+  EXPECT_GT(dsiCount, 0);
+  EXPECT_GT(ddbCount, 0);
+  // Modules 1 to 3; every block but the last of a module is full (4066 bytes).
+  ASSERT_EQ(3u, blockSizes.size());
+  for (auto& module : blockSizes) {
+    SCOPED_TRACE(module.first);
+    int expectedNumber = 0;
+    for (auto& block : module.second) {
+      EXPECT_EQ(expectedNumber++, block.first);
+      if (block.first != module.second.rbegin()->first) {
+        EXPECT_EQ(4066, block.second);
+      }
+    }
+  }
+}
+
+TEST(DsmccCapture, DiiListsTheThreeModulesThatTheDdbBlocksRebuild) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("object-carousel.ts", stream);
+  std::vector<Bytes> sections = CarouselSections(stream);
+  std::unique_ptr<RavelCDsmccDII> dii;
+  std::vector<uint32_t> originalSizes;
+  int diiCount = 0;
+  std::map<int, RavelCPointerArray<RavelCDsmccDDB> > modules;
+  for (const Bytes& section : sections) {
+    // The module info bytes are read as far as their descriptor lengths say, which
+    // in this object carousel reach past the section: the zeros keep those reads
+    // inside the buffer, as a receiver's section buffer would.
+    Bytes padded = section;
+    padded.resize(section.size() + 4096, 0x00);
+    unsigned char* message = padded.data() + 8;
+    if (section[0] == 0x3B && MessageIdOf(section) == 0x1002) {
+      TraceRecorder recorder;
+      std::unique_ptr<RavelCDsmccDII> parsed(new RavelCDsmccDII(nullptr));
+      ASSERT_EQ(kRavelOk, parsed->ParseRawData(message));
+      EXPECT_TRUE(recorder.Records().empty()) << recorder.Joined();
+      ++diiCount;
+      if (!dii) {
+        dii.reset(new RavelCDsmccDII(*parsed));
+        // Each module info is a BIOP module info ending in a compressed module
+        // descriptor (tag 0x09) whose last four bytes give the original size.
+        const unsigned char* body = message + 12 + parsed->GetAdaptationLength();
+        const unsigned char* record = body + 18 + RavelRead16(body + 16) + 2;
+        for (int i = 0; i < parsed->GetNumberOfModules(); ++i) {
+          const unsigned char* infoEnd = record + 8 + record[7];
+          EXPECT_EQ(0x09, infoEnd[-7]);
+          originalSizes.push_back(RavelRead32(infoEnd - 4));
+          record = infoEnd;
+        }
+      }
+    } else if (section[0] == 0x3C) {
+      RavelCDsmccDDB block(message);
+      RavelCPointerArray<RavelCDsmccDDB>& blocks = modules[block.GetModuleId()];
+      bool known = false;
+      for (int i = 0; i < blocks.iCount && !known; ++i) known = (*blocks[i] == block) != 0;
+      if (!known) blocks.Append(new RavelCDsmccDDB(block));
+    }
+  }
+  ASSERT_GT(diiCount, 0);
+  ASSERT_TRUE(dii);
+  EXPECT_EQ(4066, dii->GetBlockSize());
+  ASSERT_EQ(3, dii->GetNumberOfModules());
+  EXPECT_EQ(std::vector<uint32_t>({294, 756113, 31946}), originalSizes);
+
+  struct Expected {
+    uint16_t id;
+    uint32_t size;  // as carried, compressed
+  } expected[] = {{1, 133}, {2, 379138}, {3, 29806}};
+  for (int i = 0; i < 3; ++i) {
+    SCOPED_TRACE(i);
+    RavelCModuleInfo* info = dii->GetModuleInfo(i);
+    ASSERT_NE(nullptr, info);
+    EXPECT_EQ(expected[i].id, info->GetModuleId());
+    EXPECT_EQ(expected[i].size, info->GetModuleSize());
+    EXPECT_EQ(125, info->GetModuleVersion());
+    EXPECT_EQ(28, info->GetModuleInfoLength());
+
+    // Rebuild the module from its blocks, in block order.
+    RavelCPointerArray<RavelCDsmccDDB>& blocks = modules[info->GetModuleId()];
+    TraceRecorder recorder;
+    blocks.Sort();
+    EXPECT_TRUE(recorder.Records().empty());
+    Bytes module;
+    for (int b = 0; b < blocks.iCount; ++b) {
+      EXPECT_EQ(b, blocks[b]->GetBlockNumber());
+      EXPECT_EQ(info->GetModuleVersion(), blocks[b]->GetModuleVersion());
+      module.insert(module.end(), blocks[b]->GetBlockData(), blocks[b]->GetBlockData() + blocks[b]->GetBlockDataLen());
+    }
+    EXPECT_EQ(static_cast<int>((info->GetModuleSize() + 4065) / 4066), blocks.iCount);
+    EXPECT_EQ(info->GetModuleSize(), module.size());
+    EXPECT_EQ(0x78, module[0]);  // a zlib stream (compression method 0x78)
+  }
+}
