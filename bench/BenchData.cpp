@@ -80,7 +80,10 @@ std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, unsign
     const bool isTs = name.size() > 3 && name.compare(name.size() - 3, 3, ".ts") == 0;
     std::vector<Bytes> all = isTs ? TsSections(contents) : captures::SplitSections(contents);
     for (Bytes& s : all) {
-      if (s.size() >= 3 && s[0] >= firstTableId && s[0] <= lastTableId) selected.push_back(std::move(s));
+      if (s.size() >= 3 && s[0] >= firstTableId && s[0] <= lastTableId) {
+        s.resize(s.size() + kSectionMargin, 0x00);
+        selected.push_back(std::move(s));
+      }
     }
   }
   return selected;

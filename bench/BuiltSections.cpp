@@ -56,4 +56,86 @@ std::vector<Bytes> BuiltAitSections() {
   return sections;
 }
 
+namespace {
+
+// dsmccMessageHeader (no adaptation header) followed by `body`.
+Bytes DsmccMessage(uint16_t messageId, uint32_t transactionId, const Bytes& body) {
+  return sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(messageId), sb::U32(transactionId), sb::U8(0xFF), sb::U8(0),
+                  sb::U16(static_cast<unsigned int>(body.size())), body});
+}
+
+Bytes CarouselSection(uint8_t tableId, uint16_t extension, const Bytes& message) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = extension;
+  options.version = 1;
+  return sb::LongSection(options, message);
+}
+
+Bytes Pattern(size_t size, uint8_t seed) {
+  Bytes b(size);
+  for (size_t i = 0; i < size; ++i) b[i] = static_cast<uint8_t>(seed + i * 7);
+  return b;
+}
+
+}  // namespace
+
+std::vector<Bytes> BuiltDsiSections() {
+  // serverId (NSAP: AFI, type, carousel id, specifier, ts id, network id, service id, reserved)
+  Bytes body = sb::Cat({sb::U8(0x00), sb::U8(0x01), sb::U32(0x0000ABCD), sb::U32(0x00010203), sb::U16(0x0421),
+                        sb::U16(0x0422), sb::U16(0xE760), sb::U32(0xEEEEEEEE)});
+  sb::Append(body, sb::U16(0));   // compatibilityDescriptorLength
+  sb::Append(body, sb::U16(64));  // privateDataLength
+  sb::Append(body, Pattern(64, 0x10));
+  return {CarouselSection(0x3B, 0x0002, DsmccMessage(0x1006, 0x80000002u, body))};
+}
+
+std::vector<Bytes> BuiltDiiSections() {
+  std::vector<Bytes> sections;
+  const unsigned int counts[] = {1, 3, 8};
+  for (unsigned int count : counts) {
+    Bytes body = sb::Cat({sb::U32(0x80000002u), sb::U16(4066), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0xFFFFFFFFu),
+                          sb::U16(0), sb::U16(count)});
+    for (unsigned int m = 0; m < count; ++m) {
+      const std::string name = "modulo" + std::to_string(m) + ".ncl";
+      Bytes info = sb::Cat({sb::Descriptor(0x01, sb::Text("application/x-ncl")), sb::Descriptor(0x02, sb::Text(name)),
+                            sb::Descriptor(0x05, sb::U32(0x12345678 + m)), sb::Descriptor(0x07, sb::U32(30))});
+      sb::Append(body, sb::Cat({sb::U16(m + 1), sb::U32(20000 + m), sb::U8(1),
+                                sb::U8(static_cast<unsigned int>(info.size())), info}));
+    }
+    sb::Append(body, sb::U16(0));  // privateDataLength
+    sections.push_back(CarouselSection(0x3B, 0x0002, DsmccMessage(0x1002, 0x80000002u, body)));
+  }
+  return sections;
+}
+
+std::vector<Bytes> BuiltDdbSections() {
+  std::vector<Bytes> sections;
+  for (unsigned int block = 0; block < 4; ++block) {
+    Bytes body = sb::Cat({sb::U16(1), sb::U8(1), sb::U8(0xFF), sb::U16(block), Pattern(4066, static_cast<uint8_t>(block))});
+    sections.push_back(CarouselSection(0x3C, 0x0001, DsmccMessage(0x1003, 0x000000ABu, body)));
+  }
+  return sections;
+}
+
+std::vector<Bytes> BuiltStreamEventSections() {
+  std::vector<Bytes> sections;
+  // STC_Reference 0x10 and NPT_Reference 0x2000 under set reserved bits, scale 1/1.
+  const Bytes npt = sb::Descriptor(0x17, Bytes{0x01, 0xFE, 0, 0, 0, 0x10, 0xFF, 0xFF, 0xFF, 0xFE, 0, 0, 0x20, 0, 0, 1, 0, 1});
+  for (unsigned int count = 1; count <= 4; ++count) {
+    std::vector<Bytes> descriptors = {npt};
+    for (unsigned int e = 0; e < count; ++e) {
+      // event group 1, time mode 0, event type 1, event id, private data
+      descriptors.push_back(sb::Descriptor(0x40, sb::Cat({Bytes{0x00, 0x10, 0x00, 0, 0, 0, 0, 0, 0x01}, sb::U16(e + 1),
+                                                          sb::Text("evento")})));
+    }
+    sb::SectionOptions options;
+    options.tableId = 0x3D;
+    options.tableIdExtension = 0x0001;
+    options.version = 3;
+    sections.push_back(sb::LongSection(options, sb::Cat(descriptors)));
+  }
+  return sections;
+}
+
 }  // namespace bench

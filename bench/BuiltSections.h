@@ -15,6 +15,15 @@ std::vector<Bytes> BuiltPatSections();
 // Ginga location descriptor.
 std::vector<Bytes> BuiltAitSections();
 
+// Data carousel sections (table_id 0x3B: DSI, DII; 0x3C: DDB) whose message
+// starts at byte 8: a DSI with 64 bytes of private data, DIIs of 1, 3 and 8
+// modules with name, type, size and CRC descriptors, DDBs of 4066-byte blocks.
+std::vector<Bytes> BuiltDsiSections();
+std::vector<Bytes> BuiltDiiSections();
+std::vector<Bytes> BuiltDdbSections();
+// Stream descriptor sections (0x3D): an NPT reference and 1 to 4 general events.
+std::vector<Bytes> BuiltStreamEventSections();
+
 }  // namespace bench
 
 #endif
