@@ -26,9 +26,16 @@
 
 // Tables.
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableBIT.h"
 #include "Ravel_CTableBase.h"
+#include "Ravel_CTableEIT.h"
+#include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 
 // DSM-CC data carousel.
 #include "Ravel_CDsmccDDB.h"

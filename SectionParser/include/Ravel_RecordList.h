@@ -15,10 +15,13 @@ inline void RavelRecordList_DeleteAll(RavelCArray<T*>& list) {
   list.iCount = 0;
 }
 
-// Appends a deep copy of every record of `source`, in order.
+// Appends a deep copy (T's copy constructor) of every record of `source`, in
+// order. The count is taken before the first append, so joining a list with
+// itself doubles it once instead of chasing its own growing end.
 template <class T>
 inline void RavelRecordList_AppendCopies(RavelCArray<T*>& target, const RavelCArray<T*>& source) {
-  for (int i = 0; i < source.iCount; ++i) {
+  const int count = source.iCount;
+  for (int i = 0; i < count; ++i) {
     if (source.ipArray[i] != 0) target.Append(new T(*source.ipArray[i]));
   }
 }

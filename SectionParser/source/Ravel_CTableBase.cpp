@@ -62,9 +62,12 @@ int RavelCTableBase::SetTableName(const char* name) {
   return 1;
 }
 
-int RavelCTableBase::CheckCrcAndParseHeader(unsigned char* section, const char* crcMessage) {
+int RavelCTableBase::CheckCrcAndParseHeader(unsigned char* section, const char* sourcePath,
+                                            const char* crcMessage) {
   if (!RavelUtil_CheckSectionCRC32(section)) {
-    RAVEL_TRACE(RAVEL_PARSER_WARNING, "%s", crcMessage);
+    gszRavelDbgFilePath = sourcePath;
+    gRavelDbgLineNum = __LINE__;
+    RavelPGL_TraceOut(RAVEL_PARSER_WARNING, "%s", crcMessage);
     return kRavelErrCorruptSection;
   }
   RavelCTableBase::ParseRawData(section);

@@ -1,0 +1,89 @@
+#include "Ravel_CTableTDT.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CBitInputStream.h"
+#include "Ravel_CDateCode.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableTDT");
+
+namespace {
+
+const unsigned char kTDTTableId = 0x70;
+const int kShortHeaderSize = 3;
+
+}  // namespace
+
+RavelCTDT::RavelCTDT(unsigned char* section)
+    : sTableName(),
+      iTableId(0),
+      bSectionSyntaxIndicator(0),
+      iSectionLength(0),
+      iYear(0),
+      iMonth(0),
+      iDay(0),
+      iHour(0),
+      iMinute(0),
+      iSecond(0) {
+  ParseRawData(section);
+}
+
+RavelCTDT::~RavelCTDT() {}
+
+int RavelCTDT::SetTableName(const RavelCString& name) {
+  sTableName = name;
+  return 1;
+}
+
+int RavelCTDT::SetTableName(const char* name) {
+  sTableName = name;
+  return 1;
+}
+
+int RavelCTDT::ParseRawData(unsigned char* section) {
+  if (section == 0) {
+    iTableId = 0;
+    bSectionSyntaxIndicator = 0;
+    iSectionLength = 0;
+    iYear = 0;
+    iMonth = 0;
+    iDay = 0;
+    iHour = 0;
+    iMinute = 0;
+    iSecond = 0;
+    return kRavelErrNullSection;
+  }
+  RavelCBitInputStream reader(section, kShortHeaderSize, 0);
+  unsigned char status = 0;
+  iTableId = reader.ReadByte(8, status);
+  unsigned char syntaxIndicator = reader.ReadBit(status);
+  reader.Skip(3);
+  unsigned short sectionLength = reader.ReadShort(12, status);
+  if (iTableId != kTDTTableId) {
+    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Table ID isn't for TDT! Table ID=[0x%02x]\n", iTableId);
+    return kRavelErrInvalidArgument;
+  }
+  SetTableName("TDT");
+  bSectionSyntaxIndicator = syntaxIndicator;
+  // Nothing is checked against the length: the TDT carries no CRC_32.
+  iSectionLength = sectionLength;
+  RavelDateCode_DecodeMJD(RavelRead16(section + 3), iYear, iMonth, iDay);
+  iHour = RavelBcd(section[5]);
+  iMinute = RavelBcd(section[6]);
+  iSecond = RavelBcd(section[7]);
+  return kRavelOk;
+}
+
+void RavelCTDT::Show() {
+  static const char kRule[] = "#################################################################\n";
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "%s", kRule);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "###################### TDT Table Information ######################\n");
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "%s", kRule);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "Talbe identifier=[0x%02x], Table Name=[%s]\n", iTableId,
+              sTableName.IsEmpty() ? "Unknown" : sTableName.GetString());
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "Section syntax indicator=[%d], Section length=[%d]\n", bSectionSyntaxIndicator,
+              iSectionLength);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "TDT =[%d.%d.%d - %d:%d:%d]\n", iYear, iMonth, iDay, iHour, iMinute, iSecond);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "%s", kRule);
+}

@@ -1,0 +1,135 @@
+#include "Ravel_CTableTOT.h"
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CBitInputStream.h"
+#include "Ravel_CDateCode.h"
+#include "Ravel_CDescriptorLocalTimeOffset.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Trace.h"
+
+RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableTOT");
+
+namespace {
+
+const unsigned char kTOTTableId = 0x73;
+const unsigned char kTagLocalTimeOffset = 0x58;
+const int kShortHeaderSize = 3;
+// table_id to descriptors_loop_length.
+const int kDescriptorLoopStart = 10;
+
+}  // namespace
+
+RavelCTOT::RavelCTOT(unsigned char* section) : sTableName(), pLocalTimeOffsetDescriptor(0) {
+  ClearFields();
+  ParseRawData(section);
+}
+
+RavelCTOT::RavelCTOT(RavelCTOT& other) : sTableName(), pLocalTimeOffsetDescriptor(0) {
+  ClearFields();
+  *this = other;
+}
+
+RavelCTOT& RavelCTOT::operator=(RavelCTOT& other) {
+  // Released before `other` is read: a table assigned to itself loses its descriptor.
+  delete pLocalTimeOffsetDescriptor;
+  pLocalTimeOffsetDescriptor = 0;
+  sTableName = other.sTableName;
+  iTableId = other.iTableId;
+  bSectionSyntaxIndicator = other.bSectionSyntaxIndicator;
+  iSectionLength = other.iSectionLength;
+  iYear = other.iYear;
+  iMonth = other.iMonth;
+  iDay = other.iDay;
+  iHour = other.iHour;
+  iMinute = other.iMinute;
+  iSecond = other.iSecond;
+  iDescriptorsLoopLength = other.iDescriptorsLoopLength;
+  if (other.pLocalTimeOffsetDescriptor != 0) {
+    pLocalTimeOffsetDescriptor = new RavelCLocalTimeOffsetDescriptor(*other.pLocalTimeOffsetDescriptor);
+  }
+  return *this;
+}
+
+RavelCTOT::~RavelCTOT() { delete pLocalTimeOffsetDescriptor; }
+
+void RavelCTOT::ClearFields() {
+  iTableId = 0;
+  bSectionSyntaxIndicator = 0;
+  iSectionLength = 0;
+  iYear = 0;
+  iMonth = 0;
+  iDay = 0;
+  iHour = 0;
+  iMinute = 0;
+  iSecond = 0;
+  iDescriptorsLoopLength = 0;
+}
+
+int RavelCTOT::SetTableName(const RavelCString& name) {
+  sTableName = name;
+  return 1;
+}
+
+int RavelCTOT::SetTableName(const char* name) {
+  sTableName = name;
+  return 1;
+}
+
+int RavelCTOT::ParseRawData(unsigned char* section) {
+  delete pLocalTimeOffsetDescriptor;
+  pLocalTimeOffsetDescriptor = 0;
+  if (section == 0) {
+    ClearFields();
+    return kRavelErrNullSection;
+  }
+  RavelCBitInputStream reader(section, kShortHeaderSize, 0);
+  unsigned char status = 0;
+  iTableId = reader.ReadByte(8, status);
+  unsigned char syntaxIndicator = reader.ReadBit(status);
+  reader.Skip(3);
+  unsigned short sectionLength = reader.ReadShort(12, status);
+  if (iTableId != kTOTTableId) {
+    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Table ID isn't for TOT! Table ID=[0x%02x]\n", iTableId);
+    return kRavelErrInvalidArgument;
+  }
+  SetTableName("TOT");
+  bSectionSyntaxIndicator = syntaxIndicator;
+  iSectionLength = sectionLength;
+  RavelDateCode_DecodeMJD(RavelRead16(section + 3), iYear, iMonth, iDay);
+  iHour = RavelBcd(section[5]);
+  iMinute = RavelBcd(section[6]);
+  iSecond = RavelBcd(section[7]);
+
+  // The CRC_32 is not verified: a corrupted TOT is taken as it stands.
+  iDescriptorsLoopLength = RavelRead12(section + 8);  // ....xxxx xxxxxxxx
+  if (iDescriptorsLoopLength == 0) return kRavelOk;
+  unsigned char* position = section + kDescriptorLoopStart;
+  unsigned char* end = position + iDescriptorsLoopLength;
+  do {
+    unsigned char tag = position[0];
+    if (tag == kTagLocalTimeOffset) {
+      // Only the last one of the loop is kept.
+      delete pLocalTimeOffsetDescriptor;
+      pLocalTimeOffsetDescriptor = new RavelCLocalTimeOffsetDescriptor(position);
+    } else {
+      RAVEL_TRACE(RAVEL_PARSER_WARNING, "TOT Parsing.. Unknown Descriptor Tag=[0x%02x]\n", tag);
+    }
+    // A zero length only steps over the tag and length bytes.
+    position += position[1] + 2;
+  } while (position < end);
+  return kRavelOk;
+}
+
+void RavelCTOT::Show() {
+  static const char kRule[] = "#################################################################\n";
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "%s", kRule);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "###################### TOT Table Information ######################\n");
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "%s", kRule);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "Talbe identifier=[0x%02x], Table Name=[%s]\n", iTableId,
+              sTableName.IsEmpty() ? "Unknown" : sTableName.GetString());
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "Section syntax indicator=[%d], Section length=[%d]\n", bSectionSyntaxIndicator,
+              iSectionLength);
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "JST Time =[%d.%d.%d - %d:%d:%d]\n", iYear, iMonth, iDay, iHour, iMinute, iSecond);
+  if (pLocalTimeOffsetDescriptor != 0) pLocalTimeOffsetDescriptor->Show();
+  RAVEL_TRACE(RAVEL_PARSER_DUMP, "%s", kRule);
+}

@@ -1,0 +1,433 @@
+// Broadcaster information table and its broadcaster records.
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "Captures.h"
+#include "Ravel_CTableBIT.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kBit = 0x20000020u;
+const unsigned int kWarning = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+using sb::Cat;
+using sb::Descriptor;
+using sb::Length12;
+using sb::U16;
+using sb::U8;
+
+const char kInfoFail[] = "BIT Info Parsing Fail! Maybe data has been corrupted!\n";
+
+std::string Invalid(int tag, int length) {
+  char text[128];
+  std::snprintf(text, sizeof(text), "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n", tag,
+                length);
+  return text;
+}
+
+std::string FirstLoopUnknown(int tag) {
+  char text[96];
+  std::snprintf(text, sizeof(text), "First Descriptor Loop.. Unkown Descriptor Tag=[0x%02x]\n", tag);
+  return text;
+}
+
+std::string RecordUnknown(int tag) {
+  char text[96];
+  std::snprintf(text, sizeof(text), "BIT BroadcasterDescriptor Parsing.. Unkown Descriptor Tag=[0x%02x]\n", tag);
+  return text;
+}
+
+// Extended broadcaster descriptor of type 1 with one broadcaster entry and no affiliations.
+Bytes ExtBroadcaster(unsigned int terrestrialId, unsigned int onid = 0x7FE1, uint8_t broadcasterId = 0x05) {
+  return Descriptor(0xCE, Cat({U8(0x1F), U16(terrestrialId), U8(0x01), U16(onid), U8(broadcasterId)}));
+}
+// SI parameter descriptor: read by nothing in this table.
+Bytes SiParameter() { return Descriptor(0xD7, Bytes{0x01, 0x02}); }
+
+Bytes Record(uint8_t broadcasterId, const std::vector<Bytes>& descriptors) {
+  return Cat({U8(broadcasterId), sb::DescriptorLoop(descriptors)});
+}
+
+Bytes BitBody(bool viewPropriety, const std::vector<Bytes>& firstDescriptors, const std::vector<Bytes>& records) {
+  Bytes first = Cat(firstDescriptors);
+  // 3 reserved bits, broadcaster_view_propriety, then the 12-bit length.
+  Bytes body = Length12(static_cast<unsigned int>(first.size()), viewPropriety ? 0xF : 0xE);
+  return Cat({body, first, Cat(records)});
+}
+
+Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3,
+                 uint8_t tableId = 0xC4) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = originalNetworkId;
+  options.version = version;
+  return sb::LongSection(options, body);
+}
+
+std::string Summary(RavelCBroadcasterDescriptor& record) {
+  char text[96];
+  std::snprintf(text, sizeof(text), "id=0x%02x len=%d", record.iBroadcasterId, record.iBroadcasterDescriptorsLength);
+  std::string s = text;
+  if (record.pExtendedBroadcasterDescriptor) {
+    std::snprintf(text, sizeof(text), " ext=0x%04x", record.pExtendedBroadcasterDescriptor->GetTerrestrialBroadcasterId());
+    s += text;
+  }
+  return s;
+}
+
+std::vector<std::string> Records(RavelCBIT& bit) {
+  std::vector<std::string> list;
+  for (int i = 0; i < bit.GetBroadcasterCount(); ++i) list.push_back(Summary(*bit.GetBroadcaster(i)));
+  return list;
+}
+
+const Bytes kRecordA = Record(0x01, {ExtBroadcaster(0x0A01)});
+const Bytes kRecordB = Record(0x02, {ExtBroadcaster(0x0B02), SiParameter()});
+const char kSummaryA[] = "id=0x01 len=9 ext=0x0a01";
+const char kSummaryB[] = "id=0x02 len=13 ext=0x0b02";
+
+}  // namespace
+
+TEST(BITParse, KeepsTheExtendedBroadcasterOfEachRecordAndTracesTheFirstLoop) {
+  Bytes section = BitSection(BitBody(true, {SiParameter()}, {kRecordA, kRecordB}));
+  TraceRecorder recorder;
+  RavelCBIT bit(section.data());
+  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xD7)}}), recorder.Lines());
+  EXPECT_STREQ("BIT", bit.sTableName.GetString());
+  EXPECT_EQ(0x7FE1, bit.iTableIdExtension);
+  EXPECT_EQ(1, bit.GetBroadcasterViewPropriety());
+  EXPECT_EQ(4, bit.GetFirstDescriptorsLength());
+  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Records(bit));
+  RavelCExtendedBroadcasterDescriptor* ext = bit.GetBroadcaster(0)->GetExtendedBroadcaster();
+  EXPECT_EQ(1, ext->GetBroadcasterType());
+  EXPECT_EQ(1, ext->GetNumberOfBroadcasterIds());
+  EXPECT_EQ(0x7FE1, ext->GetOriginalNetworkId(0));
+  EXPECT_EQ(0x05, ext->GetBroadcasterId(0));
+}
+
+TEST(BITParse, RefusesNullBadCrcAndForeignTableIds) {
+  Bytes good = BitSection(BitBody(true, {SiParameter()}, {kRecordA}));
+  sb::SectionOptions bad;
+  bad.tableId = 0xC4;
+  bad.tableIdExtension = 0x1234;
+  bad.corruptCrc = true;
+  Bytes badCrc = sb::LongSection(bad, BitBody(false, {}, {kRecordB}));
+  Bytes nitId = BitSection(BitBody(false, {}, {kRecordB}), 0x1234, 3, 0x40);
+  bad.tableId = 0x00;
+  Bytes bothBad = sb::LongSection(bad, BitBody(false, {}, {kRecordB}));
+  struct Case {
+    const char* label;
+    Bytes* section;
+    int result;
+    TraceLines traces;
+    unsigned char tableId;
+    unsigned short extension;
+  } cases[] = {
+      {"null", nullptr, kRavelErrInvalidArgument, {}, 0xC4, 0x7FE1},
+      {"bad CRC: the header is not read", &badCrc, kRavelErrCorruptSection, {{kWarning, "BIT Section: CRC Error!\n"}},
+       0xC4, 0x7FE1},
+      {"NIT table_id: the header is read", &nitId, kRavelErrInvalidArgument,
+       {{kError, "Table ID isn't for BIT! Table ID=[0x40]\n"}}, 0x40, 0x1234},
+      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
+       {{kWarning, "BIT Section: CRC Error!\n"}}, 0xC4, 0x7FE1},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCBIT bit(good.data());
+    ASSERT_EQ(1, bit.GetBroadcasterCount());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, bit.ParseRawData(c.section ? c.section->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(0, bit.GetBroadcasterCount());
+    EXPECT_EQ(c.tableId, bit.iTableId);
+    EXPECT_EQ(c.extension, bit.iTableIdExtension);
+    // The body fields belong to the last accepted section.
+    EXPECT_EQ(1, bit.GetBroadcasterViewPropriety());
+    EXPECT_EQ(4, bit.GetFirstDescriptorsLength());
+    EXPECT_STREQ("BIT", bit.sTableName.GetString());
+  }
+}
+
+TEST(BITParse, ConstructedOverNullIsEmpty) {
+  TraceRecorder recorder;
+  RavelCBIT bit(nullptr);
+  EXPECT_TRUE(recorder.Lines().empty());
+  EXPECT_EQ(0, bit.iTableId);
+  EXPECT_EQ(0, bit.iSectionLength);
+  EXPECT_EQ(0, bit.GetBroadcasterViewPropriety());
+  EXPECT_EQ(0, bit.GetFirstDescriptorsLength());
+  EXPECT_EQ(0, bit.GetBroadcasterCount());
+  EXPECT_TRUE(bit.sTableName.IsEmpty());
+}
+
+TEST(BITFirstLoop, KeepsNothingAndFailsOnlyOnTagOrLengthZero) {
+  struct Case {
+    const char* label;
+    Bytes body;
+    int result;
+    TraceLines traces;
+    unsigned short firstLength;
+    std::vector<std::string> records;
+  } cases[] = {
+      {"length 0: not walked", BitBody(false, {}, {kRecordA}), kRavelOk, {}, 0, {kSummaryA}},
+      {"every tag is traced at the BIT level, known ones too",
+       BitBody(false, {SiParameter(), ExtBroadcaster(0x0C03), Descriptor(0x40, {0x41})}, {kRecordA}), kRavelOk,
+       {{kBit, FirstLoopUnknown(0xD7)}, {kBit, FirstLoopUnknown(0xCE)}, {kBit, FirstLoopUnknown(0x40)}}, 16,
+       {kSummaryA}},
+      {"tag 0 fails the section", BitBody(false, {SiParameter(), Descriptor(0x00, {0x01})}, {kRecordA}),
+       kRavelErrCorruptSection, {{kBit, FirstLoopUnknown(0xD7)}, {kWarning, Invalid(0x00, 1)}}, 7, {}},
+      {"length 0 fails the section", BitBody(false, {Descriptor(0xD7, {})}, {kRecordA}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0xD7, 0)}}, 2, {}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = BitSection(c.body);
+    RavelCBIT bit(nullptr);
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, bit.ParseRawData(section.data()));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.firstLength, bit.GetFirstDescriptorsLength());
+    EXPECT_EQ(c.records, Records(bit));
+    EXPECT_STREQ("BIT", bit.sTableName.GetString());
+  }
+}
+
+TEST(BITBroadcasterLoop, LooksAtTheFirstDescriptorOfEachRecordOnly) {
+  // Descriptors length 0: the record's "first descriptor" is the next record's
+  // broadcaster_id and the reserved nibble of its length, and the next record
+  // starts 3 bytes on.
+  Bytes emptyRecord = Cat({U8(0x07), Length12(0)});
+  struct Case {
+    const char* label;
+    Bytes body;
+    int result;
+    TraceLines traces;
+    std::vector<std::string> records;
+  } cases[] = {
+      {"an extended broadcaster second, after another tag, is not kept",
+       BitBody(false, {}, {Record(0x03, {Descriptor(0xC5, {0x00}), ExtBroadcaster(0x0D04)})}), kRavelOk,
+       {{kWarning, RecordUnknown(0xC5)}}, {"id=0x03 len=12"}},
+      {"a malformed second descriptor is never read",
+       BitBody(false, {}, {Record(0x03, {ExtBroadcaster(0x0D04), Descriptor(0x00, {})})}), kRavelOk, {},
+       {"id=0x03 len=11 ext=0x0d04"}},
+      {"descriptors length 0 reads the next record's first two bytes", BitBody(false, {}, {emptyRecord, kRecordB}),
+       kRavelOk, {{kWarning, RecordUnknown(0x02)}}, {"id=0x07 len=0", kSummaryB}},
+      {"a first descriptor with tag 0 fails the section and drops earlier records",
+       BitBody(false, {}, {kRecordA, Record(0x04, {Descriptor(0x00, {0x01})})}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0x00, 1)}, {kWarning, kInfoFail}}, {}},
+      {"a first descriptor of length 0 fails the section",
+       BitBody(false, {}, {kRecordA, kRecordB, Record(0x04, {Descriptor(0xCE, {})})}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0xCE, 0)}, {kWarning, kInfoFail}}, {}},
+      {"section_length 11 + first_descriptors_length: no records", BitBody(true, {SiParameter()}, {}), kRavelOk,
+       {{kBit, FirstLoopUnknown(0xD7)}}, {}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = BitSection(c.body);
+    RavelCBIT bit(nullptr);
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, bit.ParseRawData(section.data()));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.records, Records(bit));
+  }
+}
+
+TEST(BITBroadcasterLoop, LoopLengthWrapsWhenTheFirstLoopClaimsMoreThanTheSection) {
+  // first_descriptors_length 8, but only 4 bytes of body follow it before the
+  // CRC_32: section_length 15, loop length 15 - 11 - 8 wraps to 65532. The loop
+  // then runs on past the section, here over records of 3 + 4095 bytes placed in
+  // the caller's buffer: 16 of them start before the wrapped end.
+  Bytes section = BitSection(Cat({Length12(8, 0xE), Bytes{0xD7, 0x06, 0x01, 0x02}}));
+  ASSERT_EQ(18u, section.size());
+  const size_t kStep = 3 + 4095;
+  Bytes buffer = section;
+  buffer.resize(18 + 16 * kStep + 8, 0x00);
+  std::vector<std::string> expected;
+  for (int k = 0; k < 17; ++k) {
+    size_t at = 18 + k * kStep;
+    buffer[at] = static_cast<uint8_t>(k);
+    buffer[at + 1] = 0xFF;
+    buffer[at + 2] = 0xFF;
+    buffer[at + 3] = 0xC5;
+    buffer[at + 4] = 0x01;
+    char summary[32];
+    std::snprintf(summary, sizeof(summary), "id=0x%02x len=4095", k);
+    if (k < 16) expected.push_back(summary);
+  }
+  TraceRecorder recorder;
+  RavelCBIT bit(buffer.data());
+  EXPECT_EQ(expected, Records(bit));
+  TraceLines traces{{kBit, FirstLoopUnknown(0xD7)}};
+  for (int k = 0; k < 16; ++k) traces.push_back({kWarning, RecordUnknown(0xC5)});
+  EXPECT_EQ(traces, recorder.Lines());
+}
+
+TEST(BITBroadcasterLoop, RecordParseClearsOnFailureAndReleasesOnReparse) {
+  Bytes badTag = Cat({U8(0x09), Length12(3), Descriptor(0x00, {0x01})});
+  Bytes other = Record(0x0A, {SiParameter()});
+  struct Case {
+    const char* label;
+    Bytes* record;
+    int result;
+    TraceLines traces;
+    std::string summary;
+  } cases[] = {
+      {"null clears both fields", nullptr, kRavelErrInvalidArgument, {}, "id=0x00 len=0"},
+      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}},
+       "id=0x00 len=0"},
+      {"another tag releases the held descriptor", &other, kRavelOk, {{kWarning, RecordUnknown(0xD7)}},
+       "id=0x0a len=4"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCBroadcasterDescriptor record(const_cast<uint8_t*>(kRecordA.data()));
+    ASSERT_EQ(kSummaryA, Summary(record));
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, record.ParseRawData(c.record ? c.record->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.summary, Summary(record));
+  }
+}
+
+TEST(BITMerge, AppendsCopiesOfEveryRecordWithoutComparingAnything) {
+  Bytes first = BitSection(BitBody(false, {}, {kRecordA, kRecordB}), 0x7FE1, 3);
+  Bytes otherNetwork = BitSection(BitBody(true, {SiParameter()}, {Record(0x05, {ExtBroadcaster(0x0E05)})}), 0x0001, 9);
+  struct Case {
+    const char* label;
+    Bytes* other;
+    std::vector<std::string> records;
+  } cases[] = {
+      {"a copy of the same section doubles every record", &first, {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
+      {"another network and version mix in", &otherNetwork, {kSummaryA, kSummaryB, "id=0x05 len=9 ext=0x0e05"}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCBIT target(first.data());
+    std::unique_ptr<RavelCBIT> other(new RavelCBIT(c.other->data()));
+    const std::vector<std::string> otherRecords = Records(*other);
+    TraceRecorder recorder;
+    RavelCBIT& result = (target += *other);
+    EXPECT_EQ(&target, &result);
+    EXPECT_TRUE(recorder.Lines().empty());
+    EXPECT_EQ(otherRecords, Records(*other));
+    other.reset();  // the merged records are copies
+    EXPECT_EQ(c.records, Records(target));
+    EXPECT_EQ(0x7FE1, target.iTableIdExtension);
+    EXPECT_EQ(3, target.iVersionNumber);
+    EXPECT_EQ(0, target.GetBroadcasterViewPropriety());
+  }
+  RavelCBIT self(first.data());
+  self += self;
+  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB, kSummaryA, kSummaryB}), Records(self));
+}
+
+TEST(BITCopy, CopiesHeaderFieldsAndEveryRecordDeeply) {
+  Bytes section = BitSection(BitBody(true, {SiParameter()}, {kRecordA, kRecordB}), 0x7FE2, 6);
+  Bytes other = BitSection(BitBody(false, {}, {Record(0x05, {ExtBroadcaster(0x0E05)})}), 0x0001, 1);
+  std::unique_ptr<RavelCBIT> source(new RavelCBIT(section.data()));
+  source->iSession = 0x11;
+  RavelCBIT constructed(*source);
+  RavelCBIT assigned(other.data());
+  assigned = *source;
+  source.reset();
+  for (RavelCBIT* copy : {&constructed, &assigned}) {
+    EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Records(*copy));
+    EXPECT_EQ(0x11, copy->iSession);
+    EXPECT_EQ(0xC4, copy->iTableId);
+    EXPECT_EQ(0x7FE2, copy->iTableIdExtension);
+    EXPECT_EQ(6, copy->iVersionNumber);
+    EXPECT_EQ(section.size() - 3, copy->iSectionLength);
+    EXPECT_EQ(1, copy->GetBroadcasterViewPropriety());
+    EXPECT_EQ(4, copy->GetFirstDescriptorsLength());
+    EXPECT_STREQ("BIT", copy->sTableName.GetString());
+  }
+  // The records are deleted before the copy: a table assigned to itself has none.
+  assigned = assigned;
+  EXPECT_EQ(0, assigned.GetBroadcasterCount());
+  EXPECT_EQ(4, assigned.GetFirstDescriptorsLength());
+
+  std::unique_ptr<RavelCBroadcasterDescriptor> record(
+      new RavelCBroadcasterDescriptor(const_cast<uint8_t*>(kRecordB.data())));
+  RavelCBroadcasterDescriptor recordCopy(*record);
+  RavelCBroadcasterDescriptor recordAssigned(const_cast<uint8_t*>(kRecordA.data()));
+  recordAssigned = *record;
+  record.reset();
+  EXPECT_EQ(kSummaryB, Summary(recordCopy));
+  EXPECT_EQ(kSummaryB, Summary(recordAssigned));
+}
+
+TEST(BITShow, DumpsBannersHeaderProprietyAndNumberedRecords) {
+  Bytes section =
+      BitSection(BitBody(true, {SiParameter()}, {kRecordA, Record(0x2B, {SiParameter()})}), 0x7FE1, 3);
+  RavelCBIT bit(section.data());
+  TraceRecorder recorder;
+  bit.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, "#################################################################\n"},
+                {kDump, "###################### BIT Table Information ######################\n"},
+                {kDump, "#################################################################\n"},
+                {kDump, "####################### Header Information ########################\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0xc4], Table Name=[BIT]\n"},
+                {kDump, "Section syntax indicator=[1], Section length=[34], Any Identifier(?)=[0x7fe1]\n"},
+                {kDump, "Version number=[3], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, "#################################################################\n"},
+                {kDump, "####################### Body Information #######################\n"},
+                {kDump, "Broadcaster View Propriety=[1]\n"},
+                {kDump, "Broadcaster Descriptor Array Size=[2]\n"},
+                {kDump, "##################### Broadcaster Descriptor [0] #####################\n"},
+                {kDump, "\tTS Information : BroadcasterID=[0x0001], BroadcasterDescriptorLen=[0x0009]\n"},
+                {kDump, "\t=================== Extended Broadcaster Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0xce], Descriptor Length=[7], Name=[Extended Braodcaster Descriptor]\n"},
+                {kDump, "\tiBroadcasterType=[0x1], Affiliation ID Nums=[0], Broadcaster ID Nums=[1]\n"},
+                {kDump, "\t\t[0]th Org Network Id=[32737], Broadcaster ID=[5]\n"},
+                {kDump, "##################### Broadcaster Descriptor [1] #####################\n"},
+                {kDump, "\tTS Information : BroadcasterID=[0x002b], BroadcasterDescriptorLen=[0x0004]\n"},
+                {kDump, "#################################################\n"},
+            }),
+            recorder.Lines());
+}
+
+TEST(BITCapture, TwoSectionsYieldTheirBroadcasterRecords) {
+  Bytes contents;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("isdb-signalling-mix.sections", contents);
+  std::vector<Bytes> bits;
+  for (const Bytes& s : captures::SplitSections(contents)) {
+    if (s[0] == 0xC4) bits.push_back(s);
+  }
+  ASSERT_EQ(2u, bits.size());
+
+  TraceRecorder recorder;
+  RavelCBIT first(bits[0].data());
+  EXPECT_TRUE(recorder.Lines().empty());
+  EXPECT_EQ(0x0123, first.iTableIdExtension);
+  EXPECT_EQ(0, first.GetBroadcasterViewPropriety());
+  EXPECT_EQ(0, first.GetFirstDescriptorsLength());
+  EXPECT_EQ(0, first.GetBroadcasterCount());
+
+  RavelCBIT second(bits[1].data());
+  EXPECT_EQ(0x8765, second.iTableIdExtension);
+  EXPECT_EQ(23, second.iVersionNumber);
+  EXPECT_EQ(1, second.GetBroadcasterViewPropriety());
+  EXPECT_EQ(8, second.GetFirstDescriptorsLength());
+  // The first broadcaster has no descriptors: its look at byte 3 finds the
+  // second broadcaster's id (0xCD) as a tag.
+  EXPECT_EQ((std::vector<std::string>{"id=0xab len=0", "id=0xcd len=12"}), Records(second));
+  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xFD)},
+                        {kBit, FirstLoopUnknown(0xFD)},
+                        {kWarning, RecordUnknown(0xCD)},
+                        {kWarning, RecordUnknown(0xFD)}}),
+            recorder.Lines());
+
+  first += second;
+  EXPECT_EQ((std::vector<std::string>{"id=0xab len=0", "id=0xcd len=12"}), Records(first));
+  EXPECT_EQ(0x0123, first.iTableIdExtension);
+}

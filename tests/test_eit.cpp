@@ -1,0 +1,1094 @@
+// Event information table and its event records.
+#include <gtest/gtest.h>
+
+#include <map>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "Captures.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CDescriptorAudioComponent.h"
+#include "Ravel_CDescriptorComponent.h"
+#include "Ravel_CDescriptorContent.h"
+#include "Ravel_CDescriptorCopyright.h"
+#include "Ravel_CDescriptorExtendedEvent.h"
+#include "Ravel_CDescriptorParentalRating.h"
+#include "Ravel_CDescriptorSeries.h"
+#include "Ravel_CDescriptorShortEvent.h"
+#include "Ravel_CTSPktAssembler.h"
+#include "Ravel_CTableEIT.h"
+#include "Ravel_ResultCode.h"
+#include "Ravel_Util.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kWarning = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+const std::string kRule = "#################################################################\n";
+const std::string kParseFail = "EIT Info Parsing Fail! Maybe data has been corrupted!\n";
+
+// ---------------------------------------------------------------------------
+// Builders
+
+Bytes ShortEvent(const std::string& name, const std::string& text = "", const std::string& language = "jpn") {
+  return sb::Descriptor(
+      0x4D, sb::Cat({sb::Text(language), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()), sb::Text(text)}));
+}
+
+Bytes ExtendedEvent(unsigned int number, unsigned int last, const std::string& text) {
+  return sb::Descriptor(
+      0x4E, sb::Cat({sb::U8(number << 4 | last), sb::Text("jpn"), sb::U8(0), sb::U8(text.size()), sb::Text(text)}));
+}
+
+// stream_content 2 (audio), main component, quality 1, sampling rate 7.
+Bytes AudioComponent(uint8_t componentTag, const std::string& language = "jpn") {
+  return sb::Descriptor(0xC4, sb::Cat({sb::U8(0xF2), sb::U8(0x03), sb::U8(componentTag), sb::U8(0x0F), sb::U8(0xFF),
+                                       sb::U8(0x5F), sb::Text(language)}));
+}
+
+Bytes Component(uint8_t componentTag) {
+  return sb::Descriptor(0x50, sb::Cat({sb::U8(0xF1), sb::U8(0xB3), sb::U8(componentTag), sb::Text("jpn")}));
+}
+
+Bytes Content(uint8_t genre) { return sb::Descriptor(0x54, sb::Cat({sb::U8(genre), sb::U8(0xFF)})); }
+
+Bytes ParentalRating(uint8_t rating) { return sb::Descriptor(0x55, sb::Cat({sb::Text("BRA"), sb::U8(rating)})); }
+
+Bytes Copyright(uint32_t id) { return sb::Descriptor(0x0D, sb::Cat({sb::U32(id), sb::Text("(c)")})); }
+
+Bytes Series(uint16_t seriesId, const std::string& name) {
+  return sb::Descriptor(0xD5,
+                        sb::Cat({sb::U16(seriesId), sb::U8(0x11), sb::U16(0xE4CD), sb::U24(0x001002), sb::Text(name)}));
+}
+
+Bytes DigitalCopyControl() { return sb::Descriptor(0xC1, sb::U8(0x84)); }
+
+struct EventRecord {
+  uint16_t eventId;
+  Bytes start;     // 16-bit MJD and three BCD bytes
+  Bytes duration;  // three BCD bytes
+  uint8_t runningStatus;
+  uint8_t freeCAMode;
+  std::vector<Bytes> descriptors;
+};
+
+Bytes EventBytes(const EventRecord& e) {
+  Bytes d = sb::Cat(e.descriptors);
+  return sb::Cat({sb::U16(e.eventId), e.start, e.duration,
+                  sb::Length12(d.size(), static_cast<uint8_t>(e.runningStatus << 1 | e.freeCAMode)), d});
+}
+
+Bytes At(int year, int month, int day, int hour, int minute, int second = 0) {
+  return sb::UtcTime(year, month, day, hour, minute, second);
+}
+
+Bytes Duration(int hours, int minutes, int seconds = 0) {
+  return Bytes{sb::Bcd(hours), sb::Bcd(minutes), sb::Bcd(seconds)};
+}
+
+// An event at `start` lasting 30 minutes, with descriptors.
+EventRecord Ev(uint16_t eventId, const Bytes& start, const std::vector<Bytes>& descriptors = {}) {
+  return EventRecord{eventId, start, Duration(0, 30), 4, 0, descriptors};
+}
+
+struct EitOptions {
+  uint8_t tableId = 0x4E;
+  uint16_t serviceId = 0x4800;
+  uint8_t version = 4;
+  uint8_t sectionNumber = 0;
+  uint8_t lastSectionNumber = 1;
+  uint16_t transportStreamId = 0x7ED0;
+  uint16_t originalNetworkId = 0x7ED1;
+  uint8_t segmentLastSectionNumber = 1;
+  uint8_t lastTableId = 0x4E;
+  bool corruptCrc = false;
+};
+
+Bytes EitSection(const EitOptions& options, const Bytes& events) {
+  sb::SectionOptions sectionOptions;
+  sectionOptions.tableId = options.tableId;
+  sectionOptions.tableIdExtension = options.serviceId;
+  sectionOptions.version = options.version;
+  sectionOptions.sectionNumber = options.sectionNumber;
+  sectionOptions.lastSectionNumber = options.lastSectionNumber;
+  sectionOptions.corruptCrc = options.corruptCrc;
+  return sb::LongSection(sectionOptions,
+                         sb::Cat({sb::U16(options.transportStreamId), sb::U16(options.originalNetworkId),
+                                  sb::U8(options.segmentLastSectionNumber), sb::U8(options.lastTableId), events}));
+}
+
+Bytes EitSection(const EitOptions& options, const std::vector<EventRecord>& events) {
+  Bytes all;
+  for (const EventRecord& e : events) sb::Append(all, EventBytes(e));
+  return EitSection(options, all);
+}
+
+// ---------------------------------------------------------------------------
+// Readers
+
+typedef std::vector<int> Ints;
+
+// year, month, day, hour, minute, second, and the three remaining fields.
+Ints TimeOf(const RavelCDateTime& t) {
+  return {t.iYear, t.iMonth, t.iDay, t.iHour, t.iMinute, t.iSecond, t.iMilliSecond, t.iDayOfWeek, t.iTimeZone};
+}
+
+std::vector<int> EventIds(RavelCEIT& eit) {
+  std::vector<int> ids;
+  for (int i = 0; i < eit.GetEventCount(); ++i) ids.push_back(eit.GetEventInfo(i)->iEventId);
+  return ids;
+}
+
+std::string Str(const char* text) { return text ? text : "<null>"; }
+
+// One line naming what an event holds, kind by kind, in the dump order.
+std::string Holdings(RavelCEventInfo& e) {
+  std::string s;
+  if (e.pShortEventDescriptor) s += "short:" + Str(e.pShortEventDescriptor->GetEventName()) + " ";
+  if (e.pContentDescriptor) s += "content:" + std::to_string(e.pContentDescriptor->pGenre[0]) + " ";
+  if (e.pComponentDescriptor) s += "component:" + std::to_string(e.pComponentDescriptor->GetComponentTag()) + " ";
+  if (e.pParentalRatingDescriptor) {
+    s += "rating:" + std::to_string(e.pParentalRatingDescriptor->GetParentalRating(0)->GetMinimumAge()) + " ";
+  }
+  for (int i = 0; i < e.GetAudioComponentCount(); ++i) {
+    s += "audio:" + std::to_string(e.GetAudioComponent(i)->GetComponentTag()) + " ";
+  }
+  if (e.pCopyrightDescriptor) s += "copyright:" + std::to_string(e.pCopyrightDescriptor->GetCopyrightId()) + " ";
+  if (e.pExtendedEventDescriptor) {
+    s += "extended:" + std::to_string(e.pExtendedEventDescriptor->GetDescriptorNumber()) + " ";
+  }
+  if (e.pSeriesDescriptor) s += "series:" + std::to_string(e.pSeriesDescriptor->GetSeriesId()) + " ";
+  return s;
+}
+
+Bytes FromHex(const std::string& hex) {
+  Bytes out;
+  for (size_t i = 0; i + 1 < hex.size(); i += 2)
+    out.push_back(static_cast<uint8_t>(std::stoi(hex.substr(i, 2), 0, 16)));
+  return out;
+}
+
+std::string HexToText(const std::string& hex) {
+  Bytes b = FromHex(hex);
+  return std::string(b.begin(), b.end());
+}
+
+std::vector<unsigned int> FourFields(RavelCEIT& eit) {
+  return {eit.iTransportStreamId, eit.iOriginalNetworkId, eit.iSegmentLastSectionNumber, eit.iLastTableId};
+}
+
+}  // namespace
+
+// ---------------------------------------------------------------------------
+// Event fields
+
+TEST(EITEventFields, StartTimesFollowTheDateRuleAndBcdIsNotValidated) {
+  struct Case {
+    const char* label;
+    Bytes start;
+    Bytes duration;
+    uint8_t flags;  // running_status and free_CA_mode nibble
+    Ints time;
+    Ints duration3;
+    int runningStatus;
+    int freeCA;
+  } cases[] = {
+      {"ordinary day", At(2020, 4, 5, 19, 0), Duration(0, 30), 0x8, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, {0, 30, 0}, 4, 0},
+      {"leap day",
+       At(2012, 2, 29, 23, 59, 59),
+       Duration(1, 0, 5),
+       0x9,
+       {2012, 2, 29, 23, 59, 59, 0, 0, 0},
+       {1, 0, 5},
+       4,
+       1},
+      {"1 January: previous year's 32 December",
+       At(2013, 1, 1, 0, 0),
+       Duration(0, 1),
+       0x2,
+       {2012, 12, 32, 0, 0, 0, 0, 0, 0},
+       {0, 1, 0},
+       1,
+       0},
+      {"2 January is right",
+       At(2013, 1, 2, 6, 15),
+       Duration(0, 1),
+       0x2,
+       {2013, 1, 2, 6, 15, 0, 0, 0, 0},
+       {0, 1, 0},
+       1,
+       0},
+      {"1 March: 32 February",
+       At(2013, 3, 1, 12, 0),
+       Duration(2, 0),
+       0xE,
+       {2013, 2, 32, 12, 0, 0, 0, 0, 0},
+       {2, 0, 0},
+       7,
+       0},
+      {"1 May: 31 April",
+       At(2014, 5, 1, 12, 0),
+       Duration(2, 0),
+       0x6,
+       {2014, 4, 31, 12, 0, 0, 0, 0, 0},
+       {2, 0, 0},
+       3,
+       0},
+      {"1 October: 31 September",
+       At(2019, 10, 1, 1, 2, 3),
+       Duration(0, 0, 1),
+       0x0,
+       {2019, 9, 31, 1, 2, 3, 0, 0, 0},
+       {0, 0, 1},
+       0,
+       0},
+      {"BCD digits unchecked",
+       Bytes{0xE4, 0x89, 0x99, 0x9A, 0xFF},
+       Bytes{0xFF, 0x9A, 0x99},
+       0x1,
+       {2019, 1, 22, 99, 100, 165, 0, 0, 0},
+       {165, 100, 99},
+       0,
+       1},
+      {"MJD 0 is not range-checked",
+       Bytes{0x00, 0x00, 0x00, 0x00, 0x00},
+       Duration(0, 0),
+       0xF,
+       {1859, -1, 19, 0, 0, 0, 0, 0, 0},
+       {0, 0, 0},
+       7,
+       1},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes events = sb::Cat({sb::U16(0x1234), c.start, c.duration, Bytes{static_cast<uint8_t>(c.flags << 4), 0x00}});
+    Bytes section = EitSection(EitOptions(), events);
+    TraceRecorder recorder;
+    RavelCEIT eit(section.data());
+    EXPECT_TRUE(recorder.Lines().empty());
+    ASSERT_EQ(1, eit.GetEventCount());
+    RavelCEventInfo* e = eit.GetEventInfo(0);
+    EXPECT_EQ(0x1234, e->iEventId);
+    EXPECT_EQ(c.time, TimeOf(e->cStartTime));
+    EXPECT_EQ(c.duration3, (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond}));
+    EXPECT_EQ(c.runningStatus, e->iRunningStatus);
+    EXPECT_EQ(c.freeCA, e->bFreeCAMode);
+    EXPECT_EQ(0, e->iDescriptorsLoopLength);
+    EXPECT_EQ("", Holdings(*e));
+  }
+}
+
+TEST(EITEventFields, ComparisonsOrderByStartTime) {
+  Bytes early = EventBytes(Ev(1, At(2020, 4, 5, 19, 0)));
+  Bytes late = EventBytes(Ev(2, At(2020, 4, 5, 19, 30)));
+  Bytes firstOfMay = EventBytes(Ev(3, At(2020, 5, 1, 0, 0)));  // decoded as 31 April
+  Bytes lastOfApril = EventBytes(Ev(4, At(2020, 4, 30, 23, 0)));
+  struct Case {
+    const char* label;
+    Bytes* a;
+    Bytes* b;
+    int lt, le, gt, ge;
+  } cases[] = {
+      {"earlier", &early, &late, 1, 1, 0, 0},
+      {"later", &late, &early, 0, 0, 1, 1},
+      {"equal", &early, &early, 0, 1, 0, 1},
+      {"day 31 of April sorts after 30 April", &firstOfMay, &lastOfApril, 0, 0, 1, 1},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCEventInfo a(c.a->data());
+    RavelCEventInfo b(c.b->data());
+    EXPECT_EQ(c.lt, a < b);
+    EXPECT_EQ(c.le, a <= b);
+    EXPECT_EQ(c.gt, a > b);
+    EXPECT_EQ(c.ge, a >= b);
+  }
+}
+
+// ---------------------------------------------------------------------------
+// Event descriptors
+
+TEST(EITEventDescriptors, LastOfEachKindWinsAndEveryAudioComponentIsKept) {
+  struct Case {
+    const char* label;
+    std::vector<Bytes> descriptors;
+    std::string holdings;
+    std::vector<std::string> warnings;
+  } cases[] = {
+      {"every kept kind, in wire order unlike the dump order",
+       {Series(77, "S"), AudioComponent(0x10), Copyright(9), ExtendedEvent(0, 0, "ext"), ParentalRating(0x02),
+        Component(0x00), Content(0x12), ShortEvent("News")},
+       "short:News content:18 component:0 rating:10 audio:16 copyright:9 extended:0 series:77 ",
+       {"raw genre = 0x12!\n"}},
+      {"two short events: the second", {ShortEvent("First"), ShortEvent("Second")}, "short:Second ", {}},
+      {"three extended events: only the last text survives",
+       {ExtendedEvent(0, 2, "a"), ExtendedEvent(1, 2, "b"), ExtendedEvent(2, 2, "c")},
+       "extended:2 ",
+       {}},
+      {"three audio components, all in arrival order",
+       {AudioComponent(0x12), AudioComponent(0x10), AudioComponent(0x11)},
+       "audio:18 audio:16 audio:17 ",
+       {}},
+      {"repeated single kinds interleaved with audio",
+       {Component(1), AudioComponent(0x10), Component(2), Content(0x20), AudioComponent(0x11), Content(0x30),
+        ParentalRating(0x03), ParentalRating(0x04), Copyright(1), Copyright(2), Series(1, "a"), Series(2, "b")},
+       "content:48 component:2 rating:14 audio:16 audio:17 copyright:2 series:2 ",
+       {"raw genre = 0x20!\n", "raw genre = 0x30!\n"}},
+      {"digital copy control and unknown tags are traced, not kept",
+       {DigitalCopyControl(), sb::Descriptor(0xC7, Bytes(14, 0x00)), ShortEvent("N"),
+        sb::Descriptor(0xD6, Bytes{0x11, 0x48, 0x00, 0x0E, 0xDD}), sb::Descriptor(0x49, Bytes{0x01})},
+       "short:N ",
+       {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
+        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xc7]\n",
+        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xd6]\n",
+        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0x49]\n"}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = EitSection(EitOptions(), {Ev(7, At(2020, 4, 5, 19, 0), c.descriptors)});
+    TraceRecorder recorder;
+    RavelCEIT eit(section.data());
+    TraceLines expected;
+    for (const std::string& w : c.warnings) expected.push_back({kWarning, w});
+    EXPECT_EQ(expected, recorder.Lines());
+    ASSERT_EQ(1, eit.GetEventCount());
+    EXPECT_EQ(c.holdings, Holdings(*eit.GetEventInfo(0)));
+    EXPECT_EQ(sb::Cat(c.descriptors).size(), eit.GetEventInfo(0)->iDescriptorsLoopLength);
+  }
+}
+
+TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
+  Bytes rich = EventBytes(Ev(1, At(2020, 4, 5, 19, 0), {ShortEvent("A"), AudioComponent(0x10), AudioComponent(0x11)}));
+  Bytes bare = EventBytes(Ev(2, At(2020, 4, 5, 19, 30)));
+  Bytes broken = EventBytes(Ev(3, At(2020, 4, 5, 20, 0), {ShortEvent("B"), AudioComponent(0x12), Bytes{0x54, 0x00}}));
+
+  RavelCEventInfo event(rich.data());
+  ASSERT_EQ("short:A audio:16 audio:17 ", Holdings(event));
+
+  // A parse without descriptors keeps none of the earlier ones.
+  EXPECT_EQ(kRavelOk, event.ParseRawData(bare.data()));
+  EXPECT_EQ(2, event.iEventId);
+  EXPECT_EQ("", Holdings(event));
+  ASSERT_NE(nullptr, event.pAudioComponentList);
+
+  // A zero-length descriptor clears everything and frees the list itself.
+  {
+    TraceRecorder recorder;
+    EXPECT_EQ(kRavelErrCorruptSection, event.ParseRawData(broken.data()));
+    EXPECT_EQ((TraceLines{{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x54], descrLen=[0]\n"}}),
+              recorder.Lines());
+  }
+  EXPECT_EQ(nullptr, event.pAudioComponentList);
+  EXPECT_EQ(nullptr, event.pShortEventDescriptor);
+  EXPECT_EQ(0, event.iEventId);
+  EXPECT_EQ(TimeOf(RavelCDateTime()), TimeOf(event.cStartTime));
+  EXPECT_EQ(0, event.iDescriptorsLoopLength);
+  EXPECT_EQ(0, event.GetAudioComponentCount());
+  EXPECT_EQ(nullptr, event.GetAudioComponent(0));
+
+  // Without a list the event still dumps and copies; a copy gets a list of its own.
+  {
+    TraceRecorder recorder;
+    event.Show();
+    EXPECT_EQ(6u, recorder.Lines().size());
+  }
+  RavelCEventInfo copy(event);
+  EXPECT_NE(nullptr, copy.pAudioComponentList);
+  EXPECT_EQ(0, copy.GetAudioComponentCount());
+
+  // The next parse allocates a new list.
+  EXPECT_EQ(kRavelOk, event.ParseRawData(rich.data()));
+  ASSERT_NE(nullptr, event.pAudioComponentList);
+  EXPECT_EQ("short:A audio:16 audio:17 ", Holdings(event));
+
+  // Null: fields cleared, no descriptors, an empty list.
+  event.iSpare = 0x5A;
+  EXPECT_EQ(kRavelErrInvalidArgument, event.ParseRawData(nullptr));
+  EXPECT_EQ(0, event.iEventId);
+  EXPECT_EQ(0, event.iRunningStatus);
+  EXPECT_EQ("", Holdings(event));
+  EXPECT_NE(nullptr, event.pAudioComponentList);
+  EXPECT_EQ(0x5A, event.iSpare);  // parsing never writes it
+}
+
+TEST(EITEventDescriptors, CopiesAreDeepAndSelfAssignmentDropsTheDescriptors) {
+  Bytes raw = EventBytes(EventRecord{
+      0x0EDE,
+      At(2020, 4, 5, 19, 30),
+      Duration(0, 30),
+      2,
+      1,
+      {ShortEvent("Name", "Text"), Content(0x82), Component(0xB3), ParentalRating(0x05), AudioComponent(0x10),
+       AudioComponent(0x11), Copyright(4), ExtendedEvent(1, 1, "more"), Series(9, "Series")}});
+  const std::string all =
+      "short:Name content:130 component:179 rating:16 audio:16 audio:17 copyright:4 extended:1 series:9 ";
+  std::unique_ptr<RavelCEventInfo> source(new RavelCEventInfo(raw.data()));
+  source->iSpare = 0x33;
+  ASSERT_EQ(all, Holdings(*source));
+
+  RavelCEventInfo constructed(*source);
+  Bytes other = EventBytes(Ev(5, At(2021, 1, 1, 0, 0), {AudioComponent(0x20), ShortEvent("Old")}));
+  RavelCEventInfo assigned(other.data());
+  assigned = *source;
+  source.reset();
+  for (RavelCEventInfo* copy : {&constructed, &assigned}) {
+    EXPECT_EQ(all, Holdings(*copy));
+    EXPECT_EQ(0x0EDE, copy->iEventId);
+    EXPECT_EQ((Ints{2020, 4, 5, 19, 30, 0, 0, 0, 0}), TimeOf(copy->cStartTime));
+    EXPECT_EQ(30, copy->iDurationMinute);
+    EXPECT_EQ(2, copy->iRunningStatus);
+    EXPECT_EQ(1, copy->bFreeCAMode);
+    EXPECT_EQ(0x33, copy->iSpare);
+    EXPECT_STREQ("Text", copy->pShortEventDescriptor->GetEventDescription());
+    EXPECT_STREQ("Series", copy->pSeriesDescriptor->GetSeriesName());
+  }
+
+  // The list's count is 8 bits wide: of 257 audio components a copy and the
+  // dump take one, although the list holds (and releases) all of them.
+  std::vector<Bytes> many(257, AudioComponent(0x30));
+  many.front() = AudioComponent(0x31);
+  Bytes crowded = EventBytes(Ev(6, At(2020, 4, 5, 19, 0), many));
+  RavelCEventInfo full(crowded.data());
+  EXPECT_EQ(1, full.GetAudioComponentCount());
+  EXPECT_EQ(0x30, full.GetAudioComponent(256)->GetComponentTag());
+  RavelCEventInfo fullCopy(full);
+  EXPECT_EQ("audio:49 ", Holdings(fullCopy));
+  EXPECT_EQ(nullptr, fullCopy.GetAudioComponent(1));
+
+  // Assigning an event to itself releases its descriptors before reading them.
+  RavelCEventInfo& alias = assigned;
+  assigned = alias;
+  EXPECT_EQ("", Holdings(assigned));
+  EXPECT_EQ(0x0EDE, assigned.iEventId);
+  EXPECT_EQ(0x33, assigned.iSpare);
+}
+
+// ---------------------------------------------------------------------------
+// Table parse
+
+TEST(EITParse, AcceptsPresentFollowingTheFirstActualScheduleAndOtherSchedules) {
+  struct Case {
+    uint8_t tableId;
+    int result;
+    const char* name;
+  } cases[] = {
+      {0x4E, kRavelOk, "EIT Actual"},
+      {0x4F, kRavelOk, "EIT Other"},
+      {0x50, kRavelOk, "EIT schedule Actual"},
+      {0x51, kRavelErrInvalidArgument, nullptr},
+      {0x58, kRavelErrInvalidArgument, nullptr},
+      {0x5F, kRavelErrInvalidArgument, nullptr},
+      {0x60, kRavelOk, "EIT schedule Other"},
+      {0x6A, kRavelOk, "EIT schedule Other"},
+      {0x6F, kRavelOk, "EIT schedule Other"},
+      {0x4D, kRavelErrInvalidArgument, nullptr},
+      {0x70, kRavelErrInvalidArgument, nullptr},
+      {0x00, kRavelErrInvalidArgument, nullptr},
+  };
+  Bytes previous = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0))});
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.tableId);
+    EitOptions options;
+    options.tableId = c.tableId;
+    options.serviceId = 0x4801;
+    options.transportStreamId = 0x1111;
+    options.originalNetworkId = 0x2222;
+    options.segmentLastSectionNumber = 8;
+    options.lastTableId = 0x51;
+    Bytes section = EitSection(options, {Ev(2, At(2020, 4, 5, 20, 0)), Ev(3, At(2020, 4, 5, 21, 0))});
+    RavelCEIT eit(previous.data());
+    ASSERT_EQ(1, eit.GetEventCount());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, eit.ParseRawData(section.data()));
+    EXPECT_EQ(c.tableId, eit.iTableId);  // the header is parsed either way
+    EXPECT_EQ(0x4801, eit.iTableIdExtension);
+    if (c.result == kRavelOk) {
+      EXPECT_TRUE(recorder.Lines().empty());
+      EXPECT_STREQ(c.name, eit.sTableName.GetString());
+      EXPECT_EQ(c.tableId, eit.iEITTableId);
+      EXPECT_EQ((std::vector<unsigned int>{0x1111, 0x2222, 8, 0x51}), FourFields(eit));
+      EXPECT_EQ((std::vector<int>{2, 3}), EventIds(eit));
+    } else {
+      char text[64];
+      snprintf(text, sizeof(text), "Table ID isn't for EIT! Table ID=[0x%02x]\n", c.tableId);
+      EXPECT_EQ((TraceLines{{kError, text}}), recorder.Lines());
+      EXPECT_STREQ("EIT Actual", eit.sTableName.GetString());  // from the earlier parse
+      EXPECT_EQ(0x4E, eit.iEITTableId);
+      EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
+      EXPECT_EQ(0, eit.GetEventCount());
+    }
+  }
+}
+
+TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
+  EitOptions badCrcOptions;
+  badCrcOptions.corruptCrc = true;
+  badCrcOptions.tableId = 0x4F;
+  badCrcOptions.version = 9;
+  Bytes badCrc = EitSection(badCrcOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
+  EitOptions otherOptions;
+  otherOptions.tableId = 0x4F;
+  otherOptions.version = 9;
+  otherOptions.serviceId = 0x0101;
+  Bytes zeroLength = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}),
+                                               Ev(3, At(2020, 4, 5, 21, 0), {Bytes{0x4D, 0x00}})});
+  Bytes zeroTag = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {Bytes{0x00, 0x03, 1, 2, 3}})});
+  Bytes badCrcAndTableId = EitSection(
+      [] {
+        EitOptions s;
+        s.tableId = 0x51;
+        s.corruptCrc = true;
+        return s;
+      }(),
+      {Ev(2, At(2020, 4, 5, 20, 0))});
+
+  struct Case {
+    const char* label;
+    Bytes* section;
+    int result;
+    TraceLines traces;
+    bool headerParsed;
+  } cases[] = {
+      {"null", nullptr, kRavelErrInvalidArgument, {}, false},
+      {"bad CRC: the header is not parsed",
+       &badCrc,
+       kRavelErrCorruptSection,
+       {{kWarning, "EIT Section: CRC Error!\n"}},
+       false},
+      {"the CRC is checked before the table_id",
+       &badCrcAndTableId,
+       kRavelErrCorruptSection,
+       {{kWarning, "EIT Section: CRC Error!\n"}},
+       false},
+      {"zero-length descriptor in the second event",
+       &zeroLength,
+       kRavelErrCorruptSection,
+       {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x4d], descrLen=[0]\n"}, {kWarning, kParseFail}},
+       true},
+      {"descriptor tag 0",
+       &zeroTag,
+       kRavelErrCorruptSection,
+       {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x00], descrLen=[3]\n"}, {kWarning, kParseFail}},
+       true},
+  };
+  Bytes previous = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(5, At(2020, 4, 5, 19, 30))});
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCEIT eit(previous.data());
+    ASSERT_EQ(2, eit.GetEventCount());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, eit.ParseRawData(c.section ? c.section->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(0, eit.GetEventCount());
+    EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
+    if (c.headerParsed) {
+      // Header and name of the refused section stay.
+      EXPECT_EQ(0x4F, eit.iTableId);
+      EXPECT_EQ(9, eit.iVersionNumber);
+      EXPECT_EQ(0x0101, eit.iTableIdExtension);
+      EXPECT_STREQ("EIT Other", eit.sTableName.GetString());
+      EXPECT_EQ(0x4F, eit.iEITTableId);
+    } else {
+      EXPECT_EQ(0x4E, eit.iTableId);
+      EXPECT_EQ(4, eit.iVersionNumber);
+      EXPECT_EQ(0x4800, eit.iTableIdExtension);
+      EXPECT_STREQ("EIT Actual", eit.sTableName.GetString());
+    }
+  }
+}
+
+TEST(EITParse, EventLoopRunsFromByte14ToTheFirstCrcByte) {
+  struct Case {
+    const char* label;
+    Bytes events;
+    std::vector<int> ids;
+    std::vector<int> loopLengths;
+    std::vector<std::string> warnings;
+  } cases[] = {
+      {"no events: section_length 15", Bytes(), {}, {}, {}},
+      {"events without descriptors",
+       sb::Cat({EventBytes(Ev(1, At(2020, 1, 2, 0, 0))), EventBytes(Ev(2, At(2020, 1, 2, 1, 0)))}),
+       {1, 2},
+       {0, 0},
+       {}},
+      {"each event steps by 12 + its loop length",
+       sb::Cat({EventBytes(Ev(3, At(2020, 1, 2, 0, 0), {ShortEvent("a"), AudioComponent(1)})),
+                EventBytes(Ev(4, At(2020, 1, 2, 1, 0))), EventBytes(Ev(5, At(2020, 1, 2, 2, 0), {Content(1)}))}),
+       {3, 4, 5},
+       {19, 0, 4},
+       {"raw genre = 0x1!\n"}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = EitSection(EitOptions(), c.events);
+    TraceRecorder recorder;
+    RavelCEIT eit(section.data());
+    EXPECT_EQ(c.warnings, recorder.TextsAt(kWarning));
+    EXPECT_EQ(c.warnings.size(), recorder.Lines().size());
+    EXPECT_EQ(section.size() - 3, eit.iSectionLength);
+    EXPECT_EQ(c.ids, EventIds(eit));
+    std::vector<int> lengths;
+    for (int i = 0; i < eit.GetEventCount(); ++i) lengths.push_back(eit.GetEventInfo(i)->iDescriptorsLoopLength);
+    EXPECT_EQ(c.loopLengths, lengths);
+  }
+  EXPECT_EQ(15u, EitSection(EitOptions(), Bytes()).size() - 3);
+}
+
+TEST(EITParse, ConstructedOverNullIsEmptyAndReparseReplaces) {
+  RavelCEIT eit(nullptr);
+  EXPECT_EQ(0, eit.GetEventCount());
+  EXPECT_EQ(0, eit.iTableId);
+  EXPECT_EQ(0, eit.iEITTableId);
+  EXPECT_TRUE(eit.sTableName.IsEmpty());
+  EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
+
+  Bytes first = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(2, At(2020, 4, 5, 19, 30))});
+  EitOptions secondOptions;
+  secondOptions.tableId = 0x60;
+  secondOptions.transportStreamId = 0x0001;
+  Bytes second = EitSection(secondOptions, {Ev(9, At(2020, 4, 6, 0, 0))});
+  EXPECT_EQ(kRavelOk, eit.ParseRawData(first.data()));
+  EXPECT_EQ((std::vector<int>{1, 2}), EventIds(eit));
+  EXPECT_EQ(kRavelOk, eit.ParseRawData(second.data()));
+  EXPECT_EQ((std::vector<int>{9}), EventIds(eit));
+  EXPECT_EQ(0x0001, eit.iTransportStreamId);
+  EXPECT_STREQ("EIT schedule Other", eit.sTableName.GetString());
+}
+
+// ---------------------------------------------------------------------------
+// Merge
+
+TEST(EITMerge, JoinsMatchingTablesSortedByStartTimeKeepingTiesInOrder) {
+  struct Case {
+    const char* label;
+    std::vector<EventRecord> mine;
+    std::vector<EventRecord> theirs;
+    std::vector<int> ids;
+  } cases[] = {
+      {"out of order across sections",
+       {Ev(3, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
+       {Ev(2, At(2020, 4, 5, 20, 0)), Ev(0, At(2020, 4, 5, 18, 0))},
+       {0, 1, 2, 3}},
+      {"ties: held events before appended ones, each in its order",
+       {Ev(10, At(2020, 4, 5, 20, 0)), Ev(11, At(2020, 4, 5, 20, 0)), Ev(12, At(2020, 4, 5, 19, 0))},
+       {Ev(20, At(2020, 4, 5, 20, 0)), Ev(21, At(2020, 4, 5, 19, 0)), Ev(22, At(2020, 4, 5, 20, 0))},
+       {12, 21, 10, 11, 20, 22}},
+      {"the first of a month sorts as day 32 of the month before",
+       {Ev(1, At(2013, 3, 1, 0, 0)), Ev(2, At(2013, 2, 28, 23, 0))},
+       {Ev(3, At(2013, 3, 2, 0, 0))},
+       {2, 1, 3}},
+      {"seconds decide", {Ev(1, At(2020, 4, 5, 19, 0, 2))}, {Ev(2, At(2020, 4, 5, 19, 0, 1))}, {2, 1}},
+      {"empty other: the held events are sorted",
+       {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
+       {},
+       {1, 2}},
+      {"empty target", {}, {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {1, 2}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    EitOptions mineOptions;
+    EitOptions theirOptions;
+    // Table_id, service_id and section numbers are not compared.
+    theirOptions.tableId = 0x4F;
+    theirOptions.serviceId = 0x4801;
+    theirOptions.sectionNumber = 1;
+    theirOptions.segmentLastSectionNumber = 7;
+    Bytes a = EitSection(mineOptions, c.mine);
+    Bytes b = EitSection(theirOptions, c.theirs);
+    RavelCEIT target(a.data());
+    RavelCEIT other(b.data());
+    TraceRecorder recorder;
+    RavelCEIT& result = (target += other);
+    EXPECT_EQ(&target, &result);
+    EXPECT_TRUE(recorder.Lines().empty());
+    EXPECT_EQ(c.ids, EventIds(target));
+    EXPECT_EQ(static_cast<int>(c.theirs.size()), other.GetEventCount());
+    EXPECT_EQ(0x4E, target.iTableId);
+    EXPECT_EQ(0x4800, target.iTableIdExtension);
+    EXPECT_EQ(1, target.iSegmentLastSectionNumber);
+  }
+}
+
+TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
+  struct Case {
+    const char* label;
+    uint16_t transportStreamId;
+    uint16_t originalNetworkId;
+    uint8_t version;
+  } cases[] = {
+      {"transport stream", 0x7ED2, 0x7ED1, 4},
+      {"original network", 0x7ED0, 0x0001, 4},
+      {"version", 0x7ED0, 0x7ED1, 5},
+  };
+  Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    EitOptions options;
+    options.transportStreamId = c.transportStreamId;
+    options.originalNetworkId = c.originalNetworkId;
+    options.version = c.version;
+    Bytes b = EitSection(options, {Ev(0, At(2020, 4, 5, 18, 0))});
+    RavelCEIT target(a.data());
+    RavelCEIT other(b.data());
+    TraceRecorder recorder;
+    target += other;
+    char otherLine[96];
+    snprintf(otherLine, sizeof(otherLine), "OTHER: TS ID=[%d], Org Network ID=[%d], VersionNum=[%d]\n",
+             c.transportStreamId, c.originalNetworkId, c.version);
+    EXPECT_EQ((TraceLines{{kError, "Two EIT Information have different information!\n"},
+                          {kError, "THIS: TS ID=[32464], Org Network ID=[32465], VersionNum=[4]\n"},
+                          {kError, otherLine}}),
+              recorder.Lines());
+    EXPECT_EQ((std::vector<int>{2, 1}), EventIds(target));  // not even sorted
+  }
+}
+
+TEST(EITMerge, TheSameSectionTwiceDoublesItsEvents) {
+  Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
+  RavelCEIT target(a.data());
+  RavelCEIT again(a.data());
+  target += again;
+  EXPECT_EQ((std::vector<int>{1, 1, 2, 2}), EventIds(target));
+  target += target;  // the count is taken before appending
+  EXPECT_EQ((std::vector<int>{1, 1, 1, 1, 2, 2, 2, 2}), EventIds(target));
+
+  // Merged events are copies: the other table can go.
+  Bytes withText = EitSection(EitOptions(), {Ev(3, At(2020, 4, 5, 18, 0), {ShortEvent("kept"), AudioComponent(9)})});
+  std::unique_ptr<RavelCEIT> other(new RavelCEIT(withText.data()));
+  target += *other;
+  other.reset();
+  EXPECT_EQ("short:kept audio:9 ", Holdings(*target.GetEventInfo(0)));
+}
+
+// ---------------------------------------------------------------------------
+// Copies
+
+TEST(EITCopy, DeepCopiesWithoutTheTableIdCopyAndSelfAssignmentEmpties) {
+  EitOptions options;
+  options.tableId = 0x4F;
+  options.serviceId = 0x4801;
+  options.version = 19;
+  options.lastTableId = 0x4F;
+  Bytes section = EitSection(options, {Ev(1, At(2020, 4, 5, 19, 0), {ShortEvent("One"), AudioComponent(0x10)}),
+                                       Ev(2, At(2020, 4, 5, 19, 30), {ExtendedEvent(0, 0, "Two")})});
+  Bytes otherSection = EitSection(EitOptions(), {Ev(7, At(2020, 1, 1, 0, 0))});
+  std::unique_ptr<RavelCEIT> source(new RavelCEIT(section.data()));
+  source->iSession = 0x42;
+
+  RavelCEIT constructed(*source);
+  RavelCEIT assigned(otherSection.data());
+  assigned = *source;
+  source.reset();
+  struct Case {
+    const char* label;
+    RavelCEIT* copy;
+    int eitTableId;
+  } cases[] = {{"copy constructor", &constructed, 0x00}, {"assignment keeps its own", &assigned, 0x4E}};
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    EXPECT_EQ(c.eitTableId, c.copy->iEITTableId);
+    EXPECT_EQ(0x42, c.copy->iSession);
+    EXPECT_EQ(0x4F, c.copy->iTableId);
+    EXPECT_EQ(0x4801, c.copy->iTableIdExtension);
+    EXPECT_EQ(19, c.copy->iVersionNumber);
+    EXPECT_EQ(1, c.copy->iLastSectionNumber);
+    EXPECT_EQ(section.size() - 3, c.copy->iSectionLength);
+    EXPECT_STREQ("EIT Other", c.copy->sTableName.GetString());
+    EXPECT_EQ((std::vector<unsigned int>{0x7ED0, 0x7ED1, 1, 0x4F}), FourFields(*c.copy));
+    ASSERT_EQ((std::vector<int>{1, 2}), EventIds(*c.copy));
+    EXPECT_EQ("short:One audio:16 ", Holdings(*c.copy->GetEventInfo(0)));
+    EXPECT_EQ("extended:0 ", Holdings(*c.copy->GetEventInfo(1)));
+  }
+
+  RavelCEIT& alias = assigned;
+  assigned = alias;
+  EXPECT_EQ(0, assigned.GetEventCount());
+  EXPECT_EQ(0x4801, assigned.iTableIdExtension);
+  EXPECT_EQ(0x7ED0, assigned.iTransportStreamId);
+}
+
+// ---------------------------------------------------------------------------
+// Dump
+
+namespace {
+
+// The dump lines of a descriptor built over the same bytes.
+template <class Descriptor>
+TraceLines DescriptorDump(unsigned char* raw) {
+  Descriptor d(raw);
+  TraceRecorder recorder;
+  d.Show();
+  return recorder.Lines();
+}
+
+// Offsets of the descriptors of the first event of a section, by tag (in order).
+std::multimap<int, size_t> DescriptorOffsets(const Bytes& section) {
+  std::multimap<int, size_t> offsets;
+  size_t at = 14 + 12;
+  size_t end = at + RavelRead12(&section[14 + 10]);
+  while (at < end) {
+    offsets.insert({section[at], at});
+    at += 2 + section[at + 1];
+  }
+  return offsets;
+}
+
+void Add(TraceLines& lines, const std::string& text) { lines.push_back({kDump, text}); }
+void Add(TraceLines& lines, const TraceLines& more) { lines.insert(lines.end(), more.begin(), more.end()); }
+
+}  // namespace
+
+TEST(EITShow, DumpsHeaderBodyEventsAndDescriptorsInAFixedOrder) {
+  EitOptions options;
+  options.serviceId = 0x4801;
+  options.version = 19;
+  options.lastTableId = 0x4F;
+  // Wire order differs from dump order; the audio components keep theirs.
+  Bytes section =
+      EitSection(options, {EventRecord{0x0EDD,
+                                       At(2013, 1, 1, 19, 0),
+                                       Duration(1, 30, 9),
+                                       4,
+                                       1,
+                                       {Series(12, "Ser"), AudioComponent(0x11), ExtendedEvent(0, 0, "Ext"),
+                                        Copyright(7), AudioComponent(0x10), ParentalRating(0x03), Component(0x00),
+                                        Content(0x10), ShortEvent("Name", "Text"), DigitalCopyControl()}},
+                           Ev(0x0EDE, At(2013, 1, 2, 0, 0))});
+  std::multimap<int, size_t> at = DescriptorOffsets(section);
+  auto raw = [&](int tag, int nth) {
+    auto it = at.lower_bound(tag);
+    std::advance(it, nth);
+    return section.data() + it->second;
+  };
+  TraceLines shortEvent = DescriptorDump<RavelCShortEventDescriptor>(raw(0x4D, 0));
+  TraceLines content = DescriptorDump<RavelCContentDescriptor>(raw(0x54, 0));
+  TraceLines component = DescriptorDump<RavelCComponentDescriptor>(raw(0x50, 0));
+  TraceLines rating = DescriptorDump<RavelCParentalRatingDescriptor>(raw(0x55, 0));
+  TraceLines audio11 = DescriptorDump<RavelCAudioComponentDescriptor>(raw(0xC4, 0));
+  TraceLines audio10 = DescriptorDump<RavelCAudioComponentDescriptor>(raw(0xC4, 1));
+  TraceLines copyright = DescriptorDump<RavelCCopyrightDescriptor>(raw(0x0D, 0));
+  TraceLines extended = DescriptorDump<RavelCExtendedEventDescriptor>(raw(0x4E, 0));
+  TraceLines series = DescriptorDump<RavelCSeriesDescriptor>(raw(0xD5, 0));
+  ASSERT_NE(audio10, audio11);
+
+  RavelCEIT eit(section.data());
+  TraceRecorder recorder;
+  eit.Show();
+
+  TraceLines expected;
+  Add(expected, kRule);
+  Add(expected, "###################### EIT Table Information ######################\n");
+  Add(expected, kRule);
+  Add(expected, "####################### Header Information ########################\n");
+  Add(expected, "Session = [0x00], Talbe identifier=[0x4e], Table Name=[EIT Actual]\n");
+  char line[128];
+  snprintf(line, sizeof(line), "Section syntax indicator=[1], Section length=[%d], Any Identifier(?)=[0x4801]\n",
+           static_cast<int>(section.size() - 3));
+  Add(expected, line);
+  Add(expected, "Version number=[19], Current next indicator=[1], Section numbe=[0], Last section number=[1]\n");
+  Add(expected, "# Body Information\n");
+  Add(expected, "Transport Stream ID = [0x7ed0]\n");
+  Add(expected, "Original Network ID = [0x7ed1]\n");
+  Add(expected, "Segment Last Section Num=[1]\n");
+  Add(expected, "Last Table ID=[79]\n");
+  Add(expected, "##################### Event Information [0] #####################\n");
+  Add(expected, "Event Id=[3805]\n");
+  Add(expected, "Start Time=[2012.12.32 - 19:0:0]\n");
+  Add(expected, "Duration=[1:30:9]\n");
+  Add(expected, "Running Status=[4]\n");
+  Add(expected, "FreeCAMode=[1]\n");
+  snprintf(line, sizeof(line), "Descriptors Loop Len=[%d]\n", eit.GetEventInfo(0)->iDescriptorsLoopLength);
+  Add(expected, line);
+  for (const TraceLines* part :
+       {&shortEvent, &content, &component, &rating, &audio11, &audio10, &copyright, &extended, &series}) {
+    Add(expected, *part);
+  }
+  Add(expected, "##################### Event Information [1] #####################\n");
+  Add(expected, "Event Id=[3806]\n");
+  Add(expected, "Start Time=[2013.1.2 - 0:0:0]\n");
+  Add(expected, "Duration=[0:30:0]\n");
+  Add(expected, "Running Status=[4]\n");
+  Add(expected, "FreeCAMode=[0]\n");
+  Add(expected, "Descriptors Loop Len=[0]\n");
+  Add(expected, kRule);
+  EXPECT_EQ(expected, recorder.Lines());
+}
+
+TEST(EITShow, EmptyTableShowsAnUnknownName) {
+  RavelCEIT eit(nullptr);
+  TraceRecorder recorder;
+  eit.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, kRule},
+                {kDump, "###################### EIT Table Information ######################\n"},
+                {kDump, kRule},
+                {kDump, "####################### Header Information ########################\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[Unknown]\n"},
+                {kDump, "Section syntax indicator=[0], Section length=[0], Any Identifier(?)=[0x0000]\n"},
+                {kDump, "Version number=[0], Current next indicator=[0], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, "# Body Information\n"},
+                {kDump, "Transport Stream ID = [0x0000]\n"},
+                {kDump, "Original Network ID = [0x0000]\n"},
+                {kDump, "Segment Last Section Num=[0]\n"},
+                {kDump, "Last Table ID=[0]\n"},
+                {kDump, kRule},
+            }),
+            recorder.Lines());
+}
+
+// ---------------------------------------------------------------------------
+// Real broadcasts
+
+TEST(EITCapture, JapanesePresentFollowingSections) {
+  Bytes file;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", file);
+  std::vector<Bytes> eits;
+  for (const Bytes& s : captures::SplitSections(file)) {
+    if (s[0] == 0x4E) eits.push_back(s);
+  }
+  ASSERT_EQ(4u, eits.size());
+
+  const std::string name0 = HexToText("0e4e484b1d4b1d65f91d39370f1b243b7a5a7a56");
+  const std::string name1 = HexToText(
+      "1d40f91b6f262373ac0f4d68bf212afb47484d70ce1b7ce9a4aaf333583160194b4078467e212a49343d43194e322619724d5c402e212a21"
+      "2afc1b243b7a5c7a56");
+  // The content descriptor reports its genres; 0xC1, 0xC7 and 0xD6 are not kept.
+  const std::vector<std::string> notKept = {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
+                                            "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xc7]\n",
+                                            "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xd6]\n"};
+  std::vector<std::string> genresA = {"raw genre = 0x0!\n", "raw genre = 0x1!\n", "raw genre = 0x10!\n"};
+  std::vector<std::string> genresB = {"raw genre = 0x82!\n", "raw genre = 0xa0!\n"};
+  genresA.insert(genresA.end(), notKept.begin(), notKept.end());
+  genresB.insert(genresB.end(), notKept.begin(), notKept.end());
+  struct Case {
+    unsigned int serviceId;
+    int version;
+    int sectionNumber;
+    int eventId;
+    Ints start;
+    int runningStatus;
+    std::string name;
+    int extendedNumbers;  // descriptor_number << 4 | last_descriptor_number; -1: none
+    std::vector<int> audioTags;
+    std::vector<std::string> warnings;
+  } cases[] = {
+      {0x4800, 4, 0, 0x0EDD, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, 0, name0, 0x00, {0x10}, genresA},
+      // Three extended event descriptors (numbers 0 to 2): the last one is kept.
+      {0x4800, 4, 1, 0x0EDE, {2020, 4, 5, 19, 30, 0, 0, 0, 0}, 0, name1, 0x22, {0x10, 0x11}, genresB},
+      {0x4801, 19, 0, 0x0EDD, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, 0, name0, -1, {0x10}, genresA},
+      {0x4801, 19, 1, 0x0EDE, {2020, 4, 5, 19, 30, 0, 0, 0, 0}, 0, name1, -1, {0x10, 0x11}, genresB},
+  };
+  for (size_t i = 0; i < eits.size(); ++i) {
+    const Case& c = cases[i];
+    SCOPED_TRACE(i);
+    RavelCEIT eit(nullptr);
+    TraceRecorder recorder;
+    ASSERT_EQ(kRavelOk, eit.ParseRawData(eits[i].data()));
+    TraceLines expected;
+    for (const std::string& w : c.warnings) expected.push_back({kWarning, w});
+    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_STREQ("EIT Actual", eit.sTableName.GetString());
+    EXPECT_EQ(c.serviceId, eit.iTableIdExtension);
+    EXPECT_EQ(c.version, eit.iVersionNumber);
+    EXPECT_EQ(c.sectionNumber, eit.iSectionNumber);
+    EXPECT_EQ((std::vector<unsigned int>{0x7ED0, 0x7ED0, 1, 0x4E}), FourFields(eit));
+    ASSERT_EQ(1, eit.GetEventCount());
+    RavelCEventInfo* e = eit.GetEventInfo(0);
+    EXPECT_EQ(c.eventId, e->iEventId);
+    EXPECT_EQ(c.start, TimeOf(e->cStartTime));
+    EXPECT_EQ((Ints{0, 30, 0}), (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond}));
+    EXPECT_EQ(c.runningStatus, e->iRunningStatus);
+    EXPECT_EQ(0, e->bFreeCAMode);
+    ASSERT_NE(nullptr, e->pShortEventDescriptor);
+    EXPECT_EQ(c.name, Str(e->pShortEventDescriptor->GetEventName()));
+    EXPECT_STREQ("jpn", e->pShortEventDescriptor->GetLanguageCode());
+    if (c.extendedNumbers < 0) {
+      EXPECT_EQ(nullptr, e->pExtendedEventDescriptor);
+    } else {
+      ASSERT_NE(nullptr, e->pExtendedEventDescriptor);
+      EXPECT_EQ(c.extendedNumbers >> 4, e->pExtendedEventDescriptor->GetDescriptorNumber());
+      EXPECT_EQ(c.extendedNumbers & 0x0F, e->pExtendedEventDescriptor->GetLastDescriptorNumber());
+    }
+    std::vector<int> audioTags;
+    for (int a = 0; a < e->GetAudioComponentCount(); ++a)
+      audioTags.push_back(e->GetAudioComponent(a)->GetComponentTag());
+    EXPECT_EQ(c.audioTags, audioTags);
+    EXPECT_NE(nullptr, e->pComponentDescriptor);
+    EXPECT_NE(nullptr, e->pContentDescriptor);
+    EXPECT_EQ(nullptr, e->pSeriesDescriptor);  // 0xD5 is not broadcast here
+  }
+
+  // Present and following of one service join into one sorted table; the other
+  // service's version differs.
+  RavelCEIT following(eits[1].data());
+  RavelCEIT present(eits[0].data());
+  following += present;
+  EXPECT_EQ((std::vector<int>{0x0EDD, 0x0EDE}), EventIds(following));
+  RavelCEIT otherService(eits[2].data());
+  TraceRecorder recorder;
+  following += otherService;
+  EXPECT_EQ(3u, recorder.TextsAt(kError).size());
+  EXPECT_EQ(2, following.GetEventCount());
+}
+
+TEST(EITCapture, DvbEpgSectionsParseExceptTheCorruptOne) {
+  Bytes stream;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("dvb-epg.ts", stream);
+  std::vector<Bytes> sections;
+  RavelCTSPktStore store;
+  for (const Bytes& packet : captures::PacketsOfPid(stream, 0x12)) {
+    RavelCSectionData out;
+    store.AddTSPacket(packet.data(), out);
+    for (int i = 0; i < out.iSectionCount; ++i) {
+      sections.push_back(Bytes(out.pSection[i], out.pSection[i] + out.iSectionSize[i]));
+    }
+  }
+
+  std::map<std::pair<int, int>, int> results;  // (table_id, result) -> sections
+  TraceRecorder recorder;
+  for (size_t i = 0; i < sections.size(); ++i) {
+    Bytes& section = sections[i];
+    bool goodCrc = RavelUtil_CheckSectionCRC32(section.data()) != 0;
+    RavelCEIT eit(nullptr);
+    int result = eit.ParseRawData(section.data());
+    EXPECT_EQ(goodCrc ? kRavelOk : kRavelErrCorruptSection, result) << "section " << i;
+    ++results[{section[0], result}];
+  }
+  EXPECT_EQ((std::map<std::pair<int, int>, int>{{{0x4E, kRavelOk}, 597},
+                                                {{0x4E, kRavelErrCorruptSection}, 1},
+                                                {{0x4F, kRavelOk}, 636},
+                                                {{0x50, kRavelOk}, 205}}),
+            results);
+  // DVB descriptors the receiver does not keep are traced and skipped; the one
+  // CRC error is the only failure.
+  EXPECT_TRUE(recorder.TextsAt(kError).empty());
+  int crcErrors = 0;
+  for (const std::string& t : recorder.TextsAt(kWarning)) {
+    if (t == "EIT Section: CRC Error!\n") ++crcErrors;
+    EXPECT_EQ(std::string::npos, t.find("Parsing Fail"));
+    EXPECT_EQ(std::string::npos, t.find("Invalid Descriptor"));
+  }
+  EXPECT_EQ(1, crcErrors);
+
+  // The first section: EIT other of service 0x0A02, its first event as broadcast
+  // (the name starts with its DVB character table byte 0x05).
+  RavelCEIT first(sections[0].data());
+  ASSERT_GT(first.GetEventCount(), 0);
+  RavelCEventInfo* e = first.GetEventInfo(0);
+  EXPECT_STREQ("EIT Other", first.sTableName.GetString());
+  EXPECT_EQ(0x0A02, first.iTableIdExtension);
+  EXPECT_EQ(0x15, e->iEventId);
+  EXPECT_EQ((Ints{2019, 1, 22, 12, 0, 0, 0, 0, 0}), TimeOf(e->cStartTime));
+  EXPECT_EQ((Ints{1, 45, 0}), (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond}));
+  ASSERT_NE(nullptr, e->pShortEventDescriptor);
+  EXPECT_STREQ("fre", e->pShortEventDescriptor->GetLanguageCode());
+  EXPECT_EQ(std::string("\x05"
+                        "Biathlon"),
+            Str(e->pShortEventDescriptor->GetEventName()));
+}

@@ -1,0 +1,563 @@
+// Network information table and its transport streams.
+#include <gtest/gtest.h>
+
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <utility>
+#include <vector>
+
+#include "Captures.h"
+#include "Ravel_CTableNIT.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kWarning = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+using sb::Cat;
+using sb::Descriptor;
+using sb::Length12;
+using sb::Text;
+using sb::U16;
+using sb::U8;
+
+const char kInvalidFormat[] = "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n";
+const char kInfoFail[] = "NIT Info Parsing Fail! Maybe data has been corrupted!\n";
+
+std::string Invalid(int tag, int length) {
+  char text[128];
+  std::snprintf(text, sizeof(text), kInvalidFormat, tag, length);
+  return text;
+}
+
+// Descriptors of the network loop.
+Bytes NetworkName(const std::string& name) { return Descriptor(0x40, Text(name)); }
+Bytes SystemManagement(uint8_t id, uint8_t additional) { return Descriptor(0xFE, Bytes{id, additional}); }
+Bytes Linkage(unsigned int tsid, unsigned int onid, unsigned int sid, uint8_t type) {
+  return Descriptor(0x4A, Cat({U16(tsid), U16(onid), U16(sid), U8(type)}));
+}
+
+// Descriptors of a transport stream.
+Bytes ServiceList(const std::vector<std::pair<unsigned int, uint8_t>>& services) {
+  Bytes body;
+  for (const auto& s : services) sb::Append(body, Cat({U16(s.first), U8(s.second)}));
+  return Descriptor(0x41, body);
+}
+Bytes TerrDelivery(unsigned int areaCode, uint8_t guard, uint8_t mode, const std::vector<unsigned int>& freqs) {
+  Bytes body = U16((areaCode << 4) | (guard << 2) | mode);
+  for (unsigned int f : freqs) sb::Append(body, U16(f));
+  return Descriptor(0xFA, body);
+}
+Bytes PartialReception(const std::vector<unsigned int>& serviceIds) {
+  Bytes body;
+  for (unsigned int id : serviceIds) sb::Append(body, U16(id));
+  return Descriptor(0xFB, body);
+}
+// TS information without transmission type records.
+Bytes TSInformation(uint8_t key, const std::string& name) {
+  return Descriptor(0xCD, Cat({U8(key), U8(static_cast<uint8_t>(name.size() << 2)), Text(name)}));
+}
+
+Bytes TsEntry(unsigned int tsid, unsigned int onid, const std::vector<Bytes>& descriptors) {
+  return Cat({U16(tsid), U16(onid), sb::DescriptorLoop(descriptors)});
+}
+
+Bytes NitBody(const std::vector<Bytes>& networkDescriptors, const std::vector<Bytes>& entries) {
+  Bytes streams = Cat(entries);
+  return Cat({sb::DescriptorLoop(networkDescriptors), Length12(static_cast<unsigned int>(streams.size())), streams});
+}
+
+Bytes NitSection(const Bytes& body, uint8_t tableId = 0x40, uint8_t version = 1, uint8_t sectionNumber = 0) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = 0x7FE1;  // network_id
+  options.version = version;
+  options.sectionNumber = sectionNumber;
+  options.lastSectionNumber = 1;
+  return sb::LongSection(options, body);
+}
+
+// One line per transport stream with what it holds.
+std::string Summary(RavelCTSInfo& ts) {
+  char text[160];
+  std::snprintf(text, sizeof(text), "tsid=0x%04x onid=0x%04x len=%d", ts.iTransportStreamId, ts.iOriginalNetworkId,
+                ts.iTransportDescriptorsLength);
+  std::string s = text;
+  if (ts.pServiceList) s += " services=" + std::to_string(ts.pServiceList->GetServiceCount());
+  if (ts.pTSInformation) s += std::string(" tsname=") + ts.pTSInformation->GetTsName();
+  if (ts.pTerrDeliverySystem) s += " freqs=" + std::to_string(ts.pTerrDeliverySystem->GetFrequencyCount());
+  if (ts.pPartialReception) s += " partial=" + std::to_string(ts.pPartialReception->GetServiceIdCount());
+  return s;
+}
+
+std::vector<std::string> Streams(RavelCNIT& nit) {
+  std::vector<std::string> list;
+  for (int i = 0; i < nit.GetTSInfoCount(); ++i) list.push_back(Summary(*nit.GetTSInfo(i)));
+  return list;
+}
+
+// The network descriptors held: "name=..|-", "linkage=sid|-", "sm=id|-".
+std::string NetworkSummary(RavelCNIT& nit) {
+  std::string s = nit.pNetworkName ? std::string("name=") + nit.pNetworkName->GetNetworkName() : "name -";
+  s += nit.pLinkage ? " linkage=" + std::to_string(nit.pLinkage->GetServiceId()) : " linkage -";
+  s += nit.pSystemManagement ? " sm=" + std::to_string(nit.pSystemManagement->GetBroadcastingIdentifier()) : " sm -";
+  return s;
+}
+
+const Bytes kStreamA = TsEntry(0x0001, 0x7FE1, {ServiceList({{0xE760, 0x01}, {0xE761, 0xC0}}), TerrDelivery(0x591, 3, 2, {0x0C68})});
+const Bytes kStreamB = TsEntry(0x0002, 0x7FE2, {PartialReception({0xE761}), TSInformation(0x05, "Ch")});
+const Bytes kStreamEmpty = TsEntry(0x0003, 0x7FE3, {});
+const char kSummaryA[] = "tsid=0x0001 onid=0x7fe1 len=14 services=2 freqs=1";
+const char kSummaryB[] = "tsid=0x0002 onid=0x7fe2 len=10 tsname=Ch partial=1";
+const char kSummaryEmpty[] = "tsid=0x0003 onid=0x7fe3 len=0";
+
+}  // namespace
+
+TEST(NITParse, KeepsTheNetworkAndTransportStreamDescriptorsUnderBothTableIds) {
+  struct Case {
+    uint8_t tableId;
+    const char* name;
+  } cases[] = {{0x40, "NIT Actual"}, {0x41, "NIT Other"}};
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    Bytes section = NitSection(
+        NitBody({NetworkName("Rede"), SystemManagement(0x03, 0x01), Linkage(0x0001, 0x7FE1, 0xE760, 0x09)},
+                {kStreamA, kStreamB}),
+        c.tableId);
+    TraceRecorder recorder;
+    RavelCNIT nit(section.data());
+    EXPECT_TRUE(recorder.Lines().empty());
+    EXPECT_STREQ(c.name, nit.sTableName.GetString());
+    EXPECT_EQ(c.tableId, nit.iTableId);
+    EXPECT_EQ(0x7FE1, nit.iTableIdExtension);
+    EXPECT_EQ("name=Rede linkage=59232 sm=3", NetworkSummary(nit));
+    EXPECT_EQ(0x01, nit.pSystemManagement->GetAdditionalBroadcastingIdentification());
+    EXPECT_EQ(0x09, nit.pLinkage->GetLinkageType());
+    EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Streams(nit));
+    RavelCTSInfo* a = nit.GetTSInfo(0);
+    EXPECT_EQ(0x591, a->pTerrDeliverySystem->GetAreaCode());
+    EXPECT_EQ(0x0C68, a->pTerrDeliverySystem->GetFrequency(0));
+    EXPECT_EQ(0xE7, nit.GetTSInfo(1)->pPartialReception->GetServiceId(0));  // high byte only
+  }
+}
+
+TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
+  Bytes good = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}));
+  sb::SectionOptions bad;
+  bad.tableId = 0x40;
+  bad.corruptCrc = true;
+  Bytes badCrc = sb::LongSection(bad, NitBody({NetworkName("Rede")}, {kStreamA}));
+  Bytes sdtId = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}), 0x42);
+  Bytes patId = NitSection(NitBody({}, {}), 0x00);
+  bad.tableId = 0x46;
+  Bytes bothBad = sb::LongSection(bad, NitBody({}, {}));
+  struct Case {
+    const char* label;
+    Bytes* section;
+    int result;
+    TraceLines traces;
+    const char* name;  // after the call
+  } cases[] = {
+      {"null", nullptr, kRavelErrInvalidArgument, {}, "NIT Actual"},
+      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "NIT Section: CRC Error!\n"}}, "NIT Actual"},
+      {"SDT table_id", &sdtId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for NIT! Table ID=[0x42]\n"}},
+       "NIT Actual"},
+      {"PAT table_id", &patId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for NIT! Table ID=[0x00]\n"}},
+       "NIT Actual"},
+      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
+       {{kWarning, "NIT Section: CRC Error!\n"}}, "NIT Actual"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCNIT nit(good.data());
+    ASSERT_EQ(1, nit.GetTSInfoCount());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, nit.ParseRawData(c.section ? c.section->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
+    EXPECT_EQ(0, nit.GetTSInfoCount());
+    EXPECT_STREQ(c.name, nit.sTableName.GetString());
+    if (c.section != nullptr && c.result == kRavelErrInvalidArgument) {
+      EXPECT_EQ((*c.section)[0], nit.iTableId);  // the header was read
+    }
+  }
+}
+
+TEST(NITParse, ConstructedOverNullIsEmptyAndReparseReplacesEverything) {
+  RavelCNIT empty(nullptr);
+  EXPECT_EQ(0, empty.iTableId);
+  EXPECT_EQ(0, empty.iTableIdExtension);
+  EXPECT_EQ("name - linkage - sm -", NetworkSummary(empty));
+  EXPECT_EQ(0, empty.GetTSInfoCount());
+
+  Bytes first = NitSection(NitBody({NetworkName("Rede"), Linkage(1, 2, 3, 4)}, {kStreamA, kStreamB}));
+  Bytes second = NitSection(NitBody({SystemManagement(0x02, 0x00)}, {kStreamEmpty}), 0x41, 4);
+  RavelCNIT nit(first.data());
+  EXPECT_EQ(kRavelOk, nit.ParseRawData(second.data()));
+  EXPECT_EQ("name - linkage - sm=2", NetworkSummary(nit));
+  EXPECT_EQ((std::vector<std::string>{kSummaryEmpty}), Streams(nit));
+  EXPECT_EQ(4, nit.iVersionNumber);
+  EXPECT_STREQ("NIT Other", nit.sTableName.GetString());
+}
+
+TEST(NITNetworkLoop, OnlyTagZeroFailsAndTheLastOfATagWins) {
+  struct Case {
+    const char* label;
+    Bytes body;
+    int result;
+    TraceLines traces;
+    std::string network;
+    int streams;
+  } cases[] = {
+      {"length 0: the stream loop length is read from bytes 10 and 11",
+       Cat({Length12(0), Length12(static_cast<unsigned int>(kStreamA.size())), kStreamA}), kRavelOk, {},
+       "name - linkage - sm -", 1},
+      {"a network name of length 0 is kept empty and the walk moves on by 2",
+       NitBody({Descriptor(0x40, {}), SystemManagement(0x05, 0)}, {kStreamA}), kRavelOk, {},
+       "name= linkage - sm=5", 1},
+      {"tag 0 fails the section and drops what was read before it",
+       NitBody({NetworkName("Rede"), Descriptor(0x00, {0x01, 0x02})}, {kStreamA}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0x00, 2)}}, "name - linkage - sm -", 0},
+      {"tag 0 and length 0", NitBody({SystemManagement(1, 1), Descriptor(0x00, {})}, {kStreamA}),
+       kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 0)}}, "name - linkage - sm -", 0},
+      {"an unknown tag is traced and skipped",
+       NitBody({Descriptor(0xC1, {0x01}), NetworkName("Rede")}, {kStreamA}), kRavelOk,
+       {{kWarning, "NIT Body Parsing.. Unkown Descriptor Tag=[0xc1]\n"}}, "name=Rede linkage - sm -", 1},
+      {"two network names leave the second",
+       NitBody({NetworkName("first"), NetworkName("second")}, {kStreamA}), kRavelOk, {},
+       "name=second linkage - sm -", 1},
+      {"two linkages and two system managements leave the second of each",
+       NitBody({Linkage(1, 1, 10, 0), SystemManagement(1, 0), Linkage(1, 1, 20, 0), SystemManagement(2, 0)},
+               {kStreamA}),
+       kRavelOk, {}, "name - linkage=20 sm=2", 1},
+      {"the stream loop length follows a descriptor that runs past the network loop",
+       Cat({Length12(2), NetworkName("abc"), Length12(static_cast<unsigned int>(kStreamA.size())), kStreamA}),
+       kRavelOk, {}, "name=abc linkage - sm -", 1},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = NitSection(c.body);
+    TraceRecorder recorder;
+    RavelCNIT nit(nullptr);
+    EXPECT_EQ(c.result, nit.ParseRawData(section.data()));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.network, NetworkSummary(nit));
+    EXPECT_EQ(c.streams, nit.GetTSInfoCount());
+    EXPECT_STREQ("NIT Actual", nit.sTableName.GetString());
+  }
+}
+
+TEST(NITTransportStreamLoop, BoundedByItsOwnLengthAndFailedByAnyMalformedDescriptor) {
+  Bytes badTag = TsEntry(0x0009, 0x7FE9, {ServiceList({{1, 1}}), Descriptor(0x00, {0xAA})});
+  Bytes badLength = TsEntry(0x0009, 0x7FE9, {Descriptor(0x41, {})});
+  struct Case {
+    const char* label;
+    Bytes body;
+    int result;
+    TraceLines traces;
+    std::vector<std::string> streams;
+    bool networkNameKept;
+  } cases[] = {
+      {"entries in section order", NitBody({NetworkName("N")}, {kStreamA, kStreamB}), kRavelOk, {},
+       {kSummaryA, kSummaryB}, true},
+      {"loop length 0 gives no streams whatever section_length says",
+       Cat({sb::DescriptorLoop({NetworkName("N")}), Length12(0), kStreamA}), kRavelOk, {}, {}, true},
+      {"the loop length, not section_length, ends the loop",
+       Cat({sb::DescriptorLoop({NetworkName("N")}), Length12(static_cast<unsigned int>(kStreamA.size())), kStreamA,
+            kStreamB}),
+       kRavelOk, {}, {kSummaryA}, true},
+      {"the end counts from the length field: an entry that starts in the last two declared bytes is not read",
+       Cat({sb::DescriptorLoop({NetworkName("N")}), Length12(static_cast<unsigned int>(kStreamA.size() + 2)), kStreamA,
+            kStreamB}),
+       kRavelOk, {}, {kSummaryA}, true},
+      {"an entry without descriptors takes 6 bytes", NitBody({NetworkName("N")}, {kStreamEmpty, kStreamA}),
+       kRavelOk, {}, {kSummaryEmpty, kSummaryA}, true},
+      {"an unknown tag in an entry is traced and the walk goes on",
+       NitBody({NetworkName("N")}, {TsEntry(0x0004, 0x7FE4, {Descriptor(0xC0, {0x01}), ServiceList({{5, 1}})})}),
+       kRavelOk, {{kWarning, "NIT TSInfo Parsing.. Unkown Descriptor Tag=[0xc0]\n"}},
+       {"tsid=0x0004 onid=0x7fe4 len=8 services=1"}, true},
+      {"two service lists leave the second",
+       NitBody({NetworkName("N")}, {TsEntry(0x0004, 0x7FE4, {ServiceList({{5, 1}}), ServiceList({{6, 1}, {7, 1}})})}),
+       kRavelOk, {}, {"tsid=0x0004 onid=0x7fe4 len=13 services=2"}, true},
+      {"tag 0 in an entry fails the whole section", NitBody({NetworkName("N")}, {kStreamA, badTag}),
+       kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}, {kWarning, kInfoFail}}, {}, false},
+      {"length 0 in an entry fails the whole section, unlike in the network loop",
+       NitBody({NetworkName("N")}, {kStreamA, kStreamB, badLength}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0x41, 0)}, {kWarning, kInfoFail}}, {}, false},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = NitSection(c.body);
+    RavelCNIT nit(nullptr);
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, nit.ParseRawData(section.data()));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.streams, Streams(nit));
+    EXPECT_EQ(c.networkNameKept, nit.pNetworkName != nullptr);
+  }
+}
+
+TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
+  Bytes full = TsEntry(0x0001, 0x7FE1,
+                       {ServiceList({{1, 1}}), TSInformation(1, "X"), TerrDelivery(1, 0, 0, {}), PartialReception({1})});
+  const std::string fullSummary = "tsid=0x0001 onid=0x7fe1 len=18 services=1 tsname=X freqs=0 partial=1";
+  Bytes zeroLength = Cat({U16(0x0002), U16(0x0003), Length12(7), ServiceList({{1, 1}}), Descriptor(0x40, {})});
+  // A descriptor running past the length is still read whole, and ends the loop.
+  Bytes pastLength = Cat({U16(0x0002), U16(0x0003), Length12(3), ServiceList({{1, 1}}), Descriptor(0x00, {})});
+  struct Case {
+    const char* label;
+    Bytes* entry;
+    int result;
+    TraceLines traces;
+    std::string summary;
+  } cases[] = {
+      {"null clears the scalars", nullptr, kRavelErrInvalidArgument, {}, "tsid=0x0000 onid=0x0000 len=0"},
+      {"an entry without descriptors releases the earlier ones", const_cast<Bytes*>(&kStreamEmpty), kRavelOk, {},
+       kSummaryEmpty},
+      {"length 0 after a good descriptor clears everything", &zeroLength, kRavelErrCorruptSection,
+       {{kWarning, Invalid(0x40, 0)}}, "tsid=0x0000 onid=0x0000 len=0"},
+      {"the loop ends when the bytes consumed reach the length", &pastLength, kRavelOk, {},
+       "tsid=0x0002 onid=0x0003 len=3 services=1"},
+      {"all four kinds", &full, kRavelOk, {}, fullSummary},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCTSInfo ts(full.data());
+    ASSERT_EQ(fullSummary, Summary(ts));
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, ts.ParseRawData(c.entry ? c.entry->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.summary, Summary(ts));
+  }
+}
+
+TEST(NITMerge, SameVersionTakesMissingNetworkDescriptorsAndAppendsStreams) {
+  Bytes alpha = NitSection(NitBody({NetworkName("Alpha")}, {kStreamA, kStreamB}), 0x40, 1, 0);
+  Bytes beta = NitSection(NitBody({NetworkName("Beta"), Linkage(1, 1, 7, 0), SystemManagement(3, 0)}, {kStreamEmpty}),
+                          0x40, 1, 1);
+  Bytes bare = NitSection(NitBody({}, {kStreamEmpty}), 0x40, 1, 1);
+  Bytes nameless = NitSection(NitBody({}, {kStreamB}), 0x40, 1, 0);
+  Bytes delta = NitSection(NitBody({NetworkName("Delta")}, {kStreamEmpty}), 0x40, 2, 1);
+  struct Case {
+    const char* label;
+    Bytes* target;
+    Bytes* other;
+    TraceLines traces;
+    std::string network;
+    std::vector<std::string> streams;
+  } cases[] = {
+      {"another version: a trace and no change", &alpha, &delta,
+       {{kError, "Two NIT Information have different information! first one=[1], second one=[2]\n"}},
+       "name=Alpha linkage - sm -", {kSummaryA, kSummaryB}},
+      {"missing descriptors are taken, a held one is kept", &alpha, &beta, {}, "name=Alpha linkage=7 sm=3",
+       {kSummaryA, kSummaryB, kSummaryEmpty}},
+      {"a target without a network name takes the other's", &nameless, &beta, {}, "name=Beta linkage=7 sm=3",
+       {kSummaryB, kSummaryEmpty}},
+      {"a section without descriptors adds only its streams", &alpha, &bare, {}, "name=Alpha linkage - sm -",
+       {kSummaryA, kSummaryB, kSummaryEmpty}},
+      {"the same section twice doubles its streams", &alpha, &alpha, {}, "name=Alpha linkage - sm -",
+       {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCNIT target(c.target->data());
+    std::unique_ptr<RavelCNIT> other(new RavelCNIT(c.other->data()));
+    const std::string otherNetwork = NetworkSummary(*other);
+    const std::vector<std::string> otherStreams = Streams(*other);
+    TraceRecorder recorder;
+    RavelCNIT& result = (target += *other);
+    EXPECT_EQ(&target, &result);
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(otherNetwork, NetworkSummary(*other));
+    EXPECT_EQ(otherStreams, Streams(*other));
+    other.reset();  // the merged parts are copies
+    EXPECT_EQ(c.network, NetworkSummary(target));
+    EXPECT_EQ(c.streams, Streams(target));
+    EXPECT_EQ((*c.target)[6], target.iSectionNumber);
+    EXPECT_EQ(1, target.iVersionNumber);
+  }
+}
+
+TEST(NITMerge, ATableMergedIntoItselfDoublesOnce) {
+  Bytes section = NitSection(NitBody({NetworkName("Alpha")}, {kStreamA, kStreamB}));
+  RavelCNIT nit(section.data());
+  nit += nit;
+  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB, kSummaryA, kSummaryB}), Streams(nit));
+  EXPECT_EQ("name=Alpha linkage - sm -", NetworkSummary(nit));
+}
+
+TEST(NITCopy, CopiesHeaderNameDescriptorsAndEveryStreamDeeply) {
+  Bytes section = NitSection(
+      NitBody({NetworkName("Rede"), Linkage(1, 2, 3, 4), SystemManagement(3, 1)}, {kStreamA, kStreamB}), 0x41, 9, 1);
+  Bytes other = NitSection(NitBody({NetworkName("Old")}, {kStreamEmpty}));
+  std::unique_ptr<RavelCNIT> source(new RavelCNIT(section.data()));
+  source->iSession = 0x3C;
+  const std::string network = NetworkSummary(*source);
+  const std::vector<std::string> streams = Streams(*source);
+
+  RavelCNIT constructed(*source);
+  RavelCNIT assigned(other.data());
+  assigned = *source;
+  source.reset();
+  for (RavelCNIT* copy : {&constructed, &assigned}) {
+    EXPECT_EQ(network, NetworkSummary(*copy));
+    EXPECT_EQ(streams, Streams(*copy));
+    EXPECT_EQ(0x3C, copy->iSession);
+    EXPECT_EQ(0x41, copy->iTableId);
+    EXPECT_EQ(0x7FE1, copy->iTableIdExtension);
+    EXPECT_EQ(9, copy->iVersionNumber);
+    EXPECT_EQ(1, copy->iSectionNumber);
+    EXPECT_EQ(section.size() - 3, copy->iSectionLength);
+    EXPECT_STREQ("NIT Other", copy->sTableName.GetString());
+  }
+  // The streams are released before the copy: a table assigned to itself keeps
+  // its network descriptors and loses its streams.
+  assigned = assigned;
+  EXPECT_EQ(network, NetworkSummary(assigned));
+  EXPECT_EQ(0, assigned.GetTSInfoCount());
+
+  RavelCTSInfo ts(const_cast<uint8_t*>(kStreamA.data()));
+  RavelCTSInfo tsCopy(ts);
+  RavelCTSInfo tsAssigned(const_cast<uint8_t*>(kStreamB.data()));
+  tsAssigned = ts;
+  ts.ParseRawData(nullptr);
+  EXPECT_EQ(kSummaryA, Summary(tsCopy));
+  EXPECT_EQ(kSummaryA, Summary(tsAssigned));
+}
+
+TEST(NITShow, DumpsHeaderNetworkDescriptorsAndStreamsInTheirOwnOrder) {
+  Bytes section = NitSection(NitBody({SystemManagement(0x03, 0x01), NetworkName("Rede"), Linkage(1, 2, 3, 4)},
+                                     {TsEntry(0x0001, 0x7FE1, {TerrDelivery(0x591, 3, 2, {0x0C68}),
+                                                               PartialReception({0xE761}), TSInformation(0x05, "Ch"),
+                                                               ServiceList({{0xE760, 0x01}})}),
+                                      kStreamEmpty}));
+  RavelCNIT nit(section.data());
+  TraceRecorder recorder;
+  nit.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, "#################################################\n"},
+                {kDump, "#### NIT Table Information\n"},
+                {kDump, "# Header Information\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x40], Table Name=[NIT Actual]\n"},
+                {kDump, "Section syntax indicator=[1], Section length=[65], Any Identifier(?)=[0x7fe1]\n"},
+                {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[1]\n"},
+                {kDump, "# Body Information. [Descriptors]\n"},
+                {kDump, "\t=================== Linkage Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0x4a], Descriptor Length=[7], Name=[Linkage Descriptor]\n"},
+                {kDump, "\tTransportStreamId=[0x0001], OrginalNetworkId=[0x0002], ServiceId=[0x0003], "
+                        "LinkageType=[0x04]\n"},
+                {kDump, "\t=================== Network Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0x40], Descriptor Length=[4], Name=[Network Name Descriptor]\n"},
+                {kDump, "\tNetwork Name=[Rede]\n"},
+                {kDump, "\t=================== System Management Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0xfe], Descriptor Length=[2], Name=[System Management Descriptor]\n"},
+                {kDump, "\tBroadcasting Flag=[0x03], Broadcasting Id=[0x03], Additional Ids=[0x01]\n"},
+                {kDump, "Transport Stream Information. Size=[2]\n"},
+                {kDump, "\tTS Information : TransportStreamId=[0x0001], OrginalNetworkId=[0x7fe1]\n"},
+                {kDump, "\t=================== Service List Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0x41], Descriptor Length=[3], Name=[Service List Descriptor]\n"},
+                {kDump, "\tService List Length=[1]\n"},
+                {kDump, "\t\t[0]th Service Info: Service ID=[0xe760], Service Type=[0x01]\n"},
+                {kDump, "\t=================== TS Information Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0xcd], Descriptor Length=[4], Name=[TS Information Descriptor]\n"},
+                {kDump, "\tRemote Control Key Id=[0x05], Ts Name=[Ch], Tx Type Count=[0]\n"},
+                {kDump, "\t=================== Partial Reception Descriptor =====================\n"},
+                {kDump, "\tDescriptor Tag=[0xfb], Descriptor Length=[2], Name=[Partial Reception Descriptor]\n"},
+                {kDump, "\tService Id [0] = 231\n"},
+                {kDump, "\t=================== Terrestrial Delivery Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0xfa], Descriptor Length=[4], Name=[Terrestrial Delivery System "
+                        "Descriptor]\n"},
+                {kDump, "\tArea Code=[0x0591], Guard Interval=[0x03], Tx Mode=[0x02], Num Of Freq=[1]\n"},
+                {kDump, "\t\tTerrDelSys: Frequency=[3176]\n"},
+                {kDump, "\tTS Information : TransportStreamId=[0x0003], OrginalNetworkId=[0x7fe3]\n"},
+                {kDump, "#################################################\n"},
+            }),
+            recorder.Lines());
+}
+
+TEST(NITShow, AnEmptyTableShowsUnknownAndNoStreams) {
+  RavelCNIT nit(nullptr);
+  TraceRecorder recorder;
+  nit.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, "#################################################\n"},
+                {kDump, "#### NIT Table Information\n"},
+                {kDump, "# Header Information\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[Unknown]\n"},
+                {kDump, "Section syntax indicator=[0], Section length=[0], Any Identifier(?)=[0x0000]\n"},
+                {kDump, "Version number=[0], Current next indicator=[0], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, "# Body Information. [Descriptors]\n"},
+                {kDump, "Transport Stream Information. Size=[0]\n"},
+                {kDump, "#################################################\n"},
+            }),
+            recorder.Lines());
+}
+
+TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialReception) {
+  Bytes contents;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", contents);
+  Bytes* nitSection = nullptr;
+  std::vector<Bytes> sections = captures::SplitSections(contents);
+  for (Bytes& s : sections) {
+    if (s[0] == 0x40) nitSection = &s;
+  }
+  ASSERT_NE(nullptr, nitSection) << "no NIT section in the capture";
+  TraceRecorder recorder;
+  RavelCNIT nit(nitSection->data());
+  EXPECT_TRUE(recorder.Lines().empty());
+  EXPECT_STREQ("NIT Actual", nit.sTableName.GetString());
+  EXPECT_EQ(0x7ED0, nit.iTableIdExtension);
+  EXPECT_EQ(13, nit.iVersionNumber);
+  ASSERT_NE(nullptr, nit.pNetworkName);
+  EXPECT_EQ(std::string("\x3d\x29\x45\x44\x23\x30"), nit.pNetworkName->GetNetworkName());  // broadcast bytes as sent
+  ASSERT_NE(nullptr, nit.pSystemManagement);
+  EXPECT_EQ(0x03, nit.pSystemManagement->GetBroadcastingIdentifier());
+  EXPECT_EQ(0x01, nit.pSystemManagement->GetAdditionalBroadcastingIdentification());
+  EXPECT_EQ(nullptr, nit.pLinkage);
+
+  ASSERT_EQ(1, nit.GetTSInfoCount());
+  RavelCTSInfo* ts = nit.GetTSInfo(0);
+  EXPECT_EQ(0x7ED0, ts->GetTransportStreamId());
+  EXPECT_EQ(0x7ED0, ts->GetOriginalNetworkId());
+  EXPECT_EQ(104, ts->iTransportDescriptorsLength);
+
+  ASSERT_NE(nullptr, ts->pServiceList);
+  std::vector<std::pair<unsigned short, unsigned short>> services;
+  for (int i = 0; i < ts->pServiceList->GetServiceCount(); ++i) {
+    unsigned short id = 0, type = 0;
+    ts->pServiceList->GetServiceInfo(i, id, type);
+    services.push_back({id, type});
+  }
+  EXPECT_EQ((std::vector<std::pair<unsigned short, unsigned short>>{
+                {0x4800, 0x01}, {0x4801, 0x01}, {0x4980, 0xC0}, {0xFFF0, 0xA4}}),
+            services);
+
+  ASSERT_NE(nullptr, ts->pTerrDeliverySystem);
+  EXPECT_EQ(0xAC6, ts->pTerrDeliverySystem->GetAreaCode());
+  EXPECT_EQ(2, ts->pTerrDeliverySystem->GetGuardInterval());
+  EXPECT_EQ(2, ts->pTerrDeliverySystem->GetTransmissionMode());
+  ASSERT_EQ(25, ts->pTerrDeliverySystem->GetFrequencyCount());
+  EXPECT_EQ(0x0D1A, ts->pTerrDeliverySystem->GetFrequency(0));
+  EXPECT_EQ(0x1356, ts->pTerrDeliverySystem->GetFrequency(24));
+
+  ASSERT_NE(nullptr, ts->pPartialReception);
+  ASSERT_EQ(1, ts->pPartialReception->GetServiceIdCount());
+  EXPECT_EQ(0x49, ts->pPartialReception->GetServiceId(0));  // high byte of service 0x4980
+
+  ASSERT_NE(nullptr, ts->pTSInformation);
+  RavelCTSInformationDescriptor* info = ts->pTSInformation;
+  EXPECT_EQ(0x01, info->GetRemoteControlKeyId());
+  EXPECT_EQ(16u, std::string(info->GetTsName()).size());
+  ASSERT_EQ(2, info->GetTransmissionTypeCount());
+  EXPECT_EQ(0x0F, info->GetTxType(0)->GetTransmissionTypeInfo());
+  ASSERT_EQ(3, info->GetTxType(0)->GetNumOfService());
+  EXPECT_EQ(0xFFF0, info->GetTxType(0)->GetServiceId(2));
+  EXPECT_EQ(0xAF, info->GetTxType(1)->GetTransmissionTypeInfo());
+  ASSERT_EQ(1, info->GetTxType(1)->GetNumOfService());
+  EXPECT_EQ(0x4980, info->GetTxType(1)->GetServiceId(0));
+}

@@ -1,0 +1,525 @@
+// Service description table: services, their descriptors, merge, copies and dump.
+#include <gtest/gtest.h>
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "Captures.h"
+#include "Ravel_CTableSDT.h"
+#include "Ravel_ResultCode.h"
+#include "StreamBuilder.h"
+#include "TraceRecorder.h"
+
+namespace {
+
+const unsigned int kDump = 0x10000020u;
+const unsigned int kWarning = 0x40000020u;
+const unsigned int kError = 0x80000020u;
+
+struct ServiceDef {
+  uint16_t serviceId;
+  uint8_t eitUserDefined;  // 3 bits
+  bool schedule, presentFollowing;
+  uint8_t runningStatus;  // 3 bits
+  bool freeCA;
+  std::vector<Bytes> descriptors;
+};
+
+Bytes ServiceEntry(const ServiceDef& s) {
+  Bytes entry = sb::U16(s.serviceId);
+  sb::Append(entry, sb::U8(0xE0 | (s.eitUserDefined << 2) | (s.schedule ? 2 : 0) | (s.presentFollowing ? 1 : 0)));
+  sb::Append(entry, sb::DescriptorLoop(s.descriptors, static_cast<uint8_t>((s.runningStatus << 1) | (s.freeCA ? 1 : 0))));
+  return entry;
+}
+
+// A service with the flags of a running free service: only id and descriptors vary.
+ServiceDef Service(uint16_t id, const std::vector<Bytes>& descriptors = {}) {
+  return ServiceDef{id, 0, true, true, 4, false, descriptors};
+}
+
+sb::SectionOptions SdtOptions(uint8_t tableId = 0x42, uint8_t version = 2, uint16_t transportStreamId = 0x7ED0) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = transportStreamId;
+  options.version = version;
+  return options;
+}
+
+Bytes SdtBody(uint16_t originalNetworkId, const std::vector<ServiceDef>& services) {
+  Bytes body = sb::Cat({sb::U16(originalNetworkId), sb::U8(0xFF)});
+  for (const ServiceDef& s : services) sb::Append(body, ServiceEntry(s));
+  return body;
+}
+
+Bytes SdtSection(const std::vector<ServiceDef>& services, uint8_t tableId = 0x42, uint8_t version = 2,
+                 uint16_t originalNetworkId = 0x0640) {
+  return sb::LongSection(SdtOptions(tableId, version), SdtBody(originalNetworkId, services));
+}
+
+Bytes ServiceDescriptor(uint8_t type, const std::string& provider, const std::string& name) {
+  return sb::Descriptor(0x48, sb::Cat({sb::U8(type), sb::U8(provider.size()), sb::Text(provider), sb::U8(name.size()),
+                                       sb::Text(name)}));
+}
+Bytes LogoType1(uint16_t logoId, uint16_t version, uint16_t downloadId) {
+  return sb::Descriptor(0xCF, sb::Cat({sb::U8(1), sb::U16(0xFE00 | logoId), sb::U16(0xF000 | version), sb::U16(downloadId)}));
+}
+Bytes CountryAvailability(const std::string& codes) {
+  return sb::Descriptor(0x49, sb::Cat({sb::U8(0xFF), sb::Text(codes)}));
+}
+
+std::vector<unsigned int> ServiceIdsOf(RavelCSDT& sdt) {
+  std::vector<unsigned int> ids;
+  for (int i = 0; i < sdt.GetServiceCount(); ++i) ids.push_back(sdt.GetServiceDescription(i)->GetServiceId());
+  return ids;
+}
+
+std::string NameOf(RavelCServiceDescription* service) {
+  if (service->GetService() == nullptr || service->GetService()->GetServiceName() == nullptr) return "<none>";
+  return service->GetService()->GetServiceName();
+}
+
+}  // namespace
+
+TEST(ServiceDescription, DecodesFlagsAndStatusFromTheirOwnBits) {
+  struct Case {
+    Bytes entry;
+    unsigned short id;
+    unsigned char companyDef, schedule, presentFollowing, running, freeCA;
+    unsigned short loopLength;
+  } cases[] = {
+      {Bytes{0x48, 0x00, 0xFF, 0xF0, 0x00}, 0x4800, 7, 1, 1, 7, 1, 0},
+      {Bytes{0x00, 0x01, 0x00, 0x00, 0x00}, 0x0001, 0, 0, 0, 0, 0, 0},
+      {Bytes{0x48, 0x01, 0xF3, 0x80, 0x00}, 0x4801, 4, 1, 1, 4, 0, 0},
+      {Bytes{0x49, 0x80, 0xE5, 0x30, 0x00}, 0x4980, 1, 0, 1, 1, 1, 0},
+      {Bytes{0xFF, 0xFF, 0x1E, 0x40, 0x00}, 0xFFFF, 7, 1, 0, 2, 0, 0},
+      {Bytes{0x12, 0x34, 0xE2, 0xFF, 0x03, 0xC1, 0x01, 0x84}, 0x1234, 0, 1, 0, 7, 1, 0xF03},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.id);
+    Bytes entry = c.entry;
+    entry.resize(0x1000, 0xFF);  // the last case's loop length reaches far; 0xFF tags with length 0xFF
+    RavelCServiceDescription service(nullptr);
+    service.ParseRawData(entry.data());
+    EXPECT_EQ(c.id, service.GetServiceId());
+    EXPECT_EQ(c.companyDef, service.GetEITCompanyDefFlag());
+    EXPECT_EQ(c.schedule, service.GetEITScheduleFlag());
+    EXPECT_EQ(c.presentFollowing, service.GetEITPresentFollowingFlag());
+    EXPECT_EQ(c.running, service.GetRunningStatus());
+    EXPECT_EQ(c.freeCA, service.GetFreeCAMode());
+    EXPECT_EQ(c.loopLength, service.GetDescriptorsLoopLength());
+  }
+}
+
+TEST(SDTParse, NamesActualAndOtherAndRefusesEverythingElse) {
+  const std::vector<ServiceDef> services = {Service(0x4800, {ServiceDescriptor(0x01, "", "TV")})};
+  Bytes actual = SdtSection(services, 0x42);
+  Bytes other = SdtSection(services, 0x46);
+  Bytes nitId = SdtSection(services, 0x40);
+  Bytes pmtId = SdtSection(services, 0x02);
+  sb::SectionOptions badCrcOptions = SdtOptions(0x42, 9, 0x1111);
+  badCrcOptions.corruptCrc = true;
+  Bytes badCrc = sb::LongSection(badCrcOptions, SdtBody(0x0640, services));
+  sb::SectionOptions bothOptions = SdtOptions(0x4A, 9, 0x1111);
+  bothOptions.corruptCrc = true;
+  Bytes bothBad = sb::LongSection(bothOptions, SdtBody(0x0640, services));
+
+  struct Case {
+    const char* label;
+    Bytes* section;
+    int result;
+    TraceLines traces;
+    const char* name;
+    unsigned char tableId;  // after the call
+    int services;
+    unsigned short originalNetworkId;
+  } cases[] = {
+      {"actual", &actual, kRavelOk, {}, "SDT Actual", 0x42, 1, 0x0006},
+      {"other", &other, kRavelOk, {}, "SDT Other", 0x46, 1, 0x0006},
+      {"NIT table_id", &nitId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for SDT! Table ID=[0x40]\n"}},
+       "SDT Actual", 0x40, 0, 0},
+      {"PMT table_id", &pmtId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for SDT! Table ID=[0x02]\n"}},
+       "SDT Actual", 0x02, 0, 0},
+      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "SDT Section: CRC Error!\n"}}, "SDT Actual", 0x42, 0,
+       0},
+      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
+       {{kWarning, "SDT Section: CRC Error!\n"}}, "SDT Actual", 0x42, 0, 0},
+      {"null", nullptr, kRavelErrInvalidArgument, {}, "SDT Actual", 0x42, 0, 0},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    // Each starts from a parsed actual SDT, whose name only a new match replaces.
+    RavelCSDT sdt(actual.data());
+    ASSERT_EQ(1, sdt.GetServiceCount());
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, sdt.ParseRawData(c.section ? c.section->data() : nullptr));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_STREQ(c.name, sdt.sTableName.GetString());
+    EXPECT_EQ(c.tableId, sdt.iTableId);
+    EXPECT_EQ(c.services, sdt.GetServiceCount());
+    EXPECT_EQ(c.originalNetworkId, sdt.GetOriginalNetworkId());
+  }
+}
+
+TEST(SDTParse, KeepsOnlyTheUpperByteOfTheOriginalNetworkId) {
+  struct Case {
+    uint16_t onSection;
+    unsigned short stored;
+  } cases[] = {{0x0640, 0x0006}, {0x7ED0, 0x007E}, {0x00FF, 0x0000}, {0xFF00, 0x00FF}, {0xFFFF, 0x00FF}};
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.onSection);
+    Bytes section = SdtSection({Service(1)}, 0x42, 2, c.onSection);
+    RavelCSDT sdt(section.data());
+    EXPECT_EQ(c.stored, sdt.GetOriginalNetworkId());
+  }
+}
+
+TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAMalformedOne) {
+  struct Case {
+    const char* label;
+    std::vector<ServiceDef> services;
+    int result;
+    TraceLines traces;
+    std::vector<unsigned int> ids;
+    std::vector<std::string> names;
+  } cases[] = {
+      {"copy control and unknown tags are traced and skipped",
+       {Service(0x4800, {sb::Descriptor(0xC1, {0x84}), ServiceDescriptor(0x01, "P", "One"),
+                         sb::Descriptor(0xC2, {0x00})})},
+       kRavelOk,
+       {{kWarning, "SDT ServiceDescription Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n"},
+        {kWarning, "SDT ServiceDescription Parsing.. Unknown Descriptor Tag=[0xc2]\n"}},
+       {0x4800},
+       {"One"}},
+      {"a later service descriptor replaces the earlier one, silently",
+       {Service(0x4800, {ServiceDescriptor(0x01, "", "First"), ServiceDescriptor(0x02, "", "Second")})},
+       kRavelOk,
+       {},
+       {0x4800},
+       {"Second"}},
+      {"services in section order, with and without descriptors",
+       {Service(0x4980, {ServiceDescriptor(0xC0, "", "Seg")}), Service(0x4800), Service(0x4801, {LogoType1(5, 6, 7)})},
+       kRavelOk,
+       {},
+       {0x4980, 0x4800, 0x4801},
+       {"Seg", "<none>", "<none>"}},
+      {"length 0 in the second service drops the first as well",
+       {Service(0x4800, {ServiceDescriptor(0x01, "", "One")}), Service(0x4801, {LogoType1(1, 2, 3), sb::Descriptor(0xC1, {})})},
+       kRavelErrCorruptSection,
+       {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0xc1], descrLen=[0]\n"},
+        {kWarning, "SDT Info Parsing Fail! Maybe data has been corrupted!\n"}},
+       {},
+       {}},
+      {"tag 0 fails the section",
+       {Service(0x4800, {sb::Descriptor(0x00, {0x01})})},
+       kRavelErrCorruptSection,
+       {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x00], descrLen=[1]\n"},
+        {kWarning, "SDT Info Parsing Fail! Maybe data has been corrupted!\n"}},
+       {},
+       {}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = SdtSection(c.services);
+    RavelCSDT sdt(nullptr);
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, sdt.ParseRawData(section.data()));
+    EXPECT_EQ(c.traces, recorder.Lines());
+    EXPECT_EQ(c.ids, ServiceIdsOf(sdt));
+    std::vector<std::string> names;
+    for (int i = 0; i < sdt.GetServiceCount(); ++i) names.push_back(NameOf(sdt.GetServiceDescription(i)));
+    EXPECT_EQ(c.names, names);
+    EXPECT_EQ(c.result == kRavelOk ? 0x0006 : 0, sdt.GetOriginalNetworkId());
+    EXPECT_STREQ("SDT Actual", sdt.sTableName.GetString());
+  }
+}
+
+TEST(ServiceDescription, MalformedLoopClearsTheServiceAndLaterDescriptorsReplaceEarlierOnes) {
+  struct Case {
+    const char* label;
+    ServiceDef entryDef;
+    int result;
+    unsigned short id;
+    bool service, logo, country;
+    unsigned short logoId;
+    int countryCodes;
+  } cases[] = {
+      {"all three kept", Service(0x4800, {ServiceDescriptor(1, "", "A"), LogoType1(3, 1, 2), CountryAvailability("BRA")}),
+       kRavelOk, 0x4800, true, true, true, 3, 1},
+      {"later logo and country replace earlier ones",
+       Service(0x4801, {LogoType1(3, 1, 2), CountryAvailability("BRA"), LogoType1(9, 1, 2), CountryAvailability("JPNBRA")}),
+       kRavelOk, 0x4801, false, true, true, 9, 2},
+      {"length 0 clears everything read", Service(0x4802, {ServiceDescriptor(1, "", "A"), LogoType1(3, 1, 2), sb::Descriptor(0x49, {})}),
+       kRavelErrCorruptSection, 0, false, false, false, 0, 0},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes entry = ServiceEntry(c.entryDef);
+    RavelCServiceDescription service(nullptr);
+    EXPECT_EQ(c.result, service.ParseRawData(entry.data()));
+    EXPECT_EQ(c.id, service.GetServiceId());
+    EXPECT_EQ(c.result == kRavelOk ? 4 : 0, service.GetRunningStatus());
+    EXPECT_EQ(c.result == kRavelOk ? 1 : 0, service.GetEITScheduleFlag());
+    EXPECT_EQ(c.result == kRavelOk ? entry.size() - 5 : 0u, service.GetDescriptorsLoopLength());
+    EXPECT_EQ(c.service, service.GetService() != nullptr);
+    EXPECT_EQ(c.logo, service.GetLogoTransmission() != nullptr);
+    EXPECT_EQ(c.country, service.GetCountryAvailability() != nullptr);
+    if (c.logo) {
+      EXPECT_EQ(c.logoId, service.GetLogoTransmission()->GetLogoId());
+    }
+    if (c.country) {
+      EXPECT_EQ(c.countryCodes, service.GetCountryAvailability()->GetNumOfCountryCodes());
+    }
+  }
+  RavelCServiceDescription service(nullptr);
+  EXPECT_EQ(kRavelErrInvalidArgument, service.ParseRawData(nullptr));
+}
+
+TEST(SDTServiceLoop, RunsFromByte11ToTheFirstCrcByte) {
+  struct Case {
+    const char* label;
+    Bytes body;
+    std::vector<unsigned int> ids;
+  } cases[] = {
+      {"section_length 12: no service", sb::Cat({sb::U16(0x0640), sb::U8(0xFF)}), {}},
+      {"one service of 5 bytes", sb::Cat({sb::U16(0x0640), sb::U8(0xFF), ServiceEntry(Service(0x0101))}), {0x0101}},
+      {"a service whose loop length reaches past the end is the last one",
+       sb::Cat({sb::U16(0x0640), sb::U8(0xFF), ServiceEntry(Service(0x0101)), sb::U16(0x0102), sb::U8(0xE3),
+                sb::Length12(0x30, 0x8), sb::U8(0xC1), sb::U8(0x2E)}),
+       {0x0101, 0x0102}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    Bytes section = sb::LongSection(SdtOptions(), c.body);
+    section.resize(section.size() + 0x40, 0xC2);  // what a service may read past the section
+    RavelCSDT sdt(nullptr);
+    EXPECT_EQ(kRavelOk, sdt.ParseRawData(section.data()));
+    EXPECT_EQ(c.ids, ServiceIdsOf(sdt));
+    EXPECT_EQ(0x0006, sdt.GetOriginalNetworkId());
+  }
+}
+
+TEST(SDTMerge, AppendsCopiesOfTheOthersServicesOnlyWhenTheVersionsMatch) {
+  Bytes first = SdtSection({Service(0x4800, {ServiceDescriptor(0x01, "", "One")}), Service(0x4801)}, 0x42, 5, 0x7ED0);
+  Bytes sameVersion = SdtSection({Service(0x4980, {ServiceDescriptor(0xC0, "", "Seg"), LogoType1(3, 4, 5)}),
+                                  Service(0x4800)},
+                                 0x46, 5, 0x0640);
+  Bytes otherVersion = SdtSection({Service(0x4990)}, 0x42, 6, 0x7ED0);
+  struct Case {
+    const char* label;
+    Bytes* other;  // null: the target itself
+    TraceLines traces;
+    std::vector<unsigned int> ids;
+  } cases[] = {
+      {"same version: appended, duplicates included", &sameVersion, {}, {0x4800, 0x4801, 0x4980, 0x4800}},
+      {"other version: unchanged", &otherVersion,
+       {{kError, "Two SDT Information have different information! first one=[5], second one=[6]\n"}},
+       {0x4800, 0x4801}},
+      {"with itself: doubled once", nullptr, {}, {0x4800, 0x4801, 0x4800, 0x4801}},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
+    RavelCSDT target(first.data());
+    std::unique_ptr<RavelCSDT> other(new RavelCSDT(c.other ? c.other->data() : first.data()));
+    TraceRecorder recorder;
+    RavelCSDT& result = c.other ? (target += *other) : (target += target);
+    EXPECT_EQ(&target, &result);
+    EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableSDT", r.file);
+    other.reset();  // the appended services are the target's own copies
+    EXPECT_EQ(c.ids, ServiceIdsOf(target));
+    EXPECT_STREQ("SDT Actual", target.sTableName.GetString());
+    EXPECT_EQ(0x7E, target.GetOriginalNetworkId());
+    EXPECT_EQ(0x7ED0, target.iTableIdExtension);
+  }
+  // Copied services keep their service type and logo; the service descriptor's
+  // own copy carries no names.
+  RavelCSDT target(first.data());
+  RavelCSDT other(sameVersion.data());
+  target += other;
+  RavelCServiceDescription* appended = target.GetServiceDescription(2);
+  ASSERT_NE(nullptr, appended->GetService());
+  EXPECT_EQ(0xC0, appended->GetService()->GetServiceType());
+  EXPECT_EQ(nullptr, appended->GetService()->GetServiceName());
+  ASSERT_NE(nullptr, appended->GetLogoTransmission());
+  EXPECT_EQ(3, appended->GetLogoTransmission()->GetLogoId());
+  EXPECT_EQ(4, appended->GetLogoTransmission()->GetLogoVersion());
+  EXPECT_EQ(5, appended->GetLogoTransmission()->GetDownloadDataId());
+  EXPECT_EQ("One", NameOf(target.GetServiceDescription(0)));
+}
+
+TEST(SDTCopy, CopiesHeaderNameNetworkIdAndEveryService) {
+  Bytes section = SdtSection({Service(0x4980, {ServiceDescriptor(0xC0, "", "Seg"), CountryAvailability("BRA")}),
+                              Service(0x4800)},
+                             0x46, 3, 0x0640);
+  Bytes other = SdtSection({Service(0x0001), Service(0x0002), Service(0x0003)}, 0x42, 1, 0x7ED0);
+  std::unique_ptr<RavelCSDT> source(new RavelCSDT(section.data()));
+  source->iSession = 0x11;
+  RavelCSDT constructed(*source);
+  RavelCSDT assigned(other.data());
+  assigned = *source;
+  source.reset();
+  for (RavelCSDT* copy : {&constructed, &assigned}) {
+    EXPECT_EQ((std::vector<unsigned int>{0x4980, 0x4800}), ServiceIdsOf(*copy));
+    EXPECT_EQ(0x0006, copy->GetOriginalNetworkId());
+    EXPECT_EQ(0x11, copy->iSession);
+    EXPECT_EQ(0x46, copy->iTableId);
+    EXPECT_EQ(3, copy->iVersionNumber);
+    EXPECT_EQ(section.size() - 3, copy->iSectionLength);
+    EXPECT_STREQ("SDT Other", copy->sTableName.GetString());
+    RavelCServiceDescription* first = copy->GetServiceDescription(0);
+    ASSERT_NE(nullptr, first->GetCountryAvailability());
+    EXPECT_EQ(1, first->GetCountryAvailability()->GetNumOfCountryCodes());
+    ASSERT_NE(nullptr, first->GetService());
+    EXPECT_EQ(0xC0, first->GetService()->GetServiceType());
+    EXPECT_EQ(4, first->GetRunningStatus());
+  }
+  // Assigning a table to itself clears its services before the copy.
+  assigned = assigned;
+  EXPECT_EQ(0, assigned.GetServiceCount());
+  EXPECT_EQ(0x0006, assigned.GetOriginalNetworkId());
+}
+
+TEST(SDTShow, DumpsHeaderBodyAndEachServiceWithItsDescriptors) {
+  Bytes section = SdtSection(
+      {ServiceDef{0x4980, 5, false, true, 1, true,
+                   {CountryAvailability("BRA"), LogoType1(3, 0x12, 0x4980), ServiceDescriptor(0xC0, "Pr", "Seg")}},
+       Service(0x4800)},
+      0x42, 2, 0x0640);
+  RavelCSDT sdt(section.data());
+  TraceRecorder recorder;
+  sdt.Show();
+  const std::string frame = "#################################################################\n";
+  EXPECT_EQ((TraceLines{
+                {kDump, frame},
+                {kDump, "###################### SDT Table Information ######################\n"},
+                {kDump, frame},
+                {kDump, "####################### Header Information ########################\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x42], Table Name=[SDT Actual]\n"},
+                {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
+                            "], Any Identifier(?)=[0x7ed0]\n"},
+                {kDump, "Version number=[2], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, frame},
+                {kDump, "####################### Body Information #######################\n"},
+                {kDump, "Original Network ID = [0x0006]\n"},
+                {kDump, "##################### Service Description [0] #####################\n"},
+                {kDump, "Service ID=[0x4980]\n"},
+                {kDump, "EITCompanyDefFlag=[5]\n"},
+                {kDump, "EITScheduleFlag=[0]\n"},
+                {kDump, "EITPresentFollowingFlag=[1]\n"},
+                {kDump, "Running Status=[1]\n"},
+                {kDump, "FreeCAMode=[1]\n"},
+                {kDump, "Descriptors Loop Len=[25]\n"},
+                {kDump, "\t=================== Service Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0x48], Descriptor Length=[8], Name=[Service Descriptor]\n"},
+                {kDump, "\tService Type=[0xc0]\n"},
+                {kDump, "\tService Provider Name=[Pr]\n"},
+                {kDump, "\tService Name=[Seg]\n"},
+                {kDump, "\t=================== LogoTransmission Descriptor ===================\n"},
+                {kDump, "\tDescriptor Tag=[0xcf], Descriptor Length=[7], Name=[Logo Transmission Descriptor]\n"},
+                {kDump, "\tLogoTransmission Type=[0x01]\n"},
+                {kDump, "\tLogo version=[18]\n"},
+                {kDump, "\tDownload ID=[18816]\n"},
+                {kDump, "\t=================== Country Availability Descriptor =====================\n"},
+                {kDump, "\tDescriptor Tag=[0x49], Descriptor Length=[4], Name=[Country Availabilty Descriptor]\n"},
+                {kDump, "\t Ability flag = 1\n"},
+                {kDump, "\t Codes: \n"},
+                {kDump, "\t    BRA\n"},
+                {kDump, "##################### Service Description [1] #####################\n"},
+                {kDump, "Service ID=[0x4800]\n"},
+                {kDump, "EITCompanyDefFlag=[0]\n"},
+                {kDump, "EITScheduleFlag=[1]\n"},
+                {kDump, "EITPresentFollowingFlag=[1]\n"},
+                {kDump, "Running Status=[4]\n"},
+                {kDump, "FreeCAMode=[0]\n"},
+                {kDump, "Descriptors Loop Len=[0]\n"},
+                {kDump, frame},
+            }),
+            recorder.Lines());
+
+  RavelCSDT empty(nullptr);
+  recorder.Clear();
+  empty.Show();
+  EXPECT_EQ((TraceLines{
+                {kDump, frame},
+                {kDump, "###################### SDT Table Information ######################\n"},
+                {kDump, frame},
+                {kDump, "####################### Header Information ########################\n"},
+                {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[Unknown]\n"},
+                {kDump, "Section syntax indicator=[0], Section length=[0], Any Identifier(?)=[0x0000]\n"},
+                {kDump, "Version number=[0], Current next indicator=[0], Section numbe=[0], Last section number=[0]\n"},
+                {kDump, frame},
+                {kDump, "####################### Body Information #######################\n"},
+                {kDump, "Original Network ID = [0x0000]\n"},
+                {kDump, frame},
+            }),
+            recorder.Lines());
+}
+
+TEST(SDTCapture, JapaneseChannelNamesItsServices) {
+  Bytes contents;
+  RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", contents);
+  Bytes* sdtSection = nullptr;
+  std::vector<Bytes> sections = captures::SplitSections(contents);
+  for (Bytes& s : sections) {
+    if (!s.empty() && s[0] == 0x42) sdtSection = &s;
+  }
+  ASSERT_NE(nullptr, sdtSection) << "no SDT section in the capture";
+  TraceRecorder recorder;
+  RavelCSDT sdt(sdtSection->data());
+  EXPECT_EQ((TraceLines{
+                {kWarning, "SDT ServiceDescription Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n"},
+                {kWarning, "SDT ServiceDescription Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n"},
+                {kWarning, "SDT ServiceDescription Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n"},
+            }),
+            recorder.Lines());
+  EXPECT_STREQ("SDT Actual", sdt.sTableName.GetString());
+  EXPECT_EQ(0x7ED0, sdt.iTableIdExtension);
+  EXPECT_EQ(0x007E, sdt.GetOriginalNetworkId());  // original_network_id 0x7ED0
+
+  // Service names in their broadcast character set (ARIB STD-B24), byte for byte.
+  const std::string nhk = "\x0e\x4e\x48\x4b\x0f";
+  struct Expected {
+    unsigned short id;
+    unsigned char type, companyDef, schedule, presentFollowing;
+    std::string name;
+    unsigned char logoType;
+    unsigned short logoId, logoVersion, downloadId;
+    std::string logoCharacters;
+  } expected[] = {
+      {0x4800, 0x01, 4, 1, 1, nhk + "\x41\x6d\x39\x67\x0e\x31\xfe\x0f\x3d\x29\x45\x44", 1, 0, 1, 0x4800, ""},
+      {0x4801, 0x01, 4, 1, 1, nhk + "\x41\x6d\x39\x67\x0e\x32\xfe\x0f\x3d\x29\x45\x44", 2, 0, 0, 0, ""},
+      {0x4980, 0xC0, 1, 0, 1, nhk + "\x37\x48\x42\x53\x0e\x47\xfe\x0f\x3d\x29\x45\x44", 3, 0, 0, 0,
+       nhk + "\x21\x5d\x0e\x47"},
+  };
+  ASSERT_EQ(3, sdt.GetServiceCount());
+  for (int i = 0; i < 3; ++i) {
+    SCOPED_TRACE(i);
+    RavelCServiceDescription* service = sdt.GetServiceDescription(i);
+    EXPECT_EQ(expected[i].id, service->GetServiceId());
+    EXPECT_EQ(expected[i].companyDef, service->GetEITCompanyDefFlag());
+    EXPECT_EQ(expected[i].schedule, service->GetEITScheduleFlag());
+    EXPECT_EQ(expected[i].presentFollowing, service->GetEITPresentFollowingFlag());
+    EXPECT_EQ(0, service->GetRunningStatus());
+    EXPECT_EQ(0, service->GetFreeCAMode());
+    ASSERT_NE(nullptr, service->GetService());
+    EXPECT_EQ(expected[i].type, service->GetService()->GetServiceType());
+    EXPECT_EQ(nullptr, service->GetService()->GetServiceProviderName());
+    ASSERT_NE(nullptr, service->GetService()->GetServiceName());
+    EXPECT_EQ(expected[i].name, std::string(service->GetService()->GetServiceName()));
+    ASSERT_NE(nullptr, service->GetLogoTransmission());
+    RavelCLogoTransmissionDescriptor* logo = service->GetLogoTransmission();
+    EXPECT_EQ(expected[i].logoType, logo->GetLogoTransmissionType());
+    EXPECT_EQ(expected[i].logoId, logo->GetLogoId());
+    EXPECT_EQ(expected[i].logoVersion, logo->GetLogoVersion());
+    EXPECT_EQ(expected[i].downloadId, logo->GetDownloadDataId());
+    if (expected[i].logoCharacters.empty()) {
+      EXPECT_EQ(nullptr, logo->GetLogoCharacters());
+    } else {
+      ASSERT_NE(nullptr, logo->GetLogoCharacters());
+      EXPECT_EQ(expected[i].logoCharacters,
+                std::string(logo->GetLogoCharacters(), static_cast<size_t>(logo->GetLogoCharactersLength())));
+    }
+    EXPECT_EQ(nullptr, service->GetCountryAvailability());
+  }
+}
