@@ -1,5 +1,6 @@
 #include "BenchData.h"
 
+#include <algorithm>
 #include <map>
 
 #include "Captures.h"
@@ -67,8 +68,14 @@ std::vector<Bytes> TsSections(const Bytes& stream) {
   return sections;
 }
 
-std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, unsigned int firstTableId,
-                                   unsigned int lastTableId, std::string& missing) {
+std::vector<unsigned int> TableIds(unsigned int first, unsigned int last) {
+  std::vector<unsigned int> ids;
+  for (unsigned int id = first; id <= last; ++id) ids.push_back(id);
+  return ids;
+}
+
+std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, const std::vector<unsigned int>& tableIds,
+                                   std::string& missing) {
   std::vector<Bytes> selected;
   missing.clear();
   for (const std::string& name : names) {
@@ -80,7 +87,7 @@ std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, unsign
     const bool isTs = name.size() > 3 && name.compare(name.size() - 3, 3, ".ts") == 0;
     std::vector<Bytes> all = isTs ? TsSections(contents) : captures::SplitSections(contents);
     for (Bytes& s : all) {
-      if (s.size() >= 3 && s[0] >= firstTableId && s[0] <= lastTableId) {
+      if (s.size() >= 3 && std::find(tableIds.begin(), tableIds.end(), s[0]) != tableIds.end()) {
         s.resize(s.size() + kSectionMargin, 0x00);
         selected.push_back(std::move(s));
       }

@@ -18,13 +18,15 @@ namespace bench {
 std::vector<Bytes> TsSections(const Bytes& stream);
 
 // The sections of the named captures (".ts" files are cut into sections,
-// ".sections" files split) whose table_id lies in [firstTableId, lastTableId].
+// ".sections" files split) whose table_id is one of `tableIds`.
 // `missing` lists the captures that are not there. Each section is followed by
 // kSectionMargin zero bytes, as in a receiver's section buffer: some messages
 // of real carousels say their descriptors run past the section's end.
 const size_t kSectionMargin = 4096;
-std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, unsigned int firstTableId,
-                                   unsigned int lastTableId, std::string& missing);
+std::vector<Bytes> CaptureSections(const std::vector<std::string>& names, const std::vector<unsigned int>& tableIds,
+                                   std::string& missing);
+// first, first + 1, ..., last.
+std::vector<unsigned int> TableIds(unsigned int first, unsigned int last);
 
 // 3 + section_length.
 inline long long SectionBytes(const Bytes& section) {

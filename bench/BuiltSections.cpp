@@ -58,6 +58,131 @@ std::vector<Bytes> BuiltAitSections() {
 
 namespace {
 
+sb::SectionOptions Options(uint8_t tableId, uint16_t extension, uint8_t version = 1, bool privateIndicator = true) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = extension;
+  options.version = version;
+  options.privateIndicator = privateIndicator;
+  return options;
+}
+
+Bytes StreamEntry(uint8_t type, uint16_t pid, const std::vector<Bytes>& descriptors) {
+  return sb::Cat({sb::U8(type), sb::U16(0xE000 | pid), sb::DescriptorLoop(descriptors)});
+}
+
+}  // namespace
+
+std::vector<Bytes> BuiltPmtSections() {
+  std::vector<Bytes> sections;
+  const Bytes rating = sb::Descriptor(0x55, sb::Cat({sb::Text("BRA"), sb::U8(0x12)}));
+  for (unsigned int audios = 1; audios <= 3; ++audios) {
+    Bytes body = sb::Cat({sb::U16(0xE000 | 0x0101), sb::DescriptorLoop({rating})});
+    sb::Append(body, StreamEntry(0x1B, 0x0111, {sb::Descriptor(0x52, sb::U8(0x81))}));
+    for (unsigned int a = 0; a < audios; ++a) {
+      sb::Append(body, StreamEntry(0x0F, static_cast<uint16_t>(0x0112 + a), {sb::Descriptor(0x52, sb::U8(0x83 + a))}));
+    }
+    sb::Append(body, StreamEntry(0x06, 0x0118, {sb::Descriptor(0x52, sb::U8(0x87)),
+                                               sb::Descriptor(0xFD, sb::Cat({sb::U16(0x0008), sb::U8(0x3D)}))}));
+    sb::Append(body, StreamEntry(0x0D, 0x0119, {sb::Descriptor(0x52, sb::U8(0x8A)),
+                                               sb::Descriptor(0xFD, sb::Cat({sb::U16(0x00A0), sb::U8(0x3D)}))}));
+    sections.push_back(sb::LongSection(Options(0x02, 0xE760, 3, false), body));
+  }
+  return sections;
+}
+
+std::vector<Bytes> BuiltSdtSections() {
+  std::vector<Bytes> sections;
+  for (unsigned int count = 1; count <= 4; ++count) {
+    Bytes body = sb::Cat({sb::U16(0x0640), sb::U8(0xFF)});
+    for (unsigned int i = 0; i < count; ++i) {
+      const std::string provider = "Emissora";
+      const std::string name = "Canal " + std::to_string(i + 1) + " HD";
+      Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(0x01), sb::U8(static_cast<unsigned int>(provider.size())),
+                                                    sb::Text(provider), sb::U8(static_cast<unsigned int>(name.size())),
+                                                    sb::Text(name)}));
+      Bytes logo = sb::Descriptor(0xCF, sb::Cat({sb::U8(1), sb::U16(0xFE00 | i), sb::U16(0xF001), sb::U16(0x0010)}));
+      // service_id, EIT flags (schedule and present/following), running, free
+      sb::Append(body, sb::Cat({sb::U16(0xE760 + i), sb::U8(0xE3), sb::DescriptorLoop({service, logo}, 0x8)}));
+    }
+    sections.push_back(sb::LongSection(Options(0x42, 0x0640, 2), body));
+  }
+  return sections;
+}
+
+std::vector<Bytes> BuiltNitSections() {
+  const std::string network = "Rede Nacional";
+  const std::string tsName = "RN";
+  std::vector<Bytes> networkDescriptors = {sb::Descriptor(0x40, sb::Text(network)), sb::Descriptor(0xFE, Bytes{0x03, 0x01})};
+  Bytes services;
+  for (unsigned int i = 0; i < 4; ++i) sb::Append(services, sb::Cat({sb::U16(0xE760 + i), sb::U8(i == 3 ? 0xC0 : 0x01)}));
+  std::vector<Bytes> tsDescriptors = {
+      sb::Descriptor(0x41, services),
+      sb::Descriptor(0xCD, sb::Cat({sb::U8(0x05), sb::U8(static_cast<unsigned int>(tsName.size() << 2)), sb::Text(tsName)})),
+      sb::Descriptor(0xFA, sb::Cat({sb::U16((0x123u << 4) | (1u << 2) | 2u), sb::U16(0x0F1C)})),
+      sb::Descriptor(0xFB, sb::U16(0xE763)),
+  };
+  Bytes stream = sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::DescriptorLoop(tsDescriptors)});
+  Bytes body = sb::Cat({sb::DescriptorLoop(networkDescriptors), sb::Length12(static_cast<unsigned int>(stream.size())),
+                        stream});
+  return {sb::LongSection(Options(0x40, 0x0640, 1), body)};
+}
+
+std::vector<Bytes> BuiltBitSections() {
+  std::vector<Bytes> sections;
+  const unsigned int counts[] = {1, 3};
+  for (unsigned int count : counts) {
+    Bytes body = sb::Length12(0, 0xF);  // view propriety, no first descriptors
+    for (unsigned int i = 0; i < count; ++i) {
+      Bytes extended = sb::Descriptor(0xCE, sb::Cat({sb::U8(0x1F), sb::U16(0x0A01 + i), sb::U8(0x01), sb::U16(0x7FE1),
+                                                     sb::U8(static_cast<unsigned int>(i + 1))}));
+      sb::Append(body, sb::Cat({sb::U8(i + 1), sb::DescriptorLoop({extended})}));
+    }
+    sections.push_back(sb::LongSection(Options(0xC4, 0x7FE1, 3), body));
+  }
+  return sections;
+}
+
+std::vector<Bytes> BuiltEitSections() {
+  std::vector<Bytes> sections;
+  struct Shape {
+    uint8_t tableId;
+    unsigned int events;
+  } shapes[] = {{0x4E, 1}, {0x4E, 2}, {0x50, 8}};
+  for (const Shape& shape : shapes) {
+    Bytes body = sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::U8(0), sb::U8(shape.tableId)});
+    for (unsigned int e = 0; e < shape.events; ++e) {
+      const std::string name = "Programa " + std::to_string(e + 1);
+      const std::string text = "Resumo do programa, com os participantes e o tema do dia.";
+      Bytes d = sb::Cat({
+          sb::Descriptor(0x4D, sb::Cat({sb::Text("por"), sb::U8(static_cast<unsigned int>(name.size())), sb::Text(name),
+                                        sb::U8(static_cast<unsigned int>(text.size())), sb::Text(text)})),
+          sb::Descriptor(0x50, sb::Cat({sb::U8(0xF1), sb::U8(0xB3), sb::U8(0x00), sb::Text("por")})),
+          sb::Descriptor(0xC4, sb::Cat({sb::U8(0xF2), sb::U8(0x03), sb::U8(0x10), sb::U8(0x0F), sb::U8(0xFF),
+                                        sb::U8(0x5F), sb::Text("por")})),
+          sb::Descriptor(0x54, sb::Cat({sb::U8(0x20), sb::U8(0xFF)})),
+          sb::Descriptor(0x55, sb::Cat({sb::Text("BRA"), sb::U8(0x12)})),
+      });
+      sb::Append(body, sb::Cat({sb::U16(0x1000 + e), sb::UtcTime(2024, 5, 6, 18 + e % 6, 0, 0), Bytes{0x01, 0x00, 0x00},
+                                sb::Length12(static_cast<unsigned int>(d.size()), 0x8), d}));
+    }
+    sections.push_back(sb::LongSection(Options(shape.tableId, 0xE760, 4), body));
+  }
+  return sections;
+}
+
+std::vector<Bytes> BuiltTdtSections() { return {sb::ShortSection(0x70, sb::UtcTime(2024, 5, 6, 18, 30, 15), false)}; }
+
+std::vector<Bytes> BuiltTotSections() {
+  Bytes offset = sb::Cat({sb::Text("BRA"), sb::U8(1 << 2 | 0x03), Bytes{sb::Bcd(3), 0x00}, sb::UtcTime(2024, 11, 3, 3, 0, 0),
+                          Bytes{sb::Bcd(2), 0x00}});
+  const Bytes time = sb::UtcTime(2024, 5, 6, 18, 30, 15);
+  return {sb::ShortSection(0x73, sb::Cat({time, sb::DescriptorLoop({})}), true),
+          sb::ShortSection(0x73, sb::Cat({time, sb::DescriptorLoop({sb::Descriptor(0x58, offset)})}), true)};
+}
+
+namespace {
+
 // dsmccMessageHeader (no adaptation header) followed by `body`.
 Bytes DsmccMessage(uint16_t messageId, uint32_t transactionId, const Bytes& body) {
   return sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(messageId), sb::U32(transactionId), sb::U8(0xFF), sb::U8(0),

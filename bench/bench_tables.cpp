@@ -1,6 +1,8 @@
 // Sections per second of each table class, over the real sections of the shared
 // captures (skipped with a message when they are absent) and over built ones.
-// Dumps are off: no trace hook and the default trace mask (errors only).
+// Dumps are off: no trace hook and the default trace mask (errors only, which
+// the default sink prints to standard error). One object of each class is
+// parsed again for every section, as a receiver keeps one per PID.
 #include <benchmark/benchmark.h>
 
 #include <string>
@@ -12,8 +14,15 @@
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CDsmccDSI.h"
 #include "Ravel_CTableAIT.h"
+#include "Ravel_CTableBIT.h"
+#include "Ravel_CTableEIT.h"
+#include "Ravel_CTableNIT.h"
 #include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
 #include "Ravel_CTableStreamEventDescriptor.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
 #include "Ravel_PGL.h"
 
 namespace {
@@ -23,9 +32,9 @@ struct SectionSet {
   std::string missing;
 };
 
-SectionSet Real(const std::vector<std::string>& captures, unsigned int first, unsigned int last) {
+SectionSet Real(const std::vector<std::string>& captures, const std::vector<unsigned int>& tableIds) {
   SectionSet set;
-  set.sections = bench::CaptureSections(captures, first, last, set.missing);
+  set.sections = bench::CaptureSections(captures, tableIds, set.missing);
   return set;
 }
 
@@ -50,14 +59,16 @@ void DumpsOff() {
   RavelPGL_SetTraceMask(0x80000000u);
 }
 
-// One table object parsed again for every section, as a caller keeps one per PID.
-void ParsePAT(benchmark::State& state, SectionSet& set) {
+// Tables built over a section pointer (null gives an empty object).
+template <class Table>
+void ParseTable(benchmark::State& state, SectionSet& set) {
   DumpsOff();
-  RavelCPAT pat(0);
-  bench::RunOverSections(state, set.sections, set.missing, [&](unsigned char* s) { return pat.ParseRawData(s); });
+  Table table(0);
+  bench::RunOverSections(state, set.sections, set.missing, [&](unsigned char* s) { return table.ParseRawData(s); });
 }
 
-void ParseAIT(benchmark::State& state, SectionSet& set) {
+template <>
+void ParseTable<RavelCAIT>(benchmark::State& state, SectionSet& set) {
   DumpsOff();
   RavelCAIT ait;
   bench::RunOverSections(state, set.sections, set.missing, [&](unsigned char* s) { return ait.ParseRawData(s); });
@@ -72,84 +83,58 @@ void ParseMessage(benchmark::State& state, SectionSet& set) {
                          [&](unsigned char* s) { return message.ParseRawData(s + 8); });
 }
 
-void ParseStreamEvents(benchmark::State& state, SectionSet& set) {
-  DumpsOff();
-  RavelCDsmccStreamEvent table(0);
-  bench::RunOverSections(state, set.sections, set.missing, [&](unsigned char* s) { return table.ParseRawData(s); });
+const std::string kJapan = "isdbt-japan-psi.sections";
+const std::string kSignalling = "isdb-signalling-mix.sections";
+const std::string kLive = "dvb-live.ts";
+const std::string kEpg = "dvb-epg.ts";
+const std::string kAit = "ait.ts";
+const std::string kCarousel = "object-carousel.ts";
+
+// The EIT table ids the class accepts.
+std::vector<unsigned int> EitTableIds() {
+  std::vector<unsigned int> ids = {0x4E, 0x4F, 0x50};
+  for (unsigned int id = 0x60; id <= 0x6F; ++id) ids.push_back(id);
+  return ids;
 }
 
-const std::vector<std::string> kPatCaptures = {"isdbt-japan-psi.sections", "dvb-live.ts", "dvb-epg.ts", "ait.ts"};
+#define RAVEL_TABLE_BENCHMARKS(Name, Class, RealSet, BuiltSet)          \
+  void BM_##Name##_Real(benchmark::State& state) {                      \
+    static SectionSet set = RealSet;                                    \
+    ParseTable<Class>(state, set);                                      \
+  }                                                                     \
+  BENCHMARK(BM_##Name##_Real);                                          \
+  void BM_##Name##_Built(benchmark::State& state) {                     \
+    static SectionSet set = Built(BuiltSet);                            \
+    ParseTable<Class>(state, set);                                      \
+  }                                                                     \
+  BENCHMARK(BM_##Name##_Built)
 
-void BM_PAT_Real(benchmark::State& state) {
-  static SectionSet set = Real(kPatCaptures, 0x00, 0x00);
-  ParsePAT(state, set);
-}
-BENCHMARK(BM_PAT_Real);
+RAVEL_TABLE_BENCHMARKS(PAT, RavelCPAT, Real({kJapan, kLive, kEpg, kAit}, {0x00}), bench::BuiltPatSections());
+RAVEL_TABLE_BENCHMARKS(PMT, RavelCPMT, Real({kJapan, kLive, kAit}, {0x02}), bench::BuiltPmtSections());
+RAVEL_TABLE_BENCHMARKS(NIT, RavelCNIT, Real({kJapan, kEpg, kAit}, {0x40, 0x41}), bench::BuiltNitSections());
+RAVEL_TABLE_BENCHMARKS(SDT, RavelCSDT, Real({kJapan, kLive, kEpg, kAit}, {0x42, 0x46}), bench::BuiltSdtSections());
+RAVEL_TABLE_BENCHMARKS(EIT, RavelCEIT, Real({kJapan, kEpg}, EitTableIds()), bench::BuiltEitSections());
+RAVEL_TABLE_BENCHMARKS(BIT, RavelCBIT, Real({kSignalling}, {0xC4}), bench::BuiltBitSections());
+RAVEL_TABLE_BENCHMARKS(TDT, RavelCTDT, Real({kEpg, kAit}, {0x70}), bench::BuiltTdtSections());
+RAVEL_TABLE_BENCHMARKS(TOT, RavelCTOT, Real({kEpg, kAit}, {0x73}), bench::BuiltTotSections());
+RAVEL_TABLE_BENCHMARKS(AIT, RavelCAIT, Real({kAit}, {0x74}), bench::BuiltAitSections());
+RAVEL_TABLE_BENCHMARKS(StreamEvent, RavelCDsmccStreamEvent, Real({"stream-events-1.ts", "stream-events-2.ts"}, {0x3D}),
+                       bench::BuiltStreamEventSections());
 
-void BM_PAT_Built(benchmark::State& state) {
-  static SectionSet set = Built(bench::BuiltPatSections());
-  ParsePAT(state, set);
-}
-BENCHMARK(BM_PAT_Built);
+#define RAVEL_MESSAGE_BENCHMARKS(Name, Class, TableId, MessageId, BuiltSet)             \
+  void BM_##Name##_Real(benchmark::State& state) {                                      \
+    static SectionSet set = OfMessage(Real({kCarousel}, {TableId}), MessageId);         \
+    ParseMessage<Class>(state, set);                                                    \
+  }                                                                                     \
+  BENCHMARK(BM_##Name##_Real);                                                          \
+  void BM_##Name##_Built(benchmark::State& state) {                                     \
+    static SectionSet set = Built(BuiltSet);                                            \
+    ParseMessage<Class>(state, set);                                                    \
+  }                                                                                     \
+  BENCHMARK(BM_##Name##_Built)
 
-void BM_AIT_Real(benchmark::State& state) {
-  static SectionSet set = Real({"ait.ts"}, 0x74, 0x74);
-  ParseAIT(state, set);
-}
-BENCHMARK(BM_AIT_Real);
-
-void BM_AIT_Built(benchmark::State& state) {
-  static SectionSet set = Built(bench::BuiltAitSections());
-  ParseAIT(state, set);
-}
-BENCHMARK(BM_AIT_Built);
-
-void BM_DsmccDSI_Real(benchmark::State& state) {
-  static SectionSet set = OfMessage(Real({"object-carousel.ts"}, 0x3B, 0x3B), RAVEL_DSMCC_MSG_DSI);
-  ParseMessage<RavelCDsmccDSI>(state, set);
-}
-BENCHMARK(BM_DsmccDSI_Real);
-
-void BM_DsmccDSI_Built(benchmark::State& state) {
-  static SectionSet set = Built(bench::BuiltDsiSections());
-  ParseMessage<RavelCDsmccDSI>(state, set);
-}
-BENCHMARK(BM_DsmccDSI_Built);
-
-void BM_DsmccDII_Real(benchmark::State& state) {
-  static SectionSet set = OfMessage(Real({"object-carousel.ts"}, 0x3B, 0x3B), RAVEL_DSMCC_MSG_DII);
-  ParseMessage<RavelCDsmccDII>(state, set);
-}
-BENCHMARK(BM_DsmccDII_Real);
-
-void BM_DsmccDII_Built(benchmark::State& state) {
-  static SectionSet set = Built(bench::BuiltDiiSections());
-  ParseMessage<RavelCDsmccDII>(state, set);
-}
-BENCHMARK(BM_DsmccDII_Built);
-
-void BM_DsmccDDB_Real(benchmark::State& state) {
-  static SectionSet set = OfMessage(Real({"object-carousel.ts"}, 0x3C, 0x3C), RAVEL_DSMCC_MSG_DDB);
-  ParseMessage<RavelCDsmccDDB>(state, set);
-}
-BENCHMARK(BM_DsmccDDB_Real);
-
-void BM_DsmccDDB_Built(benchmark::State& state) {
-  static SectionSet set = Built(bench::BuiltDdbSections());
-  ParseMessage<RavelCDsmccDDB>(state, set);
-}
-BENCHMARK(BM_DsmccDDB_Built);
-
-void BM_StreamEvent_Real(benchmark::State& state) {
-  static SectionSet set = Real({"stream-events-1.ts", "stream-events-2.ts"}, 0x3D, 0x3D);
-  ParseStreamEvents(state, set);
-}
-BENCHMARK(BM_StreamEvent_Real);
-
-void BM_StreamEvent_Built(benchmark::State& state) {
-  static SectionSet set = Built(bench::BuiltStreamEventSections());
-  ParseStreamEvents(state, set);
-}
-BENCHMARK(BM_StreamEvent_Built);
+RAVEL_MESSAGE_BENCHMARKS(DsmccDSI, RavelCDsmccDSI, 0x3B, RAVEL_DSMCC_MSG_DSI, bench::BuiltDsiSections());
+RAVEL_MESSAGE_BENCHMARKS(DsmccDII, RavelCDsmccDII, 0x3B, RAVEL_DSMCC_MSG_DII, bench::BuiltDiiSections());
+RAVEL_MESSAGE_BENCHMARKS(DsmccDDB, RavelCDsmccDDB, 0x3C, RAVEL_DSMCC_MSG_DDB, bench::BuiltDdbSections());
 
 }  // namespace
