@@ -1,0 +1,909 @@
+// ravel-dump run as a process, the way its users run it: bad input, packet
+// formats and resynchronisation, repeated tables, escaping of broadcast texts,
+// the summary and its JSON, filters, and the real captures when present.
+#include <gtest/gtest.h>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <cstdlib>
+#include <cstring>
+#include <filesystem>
+#include <fstream>
+#include <iterator>
+#include <string>
+#include <vector>
+
+#include <nlohmann/json.hpp>
+
+#include "Captures.h"
+#include "StreamBuilder.h"
+
+#ifdef RAVEL_DUMP_PATH
+
+namespace {
+
+namespace fs = std::filesystem;
+
+struct ToolRun {
+  int status = -1;  // exit status, or -1 when the tool did not exit normally
+  std::string out;
+  std::string err;
+};
+
+std::string ReadFile(const std::string& path) {
+  std::ifstream in(path.c_str(), std::ios::binary);
+  return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
+}
+
+void WriteFile(const std::string& path, const Bytes& bytes) {
+  std::ofstream out(path.c_str(), std::ios::binary);
+  out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+}
+
+size_t Lines(const std::string& text) {
+  size_t count = 0;
+  for (char c : text) count += c == '\n';
+  return count;
+}
+
+class RavelDumpTest : public ::testing::Test {
+ protected:
+  void SetUp() override {
+    char pattern[] = "/tmp/ravel_dump_test_XXXXXX";
+    ASSERT_NE(nullptr, mkdtemp(pattern));
+    dir_ = pattern;
+  }
+  void TearDown() override {
+    std::error_code ignored;
+    fs::permissions(dir_, fs::perms::owner_all, fs::perm_options::add, ignored);
+    fs::remove_all(dir_, ignored);
+  }
+
+  std::string Path(const std::string& name) const { return dir_ + "/" + name; }
+
+  std::string Write(const std::string& name, const Bytes& bytes) const {
+    WriteFile(Path(name), bytes);
+    return Path(name);
+  }
+
+  // Runs the tool with `args`; `input` becomes its standard input.
+  ToolRun Run(const std::vector<std::string>& args, const Bytes& input = Bytes()) const {
+    std::string in = Path(".stdin"), out = Path(".stdout"), err = Path(".stderr");
+    WriteFile(in, input);
+    pid_t child = fork();
+    if (child == 0) {
+      int fdIn = open(in.c_str(), O_RDONLY);
+      int fdOut = open(out.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+      int fdErr = open(err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
+      dup2(fdIn, 0);
+      dup2(fdOut, 1);
+      dup2(fdErr, 2);
+      std::vector<char*> argv;
+      argv.push_back(const_cast<char*>(RAVEL_DUMP_PATH));
+      for (const std::string& a : args) argv.push_back(const_cast<char*>(a.c_str()));
+      argv.push_back(nullptr);
+      execv(RAVEL_DUMP_PATH, argv.data());
+      _exit(127);
+    }
+    ToolRun run;
+    int status = 0;
+    if (child > 0 && waitpid(child, &status, 0) == child && WIFEXITED(status)) run.status = WEXITSTATUS(status);
+    run.out = ReadFile(out);
+    run.err = ReadFile(err);
+    return run;
+  }
+
+  std::string dir_;
+};
+
+// --- Built streams ---------------------------------------------------------
+
+Bytes PatSection(uint16_t tsId, uint8_t version, const std::vector<std::pair<int, int>>& programs) {
+  sb::SectionOptions options;
+  options.tableId = 0x00;
+  options.tableIdExtension = tsId;
+  options.version = version;
+  Bytes body;
+  for (const auto& p : programs) {
+    sb::Append(body, sb::U16(p.first));
+    sb::Append(body, sb::U16(0xE000 | p.second));
+  }
+  return sb::LongSection(options, body);
+}
+
+// An AIT section with one application carrying a name and a Ginga location.
+Bytes AitSection(const std::string& name, const std::string& base, const std::string& initial) {
+  Bytes nameBody = sb::Cat({sb::Text("por"), sb::U8(name.size()), sb::Text(name)});
+  Bytes locationBody = sb::Cat({sb::U8(base.size()), sb::Text(base), sb::U8(0), sb::Text(initial)});
+  Bytes descriptors = sb::Cat({sb::Descriptor(0x01, nameBody), sb::Descriptor(0x07, locationBody)});
+  Bytes application = sb::Cat({sb::U32(0x0000000A), sb::U16(0x0001), sb::U8(0x01),
+                               sb::U16(0xC000 | descriptors.size()), descriptors});
+  sb::SectionOptions options;
+  options.tableId = 0x74;
+  options.tableIdExtension = 0x0009;
+  Bytes body = sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | application.size()), application});
+  return sb::LongSection(options, body);
+}
+
+// DSM-CC download messages (ISO/IEC 13818-6) in sections 0x3B and 0x3C.
+Bytes DsmccMessage(uint16_t messageId, uint32_t transactionId, const Bytes& body) {
+  return sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(messageId), sb::U32(transactionId), sb::U8(0xFF), sb::U8(0),
+                  sb::U16(body.size()), body});
+}
+
+struct ModuleEntry {
+  uint16_t id;
+  uint32_t size;
+  uint8_t version;
+};
+
+Bytes DiiSection(uint32_t downloadId, uint16_t blockSize, const std::vector<ModuleEntry>& modules) {
+  Bytes body = sb::Cat({sb::U32(downloadId), sb::U16(blockSize), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0),
+                        sb::U16(0), sb::U16(modules.size())});
+  for (const ModuleEntry& m : modules) sb::Append(body, sb::Cat({sb::U16(m.id), sb::U32(m.size), sb::U8(m.version), sb::U8(0)}));
+  sb::Append(body, sb::U16(0));
+  sb::SectionOptions options;
+  options.tableId = 0x3B;
+  options.tableIdExtension = 0x0002;
+  return sb::LongSection(options, DsmccMessage(0x1002, 0x80000002, body));
+}
+
+Bytes DdbSection(uint32_t downloadId, uint16_t moduleId, uint8_t version, uint16_t block, const Bytes& data) {
+  Bytes body = sb::Cat({sb::U16(moduleId), sb::U8(version), sb::U8(0xFF), sb::U16(block), data});
+  sb::SectionOptions options;
+  options.tableId = 0x3C;
+  options.tableIdExtension = moduleId;
+  options.version = version & 0x1F;
+  options.sectionNumber = block & 0xFF;
+  return sb::LongSection(options, DsmccMessage(0x1003, downloadId, body));
+}
+
+Bytes ModuleBytes(size_t size, uint8_t seed) {
+  Bytes bytes(size);
+  for (size_t i = 0; i < size; ++i) bytes[i] = static_cast<uint8_t>(seed + i * 7 + (i >> 8));
+  return bytes;
+}
+
+Bytes Block(const Bytes& module, size_t blockSize, size_t number) {
+  size_t from = number * blockSize;
+  size_t to = std::min(module.size(), from + blockSize);
+  return Bytes(module.begin() + from, module.begin() + to);
+}
+
+Bytes Packets(uint16_t pid, const std::vector<Bytes>& sections, int repeat = 1) {
+  sb::PacketWriter writer(pid);
+  for (int r = 0; r < repeat; ++r)
+    for (const Bytes& s : sections) writer.AddSection(s);
+  return writer.Stream();
+}
+
+// 192-byte packets: a 4-byte time stamp before each; 204-byte: a 16-byte trailer.
+Bytes Reframe(const Bytes& stream, int size) {
+  Bytes out;
+  for (size_t at = 0; at + 188 <= stream.size(); at += 188) {
+    if (size == 192) sb::Append(out, {0x12, 0x34, 0x56, 0x78});
+    out.insert(out.end(), stream.begin() + at, stream.begin() + at + 188);
+    if (size == 204) out.insert(out.end(), 16, 0xA5);
+  }
+  return out;
+}
+
+// A one-segment broadcast as a receiver meets it: the PAT names the PMTs, the
+// one-segment PMT names the AIT and carousel PIDs, the EIT comes on the
+// one-segment EIT PID.
+Bytes ReceiverStream() {
+  sb::SectionOptions o;
+  o.tableId = 0x02;
+  o.tableIdExtension = 0x0642;
+  Bytes streams;
+  struct Stream {
+    uint8_t type;
+    uint16_t pid;
+    uint8_t tag;
+  } list[] = {{0x1B, 0x0111, 0x81}, {0x0F, 0x0112, 0x83}, {0x06, 0x0113, 0x87}, {0x05, 0x0114, 0x88},
+              {0x0D, 0x0115, 0x89}};
+  for (const Stream& s : list) {
+    sb::Append(streams, sb::Cat({sb::U8(s.type), sb::U16(0xE000 | s.pid),
+                                 sb::DescriptorLoop({sb::Descriptor(0x52, sb::U8(s.tag))})}));
+  }
+  Bytes pmt = sb::LongSection(o, sb::Cat({sb::U16(0xE000 | 0x0111), sb::DescriptorLoop({}), streams}));
+
+  o.tableId = 0x40;
+  o.tableIdExtension = 0x0640;
+  Bytes tsDescriptors = sb::Cat({
+      sb::Descriptor(0xCD, sb::Cat({sb::U8(5), sb::U8(5 << 2), sb::Text("Teste")})),
+      sb::Descriptor(0xFA, sb::Cat({sb::U16((0x2A5 << 4) | (1 << 2) | 2), sb::U16(3563), sb::U16(3605)})),
+      sb::Descriptor(0xFB, sb::U16(0x0642)),
+  });
+  Bytes tsLoop = sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::Length12(tsDescriptors.size()), tsDescriptors});
+  Bytes nit = sb::LongSection(
+      o, sb::Cat({sb::DescriptorLoop({sb::Descriptor(0x40, sb::Text("Rede Teste"))}), sb::Length12(tsLoop.size()),
+                  tsLoop}));
+
+  o.tableId = 0x42;
+  o.tableIdExtension = 0x0640;
+  Bytes services;
+  for (int id : {0x0641, 0x0642}) {
+    std::string name = id == 0x0641 ? "Canal" : "Canal 1seg";
+    Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(id == 0x0641 ? 0x01 : 0xC0), sb::U8(8), sb::Text("Emissora"),
+                                                  sb::U8(name.size()), sb::Text(name)}));
+    sb::Append(services, sb::Cat({sb::U16(id), sb::U8(0xFD), sb::U16(0x8000 | service.size()), service}));
+  }
+  Bytes sdt = sb::LongSection(o, sb::Cat({sb::U16(0x0640), sb::U8(0xFF), services}));
+
+  std::vector<Bytes> eit;
+  struct Event {
+    uint16_t id;
+    int hour, minute;
+    uint8_t hours, minutes, rating;
+    const char* name;
+  } events[] = {{1, 12, 0, 0x01, 0x30, 0x23, "Jornal"}, {2, 13, 30, 0x00, 0x45, 0x05, "Novela"}};
+  for (int n = 0; n < 2; ++n) {
+    const Event& e = events[n];
+    Bytes descriptors = sb::Cat({
+        sb::Descriptor(0x4D, sb::Cat({sb::Text("por"), sb::U8(strlen(e.name)), sb::Text(e.name), sb::U8(0)})),
+        sb::Descriptor(0x55, sb::Cat({sb::Text("BRA"), sb::U8(e.rating)})),
+    });
+    Bytes event = sb::Cat({sb::U16(e.id), sb::UtcTime(2013, 5, 10, e.hour, e.minute, 0), sb::U8(e.hours),
+                           sb::U8(e.minutes), sb::U8(0), sb::U16(0x8000 | descriptors.size()), descriptors});
+    o.tableId = 0x4E;
+    o.tableIdExtension = 0x0642;
+    o.sectionNumber = static_cast<uint8_t>(n);
+    o.lastSectionNumber = 1;
+    eit.push_back(sb::LongSection(o, sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::U8(1), sb::U8(0x4E), event})));
+  }
+
+  Bytes offset = sb::Descriptor(0x58, sb::Cat({sb::Text("BRA"), sb::U8((1 << 2) | 0x02 | 1), sb::U8(0x03), sb::U8(0x00),
+                                               sb::UtcTime(2013, 10, 20, 0, 0, 0), sb::U8(0x02), sb::U8(0x00)}));
+  Bytes tot = sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 12, 34, 56), sb::Length12(offset.size()), offset}),
+                               true);
+
+  Bytes ait = AitSection("Quiz", "/apps/quiz", "main.ncl");
+  Bytes module = ModuleBytes(100, 5);
+  return sb::Cat({
+      Packets(0x0114, {ait}),  // before the PMT names its PID: not read
+      Packets(0x0000, {PatSection(0x0640, 1, {{0x0641, 0x0100}, {0x0642, 0x1FC8}})}),
+      Packets(0x1FC8, {pmt}),
+      Packets(0x0010, {nit}),
+      Packets(0x0011, {sdt}),
+      Packets(0x0027, eit),
+      Packets(0x0014, {tot}),
+      Packets(0x0114, {ait}),
+      Packets(0x0115, {DiiSection(1, 1024, {{1, 100, 1}}), DdbSection(1, 1, 1, 0, module)}),
+  });
+}
+
+Bytes SamplePatStream() { return Packets(0x0000, {PatSection(0x1234, 3, {{1, 0x0300}, {2, 0x1FC8}})}, 6); }
+
+// --- Bad input --------------------------------------------------------------
+
+TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
+  Bytes good = SamplePatStream();
+  Bytes cut(good.begin(), good.end() - 100);
+  Bytes garbageAtEnd = good;
+  garbageAtEnd.insert(garbageAtEnd.end(), 300, 0x00);
+  Bytes text(2000, 'x');
+  Bytes sections = sb::Cat({PatSection(1, 0, {{1, 0x100}}), PatSection(1, 1, {{1, 0x100}})});
+  Bytes cutSections(sections.begin(), sections.end() - 3);
+  struct Case {
+    const char* what;
+    std::vector<std::string> args;  // "@" stands for the case's file
+    Bytes file;
+    bool makeFile;
+    Bytes input;
+    const char* message;
+  } cases[] = {
+      {"missing path", {"@"}, {}, false, {}, "No such file or directory"},
+      {"directory", {"DIR"}, {}, false, {}, "is a directory"},
+      {"empty file", {"@"}, {}, true, {}, "empty input"},
+      {"empty standard input", {"-"}, {}, false, {}, "standard input: empty input"},
+      {"text file", {"@"}, text, true, {}, "not a transport stream"},
+      {"cut in a packet", {"@"}, cut, true, {}, "truncated"},
+      {"cut on standard input", {"-"}, {}, false, cut, "truncated"},
+      {"garbage at the end", {"@"}, garbageAtEnd, true, {}, "truncated"},
+      {"sections cut", {"--sections", "@"}, cutSections, true, {}, "truncated"},
+      {"not sections", {"--sections", "@"}, text, true, {}, "not a file of raw sections"},
+      {"stream given as sections", {"--sections", "@"}, good, true, {}, "a transport stream, not raw sections"},
+      {"empty sections", {"--sections", "@"}, {}, true, {}, "empty input"},
+  };
+  for (const Case& c : cases) {
+    std::string file = Path("input.bin");
+    fs::remove(file);
+    if (c.makeFile) WriteFile(file, c.file);
+    std::vector<std::string> args;
+    for (const std::string& a : c.args) args.push_back(a == "@" ? file : a == "DIR" ? dir_ : a);
+    args.insert(args.begin(), {"--extract-modules", Path("modules")});
+    ToolRun run = Run(args, c.input);
+    EXPECT_EQ(1, run.status) << c.what;
+    EXPECT_EQ("", run.out) << c.what;
+    EXPECT_EQ(1u, Lines(run.err)) << c.what << ": " << run.err;
+    EXPECT_EQ(0u, run.err.find("ravel-dump: ")) << c.what << ": " << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.message)) << c.what << ": " << run.err;
+    EXPECT_FALSE(fs::exists(Path("modules"))) << c.what;
+  }
+}
+
+TEST_F(RavelDumpTest, UnreadableFileIsReportedAsSuch) {
+  if (geteuid() == 0) GTEST_SKIP() << "permissions do not apply to root";
+  std::string file = Write("locked.ts", SamplePatStream());
+  chmod(file.c_str(), 0);
+  ToolRun run = Run({file});
+  EXPECT_EQ(1, run.status);
+  EXPECT_EQ("", run.out);
+  EXPECT_EQ("ravel-dump: " + file + ": Permission denied\n", run.err);
+}
+
+TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
+  std::string file = Write("pat.ts", SamplePatStream());
+  struct Case {
+    std::vector<std::string> args;
+    const char* message;
+  } cases[] = {
+      {{}, "no capture given"},
+      {{"--frobnicate", file}, "frobnicate"},
+      {{"--standard", "mars", file}, "unknown standard 'mars'"},
+      {{"--pid", "9000", file}, "bad PID '9000'"},
+      {{"--pid", "0x10,zz", file}, "bad PID 'zz'"},
+      {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
+      {{"--trace", "loud", file}, "unknown trace level 'loud'"},
+      {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"},
+      {{file, file}, "only one capture"},
+  };
+  for (const Case& c : cases) {
+    ToolRun run = Run(c.args);
+    EXPECT_EQ(2, run.status) << c.message;
+    EXPECT_EQ("", run.out) << c.message;
+    EXPECT_EQ(1u, Lines(run.err)) << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.message)) << run.err;
+  }
+}
+
+TEST_F(RavelDumpTest, HelpAndVersionGoToStandardOutput) {
+  ToolRun help = Run({"--help"});
+  EXPECT_EQ(0, help.status);
+  EXPECT_EQ("", help.err);
+  for (const char* option : {"--summary", "--json", "--extract-modules", "--sections", "--standard", "--pid",
+                             "--table", "--trace", "--version"}) {
+    EXPECT_NE(std::string::npos, help.out.find(option)) << option;
+  }
+  ToolRun version = Run({"--version"});
+  EXPECT_EQ(0, version.status);
+  EXPECT_EQ(0u, version.out.find("ravel-dump "));
+  EXPECT_EQ(1u, Lines(version.out));
+}
+
+// --- Packets ------------------------------------------------------------------
+
+TEST_F(RavelDumpTest, PacketSizesAndGarbageGiveTheSameTables) {
+  Bytes plain = SamplePatStream();
+  Bytes garbage = plain;
+  // Garbage holding a stray sync byte between the fifth and sixth packets.
+  Bytes junk(77, 0x00);
+  junk[10] = 0x47;
+  garbage.insert(garbage.begin() + 5 * 188, junk.begin(), junk.end());
+  Bytes leading = junk;
+  sb::Append(leading, plain);
+  struct Case {
+    const char* what;
+    Bytes stream;
+    const char* inputLine;
+  } cases[] = {
+      {"188", plain, "input: 6 packets of 188 bytes, 0 bytes skipped, 0 resyncs"},
+      {"192", Reframe(plain, 192), "input: 6 packets of 192 bytes, 0 bytes skipped, 0 resyncs"},
+      {"204", Reframe(plain, 204), "input: 6 packets of 204 bytes, 0 bytes skipped, 0 resyncs"},
+      {"garbage between packets", garbage, "input: 6 packets of 188 bytes, 77 bytes skipped, 1 resyncs"},
+      {"garbage before the first packet", leading, "input: 6 packets of 188 bytes, 77 bytes skipped, 0 resyncs"},
+  };
+  ToolRun reference = Run({Write("plain.ts", plain)});
+  ASSERT_EQ(0, reference.status) << reference.err;
+  EXPECT_NE(std::string::npos, reference.out.find("== PAT on PID 0x0000: table_id 0x00, id 0x1234, version 3"));
+  for (const Case& c : cases) {
+    ToolRun run = Run({Write("case.ts", c.stream)});
+    EXPECT_EQ(0, run.status) << c.what << run.err;
+    EXPECT_EQ(reference.out, run.out) << c.what;
+    EXPECT_NE(std::string::npos, run.err.find(c.inputLine)) << c.what << "\n" << run.err;
+  }
+  ToolRun piped = Run({"-"}, plain);
+  EXPECT_EQ(reference.out, piped.out);
+  EXPECT_NE(std::string::npos, piped.err.find("report: standard input"));
+}
+
+TEST_F(RavelDumpTest, RepeatedTableIsShownOnceWithItsCount) {
+  Bytes v3 = PatSection(0x1234, 3, {{1, 0x0100}});
+  Bytes v4 = PatSection(0x1234, 4, {{1, 0x0100}, {2, 0x0101}});
+  sb::PacketWriter writer(0x0000);
+  for (int i = 0; i < 4; ++i) writer.AddSection(v3);
+  for (int i = 0; i < 2; ++i) writer.AddSection(v4);
+  writer.AddSection(v3);  // back to the first contents: the same table again
+  ToolRun run = Run({Write("pat.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("version 3, section 0 of 1, seen 5 times\n"));
+  EXPECT_NE(std::string::npos, run.out.find("version 4, section 0 of 1, seen 2 times\n"));
+  size_t headers = 0;
+  for (size_t at = run.out.find("== "); at != std::string::npos; at = run.out.find("\n== ", at + 1)) ++headers;
+  EXPECT_EQ(2u, headers);
+  EXPECT_LT(run.out.find("version 3"), run.out.find("version 4"));  // first-seen order
+  EXPECT_NE(std::string::npos, run.out.find("The number of PMT Table Info=[2]\n"));
+}
+
+TEST_F(RavelDumpTest, CorruptSectionsAreCountedNotShown) {
+  Bytes good = PatSection(0x1234, 3, {{1, 0x0100}});
+  Bytes bad = good;
+  bad[9] ^= 0x01;  // a program_number bit: the CRC no longer verifies
+  sb::PacketWriter writer(0x0000);
+  writer.AddSection(bad);
+  writer.AddSection(good);
+  ToolRun run = Run({Write("pat.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("seen 1 time\n"));
+  EXPECT_NE(std::string::npos, run.err.find("2 assembled, 1 CRC failures"));
+  EXPECT_NE(std::string::npos, run.err.find("PID 0x0000 table_id 0x00: CRC failure"));
+}
+
+TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
+  sb::PacketWriter writer(0x0000);
+  Bytes pat = PatSection(0x1234, 3, {{1, 0x0100}});
+  writer.AddSection(pat);
+  writer.AddSection(pat);
+  writer.SetCounter(9);  // a jump from 2 to 9
+  writer.AddSection(pat);
+  ToolRun run = Run({Write("pat.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0000          3          1        0         3  PAT\n")) << run.err;
+}
+
+TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
+  // Each section has a good CRC; one declared length points past its parent.
+  sb::SectionOptions pmt;
+  pmt.tableId = 0x02;
+  sb::SectionOptions sdt;
+  sdt.tableId = 0x42;
+  sb::SectionOptions eit;
+  eit.tableId = 0x4E;
+  sb::SectionOptions ait;
+  ait.tableId = 0x74;
+  sb::SectionOptions dii;
+  dii.tableId = 0x3B;
+  Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(1), sb::U8(0), sb::U8(3), sb::Text("abc")}));
+  service[1] = 40;  // the descriptor claims more than its loop holds
+  Bytes diiBody = sb::Cat({sb::U32(1), sb::U16(512), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0), sb::U16(0),
+                           sb::U16(3), sb::U16(1), sb::U32(10), sb::U8(1), sb::U8(0), sb::U16(0)});
+  Bytes ddb = DdbSection(1, 1, 1, 0, ModuleBytes(10, 0));
+  ddb[8 + 10] = 0x01;  // messageLength: 256 more than the section holds
+  sb::FixCrc(ddb);
+  struct Case {
+    const char* what;
+    Bytes section;
+    const char* kind;
+    const char* reason;
+  } cases[] = {
+      {"PMT program info", sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(200)})), "PMT",
+       "loop runs past its parent's end at byte 10"},
+      {"PMT stream", sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
+                                                   sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
+       "PMT", "loop entry runs past its loop's end at byte 12"},
+      {"SDT service descriptor", sb::LongSection(sdt, sb::Cat({sb::U16(1), sb::U8(0xFF), sb::U16(1), sb::U8(0xFC),
+                                                              sb::U16(0x8000 | service.size()), service})),
+       "SDT", "descriptor runs past its loop's end at byte 16"},
+      {"EIT event", sb::LongSection(eit, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x4E), sb::U16(1),
+                                                 sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
+                                                 sb::U16(0x8000 | 60)})),
+       "EIT p/f", "loop entry runs past its loop's end at byte 14"},
+      {"AIT application loop", sb::LongSection(ait, sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | 90)})), "AIT",
+       "application loop runs past the section at byte 10"},
+      {"DII module list", sb::LongSection(dii, DsmccMessage(0x1002, 2, diiBody)), "DII",
+       "DII module record cut by the message end"},
+      {"DDB message", ddb, "DDB", "DSM-CC message runs past the section at byte 18"},
+      {"TOT loop", sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::Length12(20)}), true), "TOT",
+       "loop runs past its parent's end at byte 8"},
+  };
+  for (const Case& c : cases) {
+    ToolRun run = Run({"--sections", Write("bad.sections", sb::Cat({PatSection(1, 0, {{1, 0x100}}), c.section}))});
+    ASSERT_EQ(0, run.status) << c.what << run.err;
+    EXPECT_EQ(std::string::npos, run.out.find(std::string("== ") + c.kind)) << c.what;
+    EXPECT_NE(std::string::npos, run.err.find(", 1 malformed,")) << c.what << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.reason)) << c.what << run.err;
+  }
+}
+
+// --- Texts, summary, JSON, filters -------------------------------------------
+
+TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
+  // An escape sequence, a bell, a C1 control byte (alone and as UTF-8), 8-bit
+  // Latin text, and UTF-8 text, which is the one thing printed as it came.
+  std::string name = std::string("Jogo\x1b[31m\x07") + "\x9b" + "fim\\ caf\xc3\xa9 \xe9t\xe9 \xc2\x9b";
+  const std::string escaped = "Jogo\\x1b[31m\\x07\\x9bfim\\\\ caf\xc3\xa9 \\xe9t\\xe9 \\xc2\\x9b";
+  Bytes stream = Packets(0x0100, {AitSection(name, "/apps", "main.ncl")});
+  std::string file = Write("ait.ts", stream);
+
+  ToolRun dump = Run({"--pid", "0x100", file});
+  ASSERT_EQ(0, dump.status) << dump.err;
+  EXPECT_NE(std::string::npos, dump.out.find("\t App Name.........: " + escaped)) << dump.out;
+  ToolRun summary = Run({"--pid", "0x100", "--summary", file});
+  ASSERT_EQ(0, summary.status) << summary.err;
+  EXPECT_NE(std::string::npos, summary.out.find("name \"" + escaped + "\"")) << summary.out;
+  ToolRun json = Run({"--pid", "0x100", "--json", file});
+  ASSERT_EQ(0, json.status) << json.err;
+  nlohmann::json document = nlohmann::json::parse(json.out);
+  ASSERT_EQ(1u, document["applications"].size());
+  EXPECT_EQ(escaped, document["applications"][0]["name"].get<std::string>());
+  for (const ToolRun* run : {&dump, &summary, &json}) {
+    std::string out = run->out;
+    for (size_t at = out.find("\xc3\xa9"); at != std::string::npos; at = out.find("\xc3\xa9")) out.erase(at, 2);
+    for (char c : out) {
+      unsigned char byte = static_cast<unsigned char>(c);
+      EXPECT_TRUE(byte == '\n' || byte == '\t' || (byte >= 0x20 && byte < 0x7F)) << static_cast<int>(byte);
+    }
+  }
+}
+
+TEST_F(RavelDumpTest, SummaryListsGingaApplications) {
+  Bytes stream = Packets(0x0100, {AitSection("Quiz", "/apps/quiz", "main.ncl")}, 3);
+  ToolRun run = Run({"--pid", "0x100", "--summary", Write("ait.ts", stream)});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos,
+            run.out.find("Ginga applications (1):\n  PID 0x0100 type 0x0009: organization 0x0000000a application "
+                         "0x0001 control 1 (autostart) name \"Quiz\" path \"/apps/quiz\" file \"main.ncl\"\n"))
+      << run.out;
+  ToolRun json = Run({"--pid", "0x100", "--json", Path("ait.ts")});
+  nlohmann::json app = nlohmann::json::parse(json.out)["applications"][0];
+  EXPECT_EQ(0x100, app["pid"].get<int>());
+  EXPECT_EQ(9, app["application_type"].get<int>());
+  EXPECT_EQ(10u, app["organization_id"].get<unsigned>());
+  EXPECT_EQ(1u, app["application_id"].get<unsigned>());
+  EXPECT_EQ(1u, app["control_code"].get<unsigned>());
+  EXPECT_EQ(1, app["document_resolution"].get<int>());
+  EXPECT_EQ("/apps/quiz", app["path"].get<std::string>());
+  EXPECT_EQ("main.ncl", app["file"].get<std::string>());
+}
+
+TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
+  Bytes stream = sb::Cat({SamplePatStream(), Packets(0x0100, {AitSection("Quiz", "/", "a.ncl")})});
+  std::string file = Write("mix.ts", stream);
+  struct Case {
+    std::vector<std::string> args;
+    bool pat, ait;
+  } cases[] = {
+      {{file}, true, false},  // nothing names PID 0x0100 as an AIT PID
+      {{"--pid", "0x100", file}, false, true},
+      {{"--pid", "0,0x100", file}, true, true},
+      {{"--pid", "0", "--pid", "256", file}, true, true},
+      {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
+      {{"--pid", "0,0x100", "--table", "0x00", file}, true, false},
+  };
+  for (const Case& c : cases) {
+    ToolRun run = Run(c.args);
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_EQ(c.pat, run.out.find("== PAT") != std::string::npos) << c.args[0];
+    EXPECT_EQ(c.ait, run.out.find("== AIT on PID 0x0100") != std::string::npos) << c.args[0];
+  }
+}
+
+TEST_F(RavelDumpTest, RawSectionsAreReadWithoutPids) {
+  Bytes sections = sb::Cat({PatSection(0x1234, 3, {{1, 0x0100}}), Bytes(5, 0xFF), AitSection("Quiz", "/", "a.ncl"),
+                            PatSection(0x1234, 3, {{1, 0x0100}})});
+  ToolRun run = Run({"--sections", Write("all.sections", sections)});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("== PAT: table_id 0x00, id 0x1234, version 3, section 0 of 1, seen 2 times"));
+  EXPECT_NE(std::string::npos, run.out.find("== AIT: table_id 0x74"));
+  EXPECT_NE(std::string::npos, run.err.find("input: " + std::to_string(sections.size()) + " bytes of raw sections"));
+}
+
+TEST_F(RavelDumpTest, TraceLevelsShowTheLibrarysOwnTraces) {
+  std::string file = Write("ait.ts", Packets(0x0100, {AitSection("Quiz", "/", "a.ncl")}));
+  ToolRun quiet = Run({"--pid", "0x100", "--quiet", file});
+  EXPECT_EQ("", quiet.err);
+  ToolRun traced = Run({"--pid", "0x100", "--quiet", "--trace", "warning", file});
+  EXPECT_NE(std::string::npos, traced.err.find("RavelCAIT::ParseRawData... apRawData=")) << traced.err;
+  EXPECT_NE(std::string::npos, traced.err.find("[0x40000020 SectionParser/source/Ravel_CTableAIT:"));
+  EXPECT_EQ(quiet.out, traced.out);
+}
+
+// --- Data carousel ------------------------------------------------------------
+
+TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
+  const uint16_t kBlock = 4066;
+  Bytes big = ModuleBytes(10000, 1);    // three blocks, the last one short
+  Bytes small = ModuleBytes(300, 2);    // one block
+  Bytes gappy = ModuleBytes(9000, 3);   // block 1 never comes
+  Bytes wrong = ModuleBytes(5000, 4);   // its last block comes too long
+  std::vector<Bytes> sections = {
+      DdbSection(7, 1, 5, 2, Block(big, kBlock, 2)),  // blocks before the DII and out of order
+      DiiSection(7, kBlock, {{1, 10000, 5}, {2, 300, 5}, {3, 9000, 5}, {4, 5000, 5}, {5, 0, 5}}),
+      DdbSection(7, 1, 5, 0, Block(big, kBlock, 0)),
+      DdbSection(7, 1, 4, 1, ModuleBytes(kBlock, 9)),  // an older version of the module: not used
+      DdbSection(8, 1, 5, 1, ModuleBytes(kBlock, 9)),  // another download: not used
+      DdbSection(7, 2, 5, 0, small),
+      DdbSection(7, 3, 5, 0, Block(gappy, kBlock, 0)),
+      DdbSection(7, 3, 5, 2, Block(gappy, kBlock, 2)),
+      DdbSection(7, 4, 5, 0, Block(wrong, kBlock, 0)),
+      DdbSection(7, 4, 5, 1, ModuleBytes(1000, 4)),
+      DdbSection(7, 1, 5, 1, Block(big, kBlock, 1)),
+      DdbSection(7, 1, 5, 0, Block(big, kBlock, 0)),  // a repeat
+  };
+  std::string out = Path("modules");
+  ToolRun run = Run({"--pid", "0x0200", "--extract-modules", out, "--json", Write("dc.ts", Packets(0x0200, sections))});
+  ASSERT_EQ(0, run.status) << run.err;
+  nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
+  ASSERT_EQ(1u, carousels.size());
+  EXPECT_EQ(0x200, carousels[0]["pid"].get<int>());
+  EXPECT_EQ(7u, carousels[0]["download_id"].get<unsigned>());
+  EXPECT_EQ(kBlock, carousels[0]["block_size"].get<int>());
+  struct Expect {
+    int id;
+    unsigned received, total;
+    bool complete;
+    const Bytes* bytes;
+  } expected[] = {{1, 3, 3, true, &big}, {2, 1, 1, true, &small}, {3, 2, 3, false, nullptr},
+                  {4, 1, 2, false, nullptr}, {5, 0, 0, true, nullptr}};
+  const nlohmann::json& modules = carousels[0]["modules"];
+  ASSERT_EQ(5u, modules.size());
+  for (size_t i = 0; i < 5; ++i) {
+    const Expect& e = expected[i];
+    EXPECT_EQ(e.id, modules[i]["id"].get<int>());
+    EXPECT_EQ(5, modules[i]["version"].get<int>());
+    EXPECT_EQ(e.received, modules[i]["blocks_received"].get<unsigned>()) << e.id;
+    EXPECT_EQ(e.total, modules[i]["blocks_total"].get<unsigned>()) << e.id;
+    EXPECT_EQ(e.complete, modules[i]["complete"].get<bool>()) << e.id;
+    char name[64];
+    std::snprintf(name, sizeof name, "pid0200_dl00000007_module%04x_v5.bin", e.id);
+    std::string file = out + "/" + name;
+    EXPECT_EQ(e.complete, fs::exists(file)) << file;
+    if (e.complete) {
+      EXPECT_EQ(file, modules[i]["file"].get<std::string>());
+      std::string contents = ReadFile(file);
+      Bytes want = e.bytes != nullptr ? *e.bytes : Bytes();
+      EXPECT_EQ(std::string(want.begin(), want.end()), contents) << e.id;
+    } else {
+      EXPECT_TRUE(modules[i]["file"].is_null());
+    }
+  }
+  size_t files = 0;
+  for (const auto& entry : fs::directory_iterator(out)) {
+    EXPECT_NE('.', entry.path().filename().string()[0]) << "temporary file left: " << entry.path();
+    ++files;
+  }
+  EXPECT_EQ(3u, files);
+
+  ToolRun list = Run({"--pid", "0x0200", "--extract-modules", out, Path("dc.ts")});
+  EXPECT_EQ(out + "/pid0200_dl00000007_module0001_v5.bin\n" + out + "/pid0200_dl00000007_module0002_v5.bin\n" + out +
+                "/pid0200_dl00000007_module0005_v5.bin\n",
+            list.out);
+  ToolRun text = Run({"--pid", "0x0200", "--summary", Path("dc.ts")});
+  EXPECT_NE(std::string::npos, text.out.find("  PID 0x0200 download 0x00000007, block size 4066\n"
+                                             "    module 0x0001 version 5, 10000 bytes, complete\n"
+                                             "    module 0x0002 version 5, 300 bytes, complete\n"
+                                             "    module 0x0003 version 5, 9000 bytes, 2 of 3 blocks\n"
+                                             "    module 0x0004 version 5, 5000 bytes, 1 of 2 blocks\n"))
+      << text.out;
+}
+
+TEST_F(RavelDumpTest, ModuleDirectoryThatCannotBeMadeFailsCleanly) {
+  Bytes stream = Packets(0x0200, {DiiSection(7, 100, {{1, 10, 1}}), DdbSection(7, 1, 1, 0, ModuleBytes(10, 0))});
+  std::string blocker = Write("file", Bytes(1, 0));
+  ToolRun run = Run({"--pid", "0x200", "--extract-modules", blocker + "/sub", Write("dc.ts", stream)});
+  EXPECT_EQ(1, run.status);
+  EXPECT_EQ("", run.out);
+  EXPECT_EQ(1u, Lines(run.err)) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("cannot make the module directory"));
+}
+
+TEST_F(RavelDumpTest, ObjectCarouselCaptureModulesAreComplete) {
+  std::string capture = captures::Path("object-carousel.ts");
+  if (capture.empty()) GTEST_SKIP() << "shared capture object-carousel.ts absent";
+  std::string out = Path("modules");
+  ToolRun run = Run({"--pid", "0x076a", "--extract-modules", out, "--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
+  ASSERT_EQ(1u, carousels.size());
+  const nlohmann::json& modules = carousels[0]["modules"];
+  ASSERT_EQ(3u, modules.size());
+  for (const nlohmann::json& module : modules) {
+    EXPECT_TRUE(module["complete"].get<bool>()) << module.dump();
+    std::string file = module["file"].get<std::string>();
+    EXPECT_EQ(module["size"].get<uintmax_t>(), fs::file_size(file)) << file;
+  }
+  EXPECT_NE(std::string::npos, run.err.find("0x076a       6405")) << run.err;
+}
+
+// --- A receiver's whole path -------------------------------------------------
+
+TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
+  std::string file = Write("oneseg.ts", ReceiverStream());
+  ToolRun run = Run({"--summary", file});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_EQ(
+      "Standard: brazil\n"
+      "Network: \"Rede Teste\" (network_id 0x0640)\n"
+      "Transport stream: 0x0640\n"
+      "  TS 0x0640 of network 0x0640 \"Teste\", remote control key 5\n"
+      "    area code 0x2a5, guard interval 1/16, mode 3\n"
+      "    frequencies: 509.000 MHz (3563) 515.000 MHz (3605)\n"
+      "    partial reception: 0x06\n"
+      "Services (2):\n"
+      "  Service 0x0641 digital TV (0x01) \"Canal\" provider \"Emissora\"\n"
+      "    PMT 0x0100, PCR -, video -, audio -, captions -\n"
+      "  Service 0x0642 data (0xc0) one-segment \"Canal 1seg\" provider \"Emissora\"\n"
+      "    PMT 0x1fc8, PCR 0x0111, video 0x0111, audio 0x0112, captions 0x0113\n"
+      "      stream 0x1b H.264 video on 0x0111, component tag 0x81\n"
+      "      stream 0x0f AAC (ADTS) on 0x0112, component tag 0x83\n"
+      "      stream 0x06 PES private data on 0x0113, component tag 0x87\n"
+      "      stream 0x05 private sections on 0x0114, component tag 0x88\n"
+      "      stream 0x0d DSM-CC sections on 0x0115, component tag 0x89\n"
+      "    present:   2013-05-10 12:00:00 for 01:30:00 \"Jornal\" rating BRA age 12 content 0x2 (event 0x0001)\n"
+      "    following: 2013-05-10 13:30:00 for 00:45:00 \"Novela\" rating BRA age 16 (event 0x0002)\n"
+      "Time: 2013-05-10 12:34:56 (TOT)\n"
+      "  local time offset BRA region 1: -03:00, changes 2013-10-20 00:00:00 to -02:00\n"
+      "Ginga applications (1):\n"
+      "  PID 0x0114 type 0x0009: organization 0x0000000a application 0x0001 control 1 (autostart) name \"Quiz\" "
+      "path \"/apps/quiz\" file \"main.ncl\"\n"
+      "Carousel modules (1):\n"
+      "  PID 0x0115 download 0x00000001, block size 1024\n"
+      "    module 0x0001 version 1, 100 bytes, complete\n",
+      run.out);
+  // Packets of a PID that nothing has named yet are not read.
+  EXPECT_NE(std::string::npos, run.err.find("  0x0114          2          0        0         1  AIT\n")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0027          2          0        0         2  EIT\n")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0115          2          0        0         2  data carousel\n"))
+      << run.err;
+
+  // The broadcast standard decides how the ratings read (ARIB: rating + 3 years).
+  ToolRun japan = Run({"--standard", "japan", "--summary", file});
+  EXPECT_NE(std::string::npos, japan.out.find("Standard: japan\n"));
+  EXPECT_NE(std::string::npos, japan.out.find("\"Jornal\" rating BRA age 0 (event 0x0001)"));
+  EXPECT_NE(std::string::npos, japan.out.find("\"Novela\" rating BRA age 8 (event 0x0002)"));
+}
+
+TEST_F(RavelDumpTest, DumpShowsEachTableOnceInFirstSeenOrder) {
+  ToolRun run = Run({Write("oneseg.ts", ReceiverStream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  std::vector<std::string> headers;
+  for (size_t at = 0; (at = run.out.find("== ", at)) != std::string::npos;) {
+    if (at == 0 || run.out[at - 1] == '\n') headers.push_back(run.out.substr(at, run.out.find(':', at) - at));
+    at = run.out.find('\n', at);
+  }
+  EXPECT_EQ((std::vector<std::string>{"== PAT on PID 0x0000", "== PMT on PID 0x1fc8", "== NIT on PID 0x0010",
+                                      "== SDT on PID 0x0011", "== EIT p/f on PID 0x0027", "== TOT on PID 0x0014",
+                                      "== AIT on PID 0x0114", "== DII on PID 0x0115", "== DDB on PID 0x0115"}),
+            headers)
+      << run.out;
+  EXPECT_NE(std::string::npos, run.out.find("== EIT p/f on PID 0x0027: table_id 0x4e, id 0x0642, version 0, "
+                                            "2 sections up to number 1, seen 1 time\n"));
+  // The two EIT sections are joined with the table's operator+=: one dump, both events.
+  EXPECT_NE(std::string::npos, run.out.find("##################### Event Information [1] #####################\n"));
+  EXPECT_NE(std::string::npos, run.out.find("Stream Information. Size=[5]\n"));
+  EXPECT_NE(std::string::npos, run.out.find("\tNetwork Name=[Rede Teste]\n"));
+}
+
+// --- Real captures --------------------------------------------------------------
+
+TEST_F(RavelDumpTest, JapanesePsiSectionsGiveServicesAndTheirPids) {
+  std::string capture = captures::Path("isdbt-japan-psi.sections");
+  if (capture.empty()) GTEST_SKIP() << "shared capture isdbt-japan-psi.sections absent";
+  ToolRun run = Run({"--sections", "--standard", "japan", "--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  nlohmann::json summary = nlohmann::json::parse(run.out);
+  EXPECT_EQ("japan", summary["standard"].get<std::string>());
+  EXPECT_EQ(0x7ED0, summary["transport_stream_id"].get<int>());
+  struct Expect {
+    int id, pmt, video;
+    std::vector<int> audio;
+    int captions;
+    bool oneSegment;
+  } expected[] = {
+      // The PAT's order: by program number, the one-segment program last.
+      {0x4800, 0x01F0, 0x0100, {0x0110}, 0x0130, false},
+      {0x4801, 0x03F0, 0x0100, {0x0110}, 0x0130, false},
+      {0xFFF0, 0x1CF0, -1, {}, -1, false},
+      {0x4980, 0x1FC8, 0x0581, {0x0583}, 0x0587, true},
+  };
+  const nlohmann::json& services = summary["services"];
+  ASSERT_EQ(4u, services.size()) << services.dump(1);
+  for (size_t i = 0; i < 4; ++i) {
+    const Expect& e = expected[i];
+    const nlohmann::json& s = services[i];
+    EXPECT_EQ(e.id, s["id"].get<int>());
+    EXPECT_EQ(e.pmt, s["pmt_pid"].get<int>()) << e.id;
+    EXPECT_EQ(e.video, s["video_pid"].is_null() ? -1 : s["video_pid"].get<int>()) << e.id;
+    EXPECT_EQ(e.audio, s["audio_pids"].get<std::vector<int>>()) << e.id;
+    EXPECT_EQ(e.captions, s["caption_pid"].is_null() ? -1 : s["caption_pid"].get<int>()) << e.id;
+    EXPECT_EQ(e.oneSegment, s["one_segment"].get<bool>()) << e.id;
+  }
+  EXPECT_FALSE(summary["network"].is_null());
+  EXPECT_EQ(0x7ED0, summary["network"]["id"].get<int>());
+  EXPECT_FALSE(services[0]["present"].is_null());
+  EXPECT_FALSE(services[0]["following"].is_null());
+}
+
+TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
+  std::string capture = captures::Path("ait.ts");
+  if (capture.empty()) GTEST_SKIP() << "shared capture ait.ts absent";
+  ToolRun run = Run({"--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  // The AIT PIDs are found as a receiver finds them: named by the PMTs.
+  EXPECT_NE(std::string::npos, run.err.find("  0x1ec5          2          0        0         2  AIT\n")) << run.err;
+  struct Expect {
+    int pid;
+    unsigned applicationId, controlCode;
+    const char* name;
+  } expected[] = {
+      {0x1EC5, 0x1AB5, 2, "Programmi TV BB SAT"},
+      {0x1EC6, 0x1AB6, 1, "Launcher SAT"},
+      {0x1EC7, 0x1AB7, 2, "Programmi TV SAT"},
+  };
+  nlohmann::json applications = nlohmann::json::parse(run.out)["applications"];
+  ASSERT_EQ(3u, applications.size()) << applications.dump(1);
+  for (const Expect& e : expected) {
+    bool found = false;
+    for (const nlohmann::json& app : applications) {
+      if (app["pid"].get<int>() != e.pid) continue;
+      found = true;
+      EXPECT_EQ(0x0Bu, app["organization_id"].get<unsigned>());
+      EXPECT_EQ(e.applicationId, app["application_id"].get<unsigned>());
+      EXPECT_EQ(e.controlCode, app["control_code"].get<unsigned>());
+      EXPECT_EQ(e.name, app["name"].get<std::string>());
+      EXPECT_EQ(1, app["application_type"].get<int>());
+    }
+    EXPECT_TRUE(found) << e.name;
+  }
+}
+
+TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
+  std::string capture = captures::Path("dvb-epg.ts");
+  if (capture.empty()) GTEST_SKIP() << "shared capture dvb-epg.ts absent";
+  ToolRun run = Run({"--json", capture});
+  ASSERT_EQ(0, run.status) << run.err;
+  // The capture's one corrupt EIT section is counted and left out.
+  EXPECT_NE(std::string::npos, run.err.find(" 1 CRC failures,")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("PID 0x0012 table_id 0x4e: CRC failure")) << run.err;
+  nlohmann::json summary = nlohmann::json::parse(run.out);
+  std::vector<int> ids;
+  for (const nlohmann::json& s : summary["services"]) {
+    ids.push_back(s["id"].get<int>());
+    EXPECT_FALSE(s["present"].is_null()) << s.dump();
+    EXPECT_FALSE(s["following"].is_null()) << s.dump();
+  }
+  EXPECT_EQ((std::vector<int>{0x0401, 0x0402, 0x0407, 0x0415, 0x0416}), ids);
+  const nlohmann::json& w9 = summary["services"][1];
+  EXPECT_EQ("W9", w9["name"].get<std::string>());
+  EXPECT_EQ("Multi4", w9["provider"].get<std::string>());
+  struct Expect {
+    const char* which;
+    int eventId, hour, minute, hours, minutes;
+  } events[] = {{"present", 0x1C, 12, 35, 0, 50}, {"following", 0x1D, 13, 25, 0, 55}};
+  for (const Expect& e : events) {
+    const nlohmann::json& event = w9[e.which];
+    EXPECT_EQ(e.eventId, event["event_id"].get<int>()) << e.which;
+    EXPECT_EQ("\\x05NCIS", event["name"].get<std::string>()) << e.which;
+    EXPECT_EQ((nlohmann::json{{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", e.hour}, {"minute", e.minute},
+                              {"second", 0}}),
+              event["start"]);
+    EXPECT_EQ(e.hours, event["duration"]["hours"].get<int>());
+    EXPECT_EQ(e.minutes, event["duration"]["minutes"].get<int>());
+    EXPECT_EQ("fra", event["ratings"][0]["country"].get<std::string>());
+  }
+  const nlohmann::json& time = summary["time"];
+  EXPECT_EQ("TOT", time["source"].get<std::string>());
+  EXPECT_EQ((nlohmann::json{{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", 12}, {"minute", 52}, {"second", 9}}),
+            time["time"]);
+  ASSERT_EQ(1u, time["local_time_offsets"].size());
+  const nlohmann::json& offset = time["local_time_offsets"][0];
+  EXPECT_EQ("FRA", offset["country"].get<std::string>());
+  EXPECT_EQ(1, offset["offset"]["hours"].get<int>());
+  EXPECT_EQ(2, offset["next_offset"]["hours"].get<int>());
+  EXPECT_EQ(3, offset["time_of_change"]["month"].get<int>());
+
+  ToolRun dump = Run({"--table", "eit", capture});
+  ASSERT_EQ(0, dump.status);
+  EXPECT_NE(std::string::npos, dump.out.find("== EIT schedule on PID 0x0012: table_id 0x50, id 0x0401, version 5"));
+  EXPECT_NE(std::string::npos, dump.out.find("###################### EIT Table Information ######################\n"));
+  EXPECT_EQ(std::string::npos, dump.out.find("== SDT"));
+}
+
+}  // namespace
+
+#endif  // RAVEL_DUMP_PATH

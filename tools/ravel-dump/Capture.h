@@ -1,0 +1,46 @@
+// What the tool makes of a capture while it is read: each section from the
+// demultiplexer (or from a file of raw sections) is checked, counted, kept
+// once in the table registry, and used at once where a receiver would use it:
+// a PAT or a PMT names more section PIDs, DII and DDB messages feed the
+// carousel collector.
+#ifndef RAVEL_DUMP_CAPTURE_H
+#define RAVEL_DUMP_CAPTURE_H
+
+#include <cstddef>
+#include <cstdint>
+
+#include "Carousel.h"
+#include "Demux.h"
+#include "Stats.h"
+#include "TableRegistry.h"
+
+namespace ravel_dump {
+
+class Capture : public SectionSink {
+ public:
+  explicit Capture(Stats& stats);
+
+  // The demultiplexer of a transport stream; null for a file of sections.
+  void SetDemux(Demux* demux) { demux_ = demux; }
+
+  void OnSection(int pid, const uint8_t* section, std::size_t size) override;
+
+  const TableRegistry& Registry() const { return registry_; }
+  const CarouselCollector& Carousel() const { return carousel_; }
+
+ private:
+  Stats& stats_;
+  Demux* demux_;
+  TableRegistry registry_;
+  CarouselCollector carousel_;
+};
+
+// The library's parse of a section when it first arrives, as a receiver uses
+// it: a PAT or a PMT names more section PIDs to `demux` (when there is one),
+// a DII or a DDB goes to the carousel collector. Gives the parse result.
+int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t size, Demux* demux,
+                   CarouselCollector& carousel);
+
+}  // namespace ravel_dump
+
+#endif

@@ -1,0 +1,169 @@
+#include "Carousel.h"
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <filesystem>
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+namespace ravel_dump {
+namespace {
+
+unsigned int BlockCount(uint32_t size, uint16_t blockSize) {
+  if (blockSize == 0) return 0;
+  return static_cast<unsigned int>((static_cast<uint64_t>(size) + blockSize - 1) / blockSize);
+}
+
+std::size_t ExpectedBlockLength(uint32_t size, uint16_t blockSize, unsigned int number) {
+  uint64_t offset = static_cast<uint64_t>(number) * blockSize;
+  uint64_t rest = size - offset;
+  return static_cast<std::size_t>(rest < blockSize ? rest : blockSize);
+}
+
+// Writes `bytes` to `path` through a temporary file in the same directory.
+bool WriteAtomically(const std::string& directory, const std::string& name, const std::vector<uint8_t>& bytes,
+                     std::string& error) {
+  std::string final = directory + "/" + name;
+  std::string temp = directory + "/." + name + ".XXXXXX";
+  std::vector<char> pattern(temp.begin(), temp.end());
+  pattern.push_back('\0');
+  int fd = mkstemp(pattern.data());
+  if (fd < 0) {
+    error = "cannot write in " + directory + ": " + std::strerror(errno);
+    return false;
+  }
+  std::size_t done = 0;
+  while (done < bytes.size()) {
+    ssize_t n = write(fd, bytes.data() + done, bytes.size() - done);
+    if (n < 0 && errno == EINTR) continue;
+    if (n <= 0) {
+      error = "cannot write " + final + ": " + std::strerror(errno);
+      close(fd);
+      unlink(pattern.data());
+      return false;
+    }
+    done += static_cast<std::size_t>(n);
+  }
+  // Readable like any file the user creates.
+  mode_t mask = umask(0);
+  umask(mask);
+  fchmod(fd, 0666 & ~mask);
+  if (close(fd) != 0 || rename(pattern.data(), final.c_str()) != 0) {
+    error = "cannot write " + final + ": " + std::strerror(errno);
+    unlink(pattern.data());
+    return false;
+  }
+  return true;
+}
+
+}  // namespace
+
+std::string ModuleFileName(int pid, uint32_t downloadId, int moduleId, int version) {
+  char name[96];
+  if (pid < 0) {
+    std::snprintf(name, sizeof name, "sections_dl%08x_module%04x_v%d.bin", downloadId, moduleId, version);
+  } else {
+    std::snprintf(name, sizeof name, "pid%04x_dl%08x_module%04x_v%d.bin", pid, downloadId, moduleId, version);
+  }
+  return name;
+}
+
+void CarouselCollector::AddModuleList(int pid, uint32_t downloadId, uint16_t blockSize,
+                                      const std::vector<ModuleListing>& modules) {
+  DownloadKey key(pid, downloadId);
+  auto found = listings_.find(key);
+  if (found == listings_.end()) {
+    order_.push_back(key);
+    found = listings_.emplace(key, Download()).first;
+  }
+  found->second.blockSize = blockSize;
+  for (const ModuleListing& module : modules) found->second.modules[{module.id, module.version}] = module;
+}
+
+void CarouselCollector::AddBlock(int pid, uint32_t downloadId, uint16_t moduleId, uint8_t version,
+                                 uint16_t blockNumber, const uint8_t* data, std::size_t size) {
+  auto& blocks = blocks_[ModuleKey(pid, downloadId, moduleId, version)];
+  if (blocks.find(blockNumber) != blocks.end()) return;
+  blocks[blockNumber].assign(data, data + size);
+}
+
+unsigned int CarouselCollector::BlocksHeld(const ModuleKey& key, uint32_t size, uint16_t blockSize) const {
+  auto found = blocks_.find(key);
+  if (found == blocks_.end()) return 0;
+  unsigned int total = BlockCount(size, blockSize);
+  unsigned int held = 0;
+  for (const auto& block : found->second) {
+    if (block.first < total && block.second.size() == ExpectedBlockLength(size, blockSize, block.first)) ++held;
+  }
+  return held;
+}
+
+bool CarouselCollector::Assemble(const ModuleKey& key, uint32_t size, uint16_t blockSize,
+                                 std::vector<uint8_t>& bytes) const {
+  unsigned int total = BlockCount(size, blockSize);
+  if (size > 0 && total == 0) return false;  // blocks cannot be placed without a block size
+  if (BlocksHeld(key, size, blockSize) != total) return false;
+  bytes.clear();
+  bytes.reserve(size);
+  if (total == 0) return true;
+  const auto& blocks = blocks_.find(key)->second;
+  for (unsigned int n = 0; n < total; ++n) {
+    const std::vector<uint8_t>& block = blocks.find(static_cast<uint16_t>(n))->second;
+    bytes.insert(bytes.end(), block.begin(), block.end());
+  }
+  return bytes.size() == size;
+}
+
+std::vector<CarouselSummary> CarouselCollector::Summarize() const {
+  std::vector<CarouselSummary> carousels;
+  for (const DownloadKey& key : order_) {
+    const Download& download = listings_.find(key)->second;
+    CarouselSummary carousel;
+    carousel.pid = std::get<0>(key);
+    carousel.downloadId = std::get<1>(key);
+    carousel.blockSize = download.blockSize;
+    for (const auto& kv : download.modules) {
+      const ModuleListing& listing = kv.second;
+      ModuleSummary module;
+      module.id = listing.id;
+      module.size = listing.size;
+      module.version = listing.version;
+      module.name = listing.name;
+      ModuleKey moduleKey(carousel.pid, carousel.downloadId, listing.id, listing.version);
+      module.blocksTotal = BlockCount(listing.size, download.blockSize);
+      module.blocksReceived = BlocksHeld(moduleKey, listing.size, download.blockSize);
+      module.complete = (download.blockSize != 0 || listing.size == 0) && module.blocksReceived == module.blocksTotal;
+      carousel.modules.push_back(module);
+    }
+    carousels.push_back(carousel);
+  }
+  return carousels;
+}
+
+bool CarouselCollector::WriteModules(const std::string& directory, std::vector<CarouselSummary>& carousels,
+                                     std::string& error) const {
+  std::error_code code;
+  std::filesystem::create_directories(directory, code);
+  if (code || !std::filesystem::is_directory(directory)) {
+    error = directory + ": cannot make the module directory" + (code ? ": " + code.message() : std::string());
+    return false;
+  }
+  for (CarouselSummary& carousel : carousels) {
+    for (ModuleSummary& module : carousel.modules) {
+      if (!module.complete) continue;
+      std::vector<uint8_t> bytes;
+      ModuleKey key(carousel.pid, carousel.downloadId, static_cast<uint16_t>(module.id),
+                    static_cast<uint8_t>(module.version));
+      if (!Assemble(key, module.size, static_cast<uint16_t>(carousel.blockSize), bytes)) continue;
+      std::string name = ModuleFileName(carousel.pid, carousel.downloadId, module.id, module.version);
+      if (!WriteAtomically(directory, name, bytes, error)) return false;
+      module.file = directory + "/" + name;
+    }
+  }
+  return true;
+}
+
+}  // namespace ravel_dump

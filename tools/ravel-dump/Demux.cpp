@@ -1,0 +1,106 @@
+#include "Demux.h"
+
+#include <cstring>
+
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CTSPktAssembler.h"
+
+namespace ravel_dump {
+
+Demux::Demux(Stats& stats, SectionSink& sink)
+    : stats_(stats), sink_(sink), restricted_(false), allowed_(kPidCount, true), roles_(kPidCount, PidRole::kNone) {
+  std::memset(slot_, 0xFF, sizeof slot_);
+  std::memset(lastCounter_, 0xFF, sizeof lastCounter_);
+  std::memset(scratch_, 0, sizeof scratch_);
+}
+
+Demux::~Demux() {}
+
+void Demux::AddStandardPids() {
+  AddSectionPid(0x0000, PidRole::kPat);
+  AddSectionPid(0x0010, PidRole::kNit);
+  AddSectionPid(0x0011, PidRole::kSdt);
+  AddSectionPid(0x0012, PidRole::kEit);
+  AddSectionPid(0x0014, PidRole::kTime);
+  AddSectionPid(0x0024, PidRole::kBit);
+  // EIT of the one-segment service (ARIB STD-B10 / ABNT NBR 15603).
+  AddSectionPid(0x0026, PidRole::kEit);
+  AddSectionPid(0x0027, PidRole::kEit);
+}
+
+void Demux::RestrictTo(const std::vector<int>& pids) {
+  restricted_ = true;
+  allowed_.assign(kPidCount, false);
+  for (int pid : pids) allowed_[pid] = true;
+  for (int pid : pids) AddSectionPid(pid, PidRole::kRequested);
+}
+
+void Demux::AddSectionPid(int pid, PidRole role) {
+  if (pid < 0 || pid >= kPidCount || pid == 0x1FFF) return;
+  if (restricted_ && !allowed_[pid]) return;
+  if (roles_[pid] == PidRole::kNone || roles_[pid] == PidRole::kRequested) roles_[pid] = role;
+  if (slot_[pid] >= 0) return;
+  slot_[pid] = static_cast<int16_t>(stores_.size());
+  stores_.emplace_back(new RavelCTSPktStore);
+}
+
+void Demux::OnPacket(const uint8_t* packet) {
+  const int pid = ((packet[1] & 0x1F) << 8) | packet[2];
+  PidStats& stats = stats_.pids[pid];
+  ++stats.packets;
+  if (packet[1] & 0x80) {  // transport_error_indicator: the receiver drops it
+    ++stats.transportErrors;
+    return;
+  }
+  const unsigned int control = (packet[3] >> 4) & 0x03;
+  if (control & 0x01) {
+    // ISO/IEC 13818-1 2.4.3.3: the counter steps by one per packet with
+    // payload; one repeated packet is allowed, and the adaptation field's
+    // discontinuity_indicator announces a jump.
+    const uint8_t counter = packet[3] & 0x0F;
+    const uint8_t last = lastCounter_[pid];
+    if (last != 0xFF && counter != ((last + 1) & 0x0F) && counter != last) {
+      bool announced = control == 0x03 && packet[4] > 0 && (packet[5] & 0x80) != 0;
+      if (!announced) ++stats.continuityBreaks;
+    }
+    lastCounter_[pid] = counter;
+  }
+  const int slot = slot_[pid];
+  if (slot < 0) return;
+  // Payloads the assembler cannot take: none at all, or an adaptation field
+  // that leaves no payload byte (its length is at most 182 when a payload follows).
+  if (control == 0x00 || (control == 0x03 && packet[4] > 182)) {
+    ++stats.invalidPackets;
+    return;
+  }
+  if (control == 0x02) return;
+  Assemble(pid, *stores_[slot], packet);
+}
+
+void Demux::Assemble(int pid, RavelCTSPktStore& store, const uint8_t* packet) {
+  std::memcpy(scratch_, packet, 188);
+  // A fresh record for every call: the store appends at most two sections to it.
+  RavelCSectionData out;
+  store.AddTSPacket(scratch_, out);
+  for (int i = 0; i < out.iSectionCount && i < RAVEL_MAX_ASSEMBLED_SECTIONS; ++i) {
+    const uint8_t* section = out.pSection[i];
+    const int held = out.iSectionSize[i];
+    if (section == nullptr || held < 3) {
+      ++stats_.lengthMismatches;
+      continue;
+    }
+    if (section[0] == 0xFF) continue;  // stuffing
+    ++stats_.sectionsAssembled;
+    const int size = RavelSectionSize(section);
+    if (size > held) {
+      // The assembler can close a section by the size of the one before it;
+      // what it holds then is not the whole section.
+      ++stats_.lengthMismatches;
+      continue;
+    }
+    ++stats_.pids[pid].sections;
+    sink_.OnSection(pid, section, static_cast<std::size_t>(size));
+  }
+}
+
+}  // namespace ravel_dump

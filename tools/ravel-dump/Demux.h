@@ -1,0 +1,66 @@
+// Sorts the packets of a capture by PID, the way a receiver's demultiplexer
+// does: every packet's header is read (packet counts and continuity for the
+// report), and only the packets of section PIDs go on, each PID to its own
+// section assembler. Other packets cost a header read and nothing more: no
+// allocation and no copy per packet here.
+#ifndef RAVEL_DUMP_DEMUX_H
+#define RAVEL_DUMP_DEMUX_H
+
+#include <cstddef>
+#include <cstdint>
+#include <memory>
+#include <vector>
+
+#include "Stats.h"
+
+class RavelCTSPktStore;
+
+namespace ravel_dump {
+
+class SectionSink {
+ public:
+  virtual ~SectionSink() {}
+  // A section assembled on `pid`: `size` is exactly 3 + section_length bytes.
+  virtual void OnSection(int pid, const uint8_t* section, std::size_t size) = 0;
+};
+
+class Demux {
+ public:
+  Demux(Stats& stats, SectionSink& sink);
+  ~Demux();
+  Demux(const Demux&) = delete;
+  Demux& operator=(const Demux&) = delete;
+
+  // The PIDs every receiver reads (PAT, NIT, SDT, EIT, TDT/TOT, BIT).
+  void AddStandardPids();
+  // Only these PIDs are read from now on, each as a section PID.
+  void RestrictTo(const std::vector<int>& pids);
+  // Reads `pid` as a section PID from now on (a PID the PAT or a PMT names).
+  // Under a restriction, PIDs outside it stay unread.
+  void AddSectionPid(int pid, PidRole role);
+  bool IsSectionPid(int pid) const { return slot_[pid] >= 0; }
+
+  // One 188-byte packet starting with its sync byte.
+  void OnPacket(const uint8_t* packet);
+
+  const std::vector<PidRole>& Roles() const { return roles_; }
+
+ private:
+  void Assemble(int pid, RavelCTSPktStore& store, const uint8_t* packet);
+
+  Stats& stats_;
+  SectionSink& sink_;
+  int16_t slot_[kPidCount];   // index into stores_, -1 for a PID not read
+  uint8_t lastCounter_[kPidCount];  // 0xFF before the first packet with payload
+  bool restricted_;
+  std::vector<bool> allowed_;
+  std::vector<PidRole> roles_;
+  std::vector<std::unique_ptr<RavelCTSPktStore>> stores_;
+  // The packet handed to an assembler, with a zeroed margin behind it: the
+  // assembler may look a few bytes past a short payload.
+  alignas(16) uint8_t scratch_[188 + 64];
+};
+
+}  // namespace ravel_dump
+
+#endif

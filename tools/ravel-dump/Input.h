@@ -1,0 +1,39 @@
+// The capture to read: a file or standard input ("-"), read in large chunks.
+#ifndef RAVEL_DUMP_INPUT_H
+#define RAVEL_DUMP_INPUT_H
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+
+namespace ravel_dump {
+
+class InputFile {
+ public:
+  InputFile();
+  ~InputFile();
+  InputFile(const InputFile&) = delete;
+  InputFile& operator=(const InputFile&) = delete;
+
+  // Opens `path` ("-" for standard input). On failure returns false and sets
+  // `error` to a one-line reason (missing, unreadable, a directory ...).
+  bool Open(const std::string& path, std::string& error);
+
+  // Reads up to `size` bytes, retrying short reads until `size` bytes or the
+  // end. Returns the count (0 at the end), or -1 with `error` set.
+  long long Read(uint8_t* buffer, std::size_t size, std::string& error);
+
+  // Size of a regular file, -1 for a pipe or a terminal.
+  long long Size() const { return size_; }
+  const std::string& Name() const { return name_; }
+
+ private:
+  int fd_;
+  bool ownsFd_;
+  long long size_;
+  std::string name_;
+};
+
+}  // namespace ravel_dump
+
+#endif

@@ -1,0 +1,161 @@
+#include "Options.h"
+
+#include <cxxopts.hpp>
+
+#include <algorithm>
+#include <cctype>
+#include <iostream>
+
+namespace ravel_dump {
+namespace {
+
+const char kDescription[] =
+    "Reads a transport stream capture (or a file of raw sections) the way a one-segment\n"
+    "receiver does, and prints the PSI/SI tables, DSM-CC carousel messages and stream\n"
+    "events it holds, through the ravel_sectionparser library.\n";
+
+std::vector<std::string> SplitList(const std::vector<std::string>& values) {
+  std::vector<std::string> words;
+  for (const std::string& value : values) {
+    std::size_t start = 0;
+    while (start <= value.size()) {
+      std::size_t comma = value.find(',', start);
+      if (comma == std::string::npos) comma = value.size();
+      if (comma > start) words.push_back(value.substr(start, comma - start));
+      start = comma + 1;
+    }
+  }
+  return words;
+}
+
+}  // namespace
+
+bool ParseTraceLevels(const std::string& text, unsigned int& levels, std::string& error) {
+  levels = 0;
+  for (std::string word : SplitList({text})) {
+    std::transform(word.begin(), word.end(), word.begin(),
+                   [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+    unsigned long number = 0;
+    if (word == "none") continue;
+    if (word == "all") levels |= 0xF0000000u;
+    else if (word == "dump") levels |= 0x10000000u;
+    else if (word == "detail") levels |= 0x20000000u;
+    else if (word == "warning" || word == "info") levels |= 0x40000000u;
+    else if (word == "error") levels |= 0x80000000u;
+    else if (ParseNumber(word, 0xFFFFFFFFul, number) && (number & 0x0FFFFFFFul) == 0) levels |= static_cast<unsigned int>(number);
+    else {
+      error = "unknown trace level '" + word + "' (use dump, detail, warning, error, all, none or a mask like 0xC0000000)";
+      return false;
+    }
+  }
+  return true;
+}
+
+ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& error) {
+  cxxopts::Options parser("ravel-dump", kDescription);
+  parser.custom_help("[options]");
+  parser.positional_help("CAPTURE|-");
+  // clang-format off
+  parser.add_options()
+      ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
+      ("j,json", "Print the summary as JSON")
+      ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
+       cxxopts::value<std::string>(), "DIR")
+      ("sections", "The input is a file of concatenated raw sections, not a transport stream")
+      ("standard", "Broadcast standard for ratings and regions: brazil or japan",
+       cxxopts::value<std::string>(), "NAME")
+      ("p,pid", "Read only these PIDs, each as a section PID (comma-separated, decimal or 0x hex)",
+       cxxopts::value<std::vector<std::string>>(), "PIDS")
+      ("t,table", "Dump only these tables: pat, pmt, nit, sdt, eit, tdt, tot, bit, ait, dsi, dii, ddb, "
+       "dsmcc, stream-events, other, or table_ids", cxxopts::value<std::vector<std::string>>(), "TABLES")
+      ("trace", "Also show the library's own traces of these levels on stderr: dump, detail, warning, "
+       "error, all", cxxopts::value<std::string>(), "LEVELS")
+      ("q,quiet", "No final report on stderr")
+      ("no-progress", "No progress bar")
+      ("h,help", "Print this help and exit")
+      ("V,version", "Print the version and exit")
+      ("input", "Capture file, or - for standard input", cxxopts::value<std::string>());
+  // clang-format on
+  parser.parse_positional({"input"});
+
+  try {
+    cxxopts::ParseResult result = parser.parse(argc, argv);
+    if (result.count("help")) {
+      std::cout << parser.help({""}) << "\n"
+                << "Without --summary or --json, each distinct table is dumped by the library's own Show(),\n"
+                << "in the order first seen. Section PIDs are those a receiver reads (PAT, NIT, SDT, EIT,\n"
+                << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
+                << "PMTs name); a capture without them (one carousel PID, say) is read with --pid.\n"
+                << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
+                << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
+      return ParseOutcome::kExitOk;
+    }
+    if (result.count("version")) {
+      std::cout << "ravel-dump " << RAVEL_DUMP_VERSION << "\n";
+      return ParseOutcome::kExitOk;
+    }
+    if (!result.count("input")) {
+      error = "no capture given";
+      return ParseOutcome::kUsageError;
+    }
+    if (!result.unmatched().empty()) {
+      error = "only one capture can be read at a time ('" + result.unmatched().front() + "')";
+      return ParseOutcome::kUsageError;
+    }
+    options.input = result["input"].as<std::string>();
+    options.sections = result.count("sections") > 0;
+    if (result.count("summary")) options.mode = OutputMode::kSummary;
+    if (result.count("json")) options.mode = OutputMode::kJson;
+    if (result.count("extract-modules")) {
+      options.extractDirectory = result["extract-modules"].as<std::string>();
+      if (options.extractDirectory.empty()) {
+        error = "--extract-modules needs a directory";
+        return ParseOutcome::kUsageError;
+      }
+      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+    }
+    if (result.count("standard")) {
+      std::string name = result["standard"].as<std::string>();
+      std::transform(name.begin(), name.end(), name.begin(),
+                     [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+      if (name == "brazil") {
+        options.standard = 0;
+      } else if (name == "japan") {
+        options.standard = 1;
+      } else {
+        error = "unknown standard '" + name + "' (use brazil or japan)";
+        return ParseOutcome::kUsageError;
+      }
+    }
+    if (result.count("pid")) {
+      for (const std::string& word : SplitList(result["pid"].as<std::vector<std::string>>())) {
+        unsigned long pid = 0;
+        if (!ParseNumber(word, 0x1FFF, pid)) {
+          error = "bad PID '" + word + "' (0 to 8191, decimal or 0x hex)";
+          return ParseOutcome::kUsageError;
+        }
+        options.pids.push_back(static_cast<int>(pid));
+      }
+      if (options.sections) {
+        error = "--pid applies to transport streams, not to --sections";
+        return ParseOutcome::kUsageError;
+      }
+    }
+    if (result.count("table")) {
+      for (const std::string& word : SplitList(result["table"].as<std::vector<std::string>>())) {
+        if (!options.tables.Parse(word, error)) return ParseOutcome::kUsageError;
+      }
+    }
+    if (result.count("trace") && !ParseTraceLevels(result["trace"].as<std::string>(), options.traceLevels, error)) {
+      return ParseOutcome::kUsageError;
+    }
+    options.report = result.count("quiet") == 0;
+    options.progress = result.count("no-progress") == 0;
+  } catch (const cxxopts::exceptions::exception& e) {
+    error = e.what();
+    return ParseOutcome::kUsageError;
+  }
+  return ParseOutcome::kRun;
+}
+
+}  // namespace ravel_dump

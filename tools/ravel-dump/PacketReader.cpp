@@ -1,0 +1,164 @@
+#include "PacketReader.h"
+
+#include <cstring>
+
+namespace ravel_dump {
+namespace {
+
+const std::size_t kChunk = 4u << 20;
+// How far into the input the first run of sync bytes is looked for.
+const std::size_t kDetectWindow = 1u << 20;
+const std::size_t kPacket = 188;
+const uint8_t kSync = 0x47;
+// Consecutive sync bytes that make a lock; a shorter input must be packets
+// from its first byte on, and all of them must agree.
+const int kLockRun = 5;
+// Sync bytes that confirm a new position after garbage.
+const int kResyncRun = 3;
+
+struct Format {
+  int stride;
+  std::size_t syncOffset;
+};
+const Format kFormats[] = {{188, 0}, {204, 0}, {192, 4}};
+
+}  // namespace
+
+PacketReader::PacketReader(InputFile& input)
+    : input_(input), buffer_(kChunk), pos_(0), end_(0), base_(0), eof_(false), stride_(188),
+      syncOffset_(0), packets_(0), skipped_(0), resyncs_(0) {}
+
+bool PacketReader::Fail(const std::string& error) {
+  error_ = error;
+  return false;
+}
+
+bool PacketReader::Fill(std::size_t need) {
+  while (end_ - pos_ < need) {
+    if (eof_) return false;
+    if (pos_ > 0) {
+      std::memmove(buffer_.data(), buffer_.data() + pos_, end_ - pos_);
+      base_ += pos_;
+      end_ -= pos_;
+      pos_ = 0;
+    }
+    long long n = input_.Read(buffer_.data() + end_, buffer_.size() - end_, error_);
+    if (n < 0) {
+      eof_ = true;
+      return false;
+    }
+    if (n == 0) eof_ = true;
+    end_ += static_cast<std::size_t>(n);
+  }
+  return true;
+}
+
+bool PacketReader::FindLock(const uint8_t* data, std::size_t size, std::size_t& syncAt, int& stride) {
+  const uint8_t* p = data;
+  const uint8_t* last = data + size;
+  while (p < last) {
+    p = static_cast<const uint8_t*>(std::memchr(p, kSync, static_cast<std::size_t>(last - p)));
+    if (p == nullptr) return false;
+    std::size_t at = static_cast<std::size_t>(p - data);
+    for (const Format& f : kFormats) {
+      if (at < f.syncOffset) continue;
+      std::size_t whole = 0;  // packets whose 188 bytes are all present
+      while (whole < kLockRun && at + whole * f.stride + kPacket <= size) ++whole;
+      if (whole == 0) continue;
+      if (whole < kLockRun && at != f.syncOffset) continue;
+      bool run = true;
+      for (std::size_t k = 1; k < whole && run; ++k) run = data[at + k * f.stride] == kSync;
+      if (run) {
+        syncAt = at;
+        stride = f.stride;
+        return true;
+      }
+    }
+    ++p;
+  }
+  return false;
+}
+
+bool PacketReader::Start(std::string& error) {
+  Fill(kDetectWindow);
+  if (!error_.empty()) {
+    error = error_;
+    return false;
+  }
+  if (end_ == 0) {
+    error = input_.Name() + ": empty input";
+    return false;
+  }
+  std::size_t syncAt = 0;
+  int stride = 0;
+  if (!FindLock(buffer_.data(), end_, syncAt, stride)) {
+    error = input_.Name() + ": not a transport stream (no run of 0x47 sync bytes 188, 192 or 204 bytes apart)";
+    return false;
+  }
+  stride_ = stride;
+  syncOffset_ = stride == 192 ? 4 : 0;
+  pos_ = syncAt - syncOffset_;
+  skipped_ = pos_;
+  return true;
+}
+
+bool PacketReader::Resync() {
+  ++resyncs_;
+  const std::size_t look = syncOffset_ + (kResyncRun - 1) * stride_ + kPacket;
+  for (;;) {
+    ++pos_;
+    ++skipped_;
+    Fill(look);
+    if (!error_.empty()) return false;
+    std::size_t left = end_ - pos_;
+    if (left < syncOffset_ + kPacket) {
+      skipped_ += left;
+      pos_ = end_;
+      return Fail(input_.Name() + ": truncated: the input ends with " + std::to_string(left) +
+                  " bytes that do not make a whole packet");
+    }
+    if (buffer_[pos_ + syncOffset_] != kSync) continue;
+    bool run = true;
+    for (int k = 1; k < kResyncRun && run; ++k) {
+      std::size_t at = syncOffset_ + k * stride_;
+      if (at < left) run = buffer_[pos_ + at] == kSync;
+    }
+    if (run) return true;
+  }
+}
+
+const uint8_t* PacketReader::Next() {
+  for (;;) {
+    if (!Fill(stride_)) {
+      if (!error_.empty()) return nullptr;
+      std::size_t left = end_ - pos_;
+      if (left == 0) return nullptr;
+      Fail(input_.Name() + ": truncated: the input ends inside a packet (" + std::to_string(left) + " of " +
+           std::to_string(stride_) + " bytes)");
+      return nullptr;
+    }
+    if (buffer_[pos_ + syncOffset_] == kSync) {
+      const uint8_t* packet = buffer_.data() + pos_ + syncOffset_;
+      pos_ += stride_;
+      ++packets_;
+      return packet;
+    }
+    if (!Resync()) return nullptr;
+  }
+}
+
+bool ReadWholeInput(InputFile& input, std::vector<uint8_t>& data, std::string& error) {
+  data.clear();
+  std::size_t used = 0;
+  for (;;) {
+    if (data.size() - used < kChunk) data.resize(used + kChunk);
+    long long n = input.Read(data.data() + used, data.size() - used, error);
+    if (n < 0) return false;
+    if (n == 0) break;
+    used += static_cast<std::size_t>(n);
+  }
+  data.resize(used);
+  return true;
+}
+
+}  // namespace ravel_dump

@@ -1,0 +1,68 @@
+// Transport stream packets from a capture: 188-byte packets, 192-byte ones
+// (a 4-byte time stamp before each packet, as recorders write) or 204-byte
+// ones (a 16-byte trailer, as ISDB-Tb captures often carry). The size is told
+// by a run of sync bytes 0x47 at the packet spacing; after garbage the reader
+// looks for such a run again.
+#ifndef RAVEL_DUMP_PACKETREADER_H
+#define RAVEL_DUMP_PACKETREADER_H
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "Input.h"
+
+namespace ravel_dump {
+
+class PacketReader {
+ public:
+  explicit PacketReader(InputFile& input);
+
+  // Reads the beginning of the input and finds the packet size. False with a
+  // one-line reason for an empty input or one that is not a transport stream.
+  bool Start(std::string& error);
+
+  // The next 188-byte packet (from its sync byte), valid until the next call;
+  // null at the end of the input or on a failure (then Error() is set: a read
+  // error, or an input that ends inside a packet).
+  const uint8_t* Next();
+
+  const std::string& Error() const { return error_; }
+  int PacketSize() const { return stride_; }
+  uint64_t Packets() const { return packets_; }
+  uint64_t SkippedBytes() const { return skipped_; }
+  uint64_t Resyncs() const { return resyncs_; }
+  // Bytes of the input consumed so far.
+  uint64_t Offset() const { return base_ + pos_; }
+
+  // Whether `data` holds a run of sync bytes for one of the packet sizes,
+  // starting at `offset`; gives the size and the sync position's offset in it.
+  static bool FindLock(const uint8_t* data, std::size_t size, std::size_t& syncAt, int& stride);
+
+ private:
+  // Makes `need` bytes from pos_ available; false when the input ends first.
+  bool Fill(std::size_t need);
+  bool Resync();
+  bool Fail(const std::string& error);
+
+  InputFile& input_;
+  std::vector<uint8_t> buffer_;
+  std::size_t pos_;
+  std::size_t end_;
+  uint64_t base_;
+  bool eof_;
+  int stride_;
+  std::size_t syncOffset_;
+  uint64_t packets_;
+  uint64_t skipped_;
+  uint64_t resyncs_;
+  std::string error_;
+};
+
+// The whole input in memory (for a file of raw sections). False with a reason.
+bool ReadWholeInput(InputFile& input, std::vector<uint8_t>& data, std::string& error);
+
+}  // namespace ravel_dump
+
+#endif

@@ -1,0 +1,148 @@
+// What a viewer of the channel wants to know, gathered from the tables read.
+// Texts hold the broadcast's own bytes; the outputs escape them.
+#ifndef RAVEL_DUMP_SUMMARY_H
+#define RAVEL_DUMP_SUMMARY_H
+
+#include <cstdint>
+#include <cstdio>
+#include <string>
+#include <vector>
+
+namespace ravel_dump {
+
+// Dates and times as the library decodes them (its date rule included).
+struct DateTime {
+  bool valid = false;
+  int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
+};
+
+struct Duration {
+  int hours = 0, minutes = 0, seconds = 0;
+};
+
+struct Rating {
+  std::string country;
+  int content = 0;
+  int minimumAge = 0;
+};
+
+struct EventSummary {
+  bool valid = false;
+  int eventId = 0;
+  DateTime start;
+  Duration duration;
+  int runningStatus = 0;
+  std::string name;
+  std::string text;
+  std::vector<Rating> ratings;
+};
+
+struct StreamSummary {
+  int streamType = 0;
+  int pid = 0;
+  int componentTag = -1;
+};
+
+struct ServiceSummary {
+  int id = 0;
+  int type = -1;  // from the SDT's service descriptor
+  std::string name;
+  std::string provider;
+  bool oneSegment = false;
+  int pmtPid = -1;
+  int pcrPid = -1;
+  int videoPid = -1;
+  std::vector<int> audioPids;
+  int captionPid = -1;
+  std::vector<StreamSummary> streams;
+  EventSummary present;
+  EventSummary following;
+};
+
+struct TransportStreamSummary {
+  int id = 0;
+  int originalNetworkId = 0;
+  std::string name;           // TS information descriptor
+  int remoteControlKey = -1;
+  int areaCode = -1;          // terrestrial delivery system descriptor
+  int guardInterval = -1;
+  int transmissionMode = -1;
+  std::vector<unsigned int> frequencies;  // in the descriptor's units (1/7 MHz)
+  std::vector<int> partialReception;      // service ids as the library keeps them
+  std::vector<std::pair<int, int>> serviceList;  // id, type
+};
+
+struct NetworkSummary {
+  bool valid = false;
+  int id = 0;
+  std::string name;
+  std::vector<TransportStreamSummary> streams;
+};
+
+struct LocalOffset {
+  std::string country;
+  int regionId = 0;
+  int polarity = 0;
+  int offsetHours = 0, offsetMinutes = 0;
+  DateTime timeOfChange;
+  int nextHours = 0, nextMinutes = 0;
+};
+
+struct TimeSummary {
+  bool valid = false;
+  std::string source;  // "TOT" or "TDT"
+  DateTime time;
+  std::vector<LocalOffset> offsets;
+};
+
+struct ApplicationSummary {
+  int pid = -1;
+  int applicationType = 0;
+  uint32_t organizationId = 0;
+  uint32_t applicationId = 0;
+  uint32_t controlCode = 0;
+  int documentResolution = 0;
+  std::string name;
+  std::string path;
+  std::string file;
+};
+
+struct ModuleSummary {
+  int id = 0;
+  uint32_t size = 0;
+  int version = 0;
+  std::string name;         // name descriptor of the module info, if any
+  unsigned int blocksReceived = 0;
+  unsigned int blocksTotal = 0;
+  bool complete = false;
+  std::string file;         // where --extract-modules wrote it
+};
+
+struct CarouselSummary {
+  int pid = -1;
+  uint32_t downloadId = 0;
+  int blockSize = 0;
+  std::vector<ModuleSummary> modules;
+};
+
+struct Summary {
+  std::string standard;
+  int transportStreamId = -1;
+  NetworkSummary network;
+  std::vector<ServiceSummary> services;
+  TimeSummary time;
+  std::vector<ApplicationSummary> applications;
+  std::vector<CarouselSummary> carousels;
+};
+
+void PrintSummaryText(const Summary& summary, std::FILE* out);
+std::string SummaryJson(const Summary& summary);
+
+// Names of codes, for the text summary.
+const char* ServiceTypeName(int type);
+const char* StreamTypeName(int type);
+const char* ControlCodeName(uint32_t code);
+
+}  // namespace ravel_dump
+
+#endif

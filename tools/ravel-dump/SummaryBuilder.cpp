@@ -1,0 +1,334 @@
+// The summary, from the latest version of each table read, through the
+// library's table and descriptor classes.
+#include <cstring>
+
+#include "Output.h"
+#include "ParseBuffer.h"
+#include "Ravel_CDescriptorLocalTimeOffset.h"
+#include "Ravel_CDescriptorNetworkName.h"
+#include "Ravel_CDescriptorParentalRating.h"
+#include "Ravel_CDescriptorPartialReception.h"
+#include "Ravel_CDescriptorService.h"
+#include "Ravel_CDescriptorServiceList.h"
+#include "Ravel_CDescriptorShortEvent.h"
+#include "Ravel_CDescriptorStreamIdentifier.h"
+#include "Ravel_CDescriptorTSInformation.h"
+#include "Ravel_CDescriptorTerrDeliverySystem.h"
+#include "Ravel_Cfg.h"
+#include "Ravel_CTableAIT.h"
+#include "Ravel_CTableEIT.h"
+#include "Ravel_CTableNIT.h"
+#include "Ravel_CTablePAT.h"
+#include "Ravel_CTablePMT.h"
+#include "Ravel_CTableSDT.h"
+#include "Ravel_CTableTDT.h"
+#include "Ravel_CTableTOT.h"
+
+namespace ravel_dump {
+namespace {
+
+const int kAnyPid = -2;
+
+std::string Text(const char* text) { return text != nullptr ? std::string(text) : std::string(); }
+
+std::string Field(const char* field, std::size_t capacity) {
+  return std::string(field, strnlen(field, capacity));
+}
+
+// The table of `kind` seen last that `accept` takes, or null.
+template <class Accept>
+const TableEntry* Latest(const TableRegistry& registry, TableKind kind, Accept accept) {
+  const TableEntry* latest = nullptr;
+  for (const auto& entry : registry.Tables()) {
+    if (entry->kind != kind || !accept(*entry)) continue;
+    if (latest == nullptr || entry->lastSeen > latest->lastSeen) latest = entry.get();
+  }
+  return latest;
+}
+
+const TableEntry* Latest(const TableRegistry& registry, TableKind kind) {
+  return Latest(registry, kind, [](const TableEntry&) { return true; });
+}
+
+// Calls `use(object)` for each section of `table` that the library accepted.
+template <class T, class Use>
+void EachSection(const TableEntry& table, Use use) {
+  for (const auto& kv : table.sections) {
+    if (kv.second.parseResult != 0) continue;
+    ParseBuffer buffer(kv.second.bytes);
+    T object(nullptr);
+    if (object.ParseRawData(buffer.Section()) == 0) use(object);
+  }
+}
+
+ServiceSummary& ServiceOf(std::vector<ServiceSummary>& services, int id) {
+  for (ServiceSummary& service : services)
+    if (service.id == id) return service;
+  services.push_back(ServiceSummary());
+  services.back().id = id;
+  return services.back();
+}
+
+DateTime MakeDateTime(int year, int month, int day, int hour, int minute, int second) {
+  DateTime t;
+  t.valid = true;
+  t.year = year;
+  t.month = month;
+  t.day = day;
+  t.hour = hour;
+  t.minute = minute;
+  t.second = second;
+  return t;
+}
+
+DateTime MakeDateTime(const RavelCDateTime& d) {
+  return MakeDateTime(d.iYear, d.iMonth, d.iDay, d.iHour, d.iMinute, d.iSecond);
+}
+
+// The PAT: the transport stream id and the services with their PMT PIDs.
+void AddPat(const TableRegistry& registry, Summary& summary) {
+  const TableEntry* table = Latest(registry, TableKind::kPat, [](const TableEntry& t) { return t.pid <= 0; });
+  if (table == nullptr) return;
+  EachSection<RavelCPAT>(*table, [&](RavelCPAT& pat) {
+    summary.transportStreamId = pat.iTableIdExtension;
+    for (int i = 0; i < pat.aProgramList.iCount; ++i) {
+      const RavelCPMTInfo* program = pat.aProgramList.ipArray[i];
+      ServiceSummary& service = ServiceOf(summary.services, program->iProgramNumber);
+      service.pmtPid = program->iPID;
+      // The receiver's one-segment service: its PMT on 0x1FC8 to 0x1FCF.
+      service.oneSegment = program->iPID >= 0x1FC8 && program->iPID <= 0x1FCF;
+    }
+  });
+}
+
+// Each service's PMT: the PIDs the receiver would play.
+void AddPmts(const TableRegistry& registry, Summary& summary) {
+  for (ServiceSummary& service : summary.services) {
+    const TableEntry* table = Latest(registry, TableKind::kPmt, [&](const TableEntry& t) {
+      return t.extension == service.id && (service.pmtPid < 0 || t.pid == service.pmtPid || t.pid == kNoPid);
+    });
+    if (table == nullptr) continue;
+    RavelCPMT pmt(nullptr);
+    bool any = false;
+    EachSection<RavelCPMT>(*table, [&](RavelCPMT& section) {
+      if (!any) {
+        pmt = section;
+        any = true;
+      } else {
+        pmt += section;
+      }
+    });
+    if (!any) continue;
+    if (service.pmtPid < 0 && table->pid != kNoPid) service.pmtPid = table->pid;
+    service.pcrPid = pmt.iPCRPID;
+    unsigned short video = pmt.GetVideoPID();
+    service.videoPid = video != 0 ? video : -1;
+    for (unsigned char n = 0, count = pmt.GetAudioPIDCount(); n < count; ++n) {
+      service.audioPids.push_back(pmt.GetAudioPID(n));
+    }
+    unsigned short captions = pmt.GetCCPID();
+    service.captionPid = captions != 0 ? captions : -1;
+    for (int i = 0; i < pmt.aMapInfoList.iCount; ++i) {
+      const RavelCMapInfo* info = pmt.aMapInfoList.ipArray[i];
+      StreamSummary stream;
+      stream.streamType = info->iStreamType;
+      stream.pid = info->iElementaryPID;
+      if (info->pStreamIdentifier != nullptr) stream.componentTag = info->pStreamIdentifier->iComponentTag;
+      service.streams.push_back(stream);
+    }
+  }
+}
+
+// The SDT of this stream: service types, names and providers.
+void AddSdt(const TableRegistry& registry, Summary& summary) {
+  int tsId = summary.transportStreamId;
+  const TableEntry* table = Latest(registry, TableKind::kSdt, [&](const TableEntry& t) {
+    return t.tableId == 0x42 && (tsId < 0 || t.extension == tsId);
+  });
+  if (table == nullptr) return;
+  if (summary.transportStreamId < 0) summary.transportStreamId = table->extension;
+  EachSection<RavelCSDT>(*table, [&](RavelCSDT& sdt) {
+    for (int i = 0; i < sdt.aServiceList.iCount; ++i) {
+      const RavelCServiceDescription* description = sdt.aServiceList.ipArray[i];
+      ServiceSummary& service = ServiceOf(summary.services, description->iServiceId);
+      if (description->pService != nullptr) {
+        service.type = description->pService->iServiceType;
+        service.name = Text(description->pService->pServiceName);
+        service.provider = Text(description->pService->pServiceProviderName);
+      }
+    }
+  });
+}
+
+// The NIT of this network: its name and transport streams.
+void AddNit(const TableRegistry& registry, Summary& summary) {
+  const TableEntry* table = Latest(registry, TableKind::kNit, [](const TableEntry& t) { return t.tableId == 0x40; });
+  if (table == nullptr) return;
+  NetworkSummary& network = summary.network;
+  network.id = table->extension;
+  EachSection<RavelCNIT>(*table, [&](RavelCNIT& nit) {
+    network.valid = true;
+    if (nit.pNetworkName != nullptr && network.name.empty()) network.name = Text(nit.pNetworkName->GetNetworkName());
+    for (int i = 0; i < nit.aTSInfoList.iCount; ++i) {
+      const RavelCTSInfo* info = nit.aTSInfoList.ipArray[i];
+      TransportStreamSummary ts;
+      ts.id = info->iTransportStreamId;
+      ts.originalNetworkId = info->iOriginalNetworkId;
+      if (const RavelCTSInformationDescriptor* tsInfo = info->pTSInformation) {
+        ts.name = Text(tsInfo->GetTsName());
+        ts.remoteControlKey = tsInfo->iRemoteControlKeyId;
+      }
+      if (const RavelCTerrDeliverySystemDescriptor* delivery = info->pTerrDeliverySystem) {
+        ts.areaCode = delivery->iAreaCode;
+        ts.guardInterval = delivery->iGuardInterval;
+        ts.transmissionMode = delivery->iTransmissionMode;
+        for (int f = 0; f < delivery->iFrequencyCount && delivery->pFrequencies != nullptr; ++f) {
+          ts.frequencies.push_back(delivery->pFrequencies[f]);
+        }
+      }
+      if (const RavelCPartialReceptionDescriptor* partial = info->pPartialReception) {
+        for (int s = 0; s < partial->aServiceIds.iCount; ++s) ts.partialReception.push_back(partial->aServiceIds.ipArray[s]);
+      }
+      if (const RavelCServiceListDescriptor* list = info->pServiceList) {
+        for (int s = 0; s < list->iServiceCount && list->pServiceIds != nullptr; ++s) {
+          ts.serviceList.push_back({list->pServiceIds[s], list->pServiceTypes[s]});
+        }
+      }
+      network.streams.push_back(ts);
+    }
+  });
+}
+
+EventSummary MakeEvent(RavelCEventInfo& info) {
+  EventSummary event;
+  event.valid = true;
+  event.eventId = info.iEventId;
+  event.start = MakeDateTime(info.cStartTime);
+  event.duration.hours = info.iDurationHour;
+  event.duration.minutes = info.iDurationMinute;
+  event.duration.seconds = info.iDurationSecond;
+  event.runningStatus = info.iRunningStatus;
+  if (const RavelCShortEventDescriptor* shortEvent = info.pShortEventDescriptor) {
+    event.name = Text(shortEvent->pEventName);
+    event.text = Text(shortEvent->pEventDescription);
+  }
+  if (RavelCParentalRatingDescriptor* rating = info.pParentalRatingDescriptor) {
+    for (int i = 0; i < rating->aParentalRatings.iCount; ++i) {
+      const RavelCParentalRating* entry = rating->aParentalRatings.ipArray[i];
+      Rating r;
+      r.country = Field(entry->szCountryCode, sizeof entry->szCountryCode);
+      r.content = entry->iContent;
+      r.minimumAge = entry->iMinimumAge;
+      event.ratings.push_back(r);
+    }
+  }
+  return event;
+}
+
+// Present (section 0) and following (section 1) events of each service, from
+// the EIT present/following of the actual stream.
+void AddEvents(const TableRegistry& registry, Summary& summary) {
+  for (ServiceSummary& service : summary.services) {
+    const TableEntry* table = Latest(registry, TableKind::kEitPf, [&](const TableEntry& t) {
+      return t.tableId == 0x4E && t.extension == service.id;
+    });
+    if (table == nullptr) continue;
+    for (const auto& kv : table->sections) {
+      if (kv.first > 1 || kv.second.parseResult != 0) continue;
+      ParseBuffer buffer(kv.second.bytes);
+      RavelCEIT eit(nullptr);
+      if (eit.ParseRawData(buffer.Section()) != 0 || eit.aEventInfo.iCount == 0) continue;
+      EventSummary event = MakeEvent(*eit.aEventInfo.ipArray[0]);
+      (kv.first == 0 ? service.present : service.following) = event;
+    }
+  }
+}
+
+// The broadcast time: the latest TOT (with the local time offset), else the latest TDT.
+void AddTime(const TableRegistry& registry, Summary& summary) {
+  TimeSummary& time = summary.time;
+  if (const TableEntry* table = Latest(registry, TableKind::kTot)) {
+    EachSection<RavelCTOT>(*table, [&](RavelCTOT& tot) {
+      time.valid = true;
+      time.source = "TOT";
+      time.time = MakeDateTime(tot.iYear, tot.iMonth, tot.iDay, tot.iHour, tot.iMinute, tot.iSecond);
+      if (RavelCLocalTimeOffsetDescriptor* offsets = tot.pLocalTimeOffsetDescriptor) {
+        for (int i = 0; i < offsets->aLocalTimeOffsets.iCount; ++i) {
+          const RavelCLocalTimeOffset* entry = offsets->aLocalTimeOffsets.ipArray[i];
+          LocalOffset o;
+          o.country = Field(entry->szCountryCode, sizeof entry->szCountryCode);
+          o.regionId = entry->iCountryRegionId;
+          o.polarity = entry->iLocalTimeOffsetPolarity;
+          o.offsetHours = entry->iLocalTimeOffsetHour;
+          o.offsetMinutes = entry->iLocalTimeOffsetMinute;
+          o.timeOfChange = MakeDateTime(entry->cTimeOfChange);
+          o.nextHours = entry->iNextTimeOffsetHour;
+          o.nextMinutes = entry->iNextTimeOffsetMinute;
+          time.offsets.push_back(o);
+        }
+      }
+    });
+  }
+  if (time.valid) return;
+  if (const TableEntry* table = Latest(registry, TableKind::kTdt)) {
+    EachSection<RavelCTDT>(*table, [&](RavelCTDT& tdt) {
+      time.valid = true;
+      time.source = "TDT";
+      time.time = MakeDateTime(tdt.iYear, tdt.iMonth, tdt.iDay, tdt.iHour, tdt.iMinute, tdt.iSecond);
+    });
+  }
+}
+
+// Every AIT section stands alone: the applications of all of them, each once.
+void AddApplications(const TableRegistry& registry, Summary& summary) {
+  for (const auto& entry : registry.Tables()) {
+    if (entry->kind != TableKind::kAit) continue;
+    for (const auto& kv : entry->sections) {
+      if (kv.second.parseResult != 0) continue;
+      ParseBuffer buffer(kv.second.bytes);
+      RavelCAIT ait;
+      if (ait.ParseRawData(buffer.Section()) != 0) continue;
+      RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
+      for (int i = 0; i < list->iCount; ++i) {
+        const GingaAITApplicationType& record = list->ipArray[i];
+        ApplicationSummary app;
+        app.pid = entry->pid;
+        app.applicationType = ait.iTableIdExtension;
+        app.organizationId = record.iOrganizationId;
+        app.applicationId = record.iApplicationId;
+        app.controlCode = record.iApplicationControlCode;
+        app.documentResolution = record.iDocumentResolution;
+        app.name = Field(record.szAppName, sizeof record.szAppName);
+        app.path = Field(record.szAppFilePath, sizeof record.szAppFilePath);
+        app.file = Field(record.szAppFileName, sizeof record.szAppFileName);
+        bool repeated = false;
+        for (const ApplicationSummary& other : summary.applications) {
+          repeated = repeated || (other.pid == app.pid && other.applicationType == app.applicationType &&
+                                  other.organizationId == app.organizationId &&
+                                  other.applicationId == app.applicationId && other.controlCode == app.controlCode &&
+                                  other.name == app.name && other.path == app.path && other.file == app.file);
+        }
+        if (!repeated) summary.applications.push_back(app);
+      }
+    }
+  }
+}
+
+}  // namespace
+
+Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace) {
+  TraceOutput::QuietScope quiet(trace);
+  Summary summary;
+  summary.standard = RavelCfg_GetStandard() == 1 ? "japan" : "brazil";
+  AddPat(registry, summary);
+  AddSdt(registry, summary);
+  AddPmts(registry, summary);
+  AddNit(registry, summary);
+  AddEvents(registry, summary);
+  AddTime(registry, summary);
+  AddApplications(registry, summary);
+  summary.carousels = carousel.Summarize();
+  return summary;
+}
+
+}  // namespace ravel_dump

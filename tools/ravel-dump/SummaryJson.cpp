@@ -1,0 +1,139 @@
+// The summary as JSON for scripts. Broadcast texts are escaped as in the text
+// output (\xNN for control bytes and bytes that are not UTF-8), so the
+// document is valid UTF-8 whatever the broadcast's character coding.
+#include <nlohmann/json.hpp>
+
+#include "ByteText.h"
+#include "Summary.h"
+
+namespace ravel_dump {
+namespace {
+
+using nlohmann::json;
+
+json Text(const std::string& text) { return EscapeBytes(text); }
+
+json When(const DateTime& t) {
+  if (!t.valid) return nullptr;
+  return json{{"year", t.year}, {"month", t.month}, {"day", t.day},
+              {"hour", t.hour}, {"minute", t.minute}, {"second", t.second}};
+}
+
+json Pid(int pid) { return pid < 0 ? json(nullptr) : json(pid); }
+
+json Event(const EventSummary& e) {
+  if (!e.valid) return nullptr;
+  json ratings = json::array();
+  for (const Rating& r : e.ratings)
+    ratings.push_back({{"country", Text(r.country)}, {"content", r.content}, {"minimum_age", r.minimumAge}});
+  return json{{"event_id", e.eventId},
+              {"start", When(e.start)},
+              {"duration", {{"hours", e.duration.hours}, {"minutes", e.duration.minutes},
+                            {"seconds", e.duration.seconds}}},
+              {"running_status", e.runningStatus},
+              {"name", Text(e.name)},
+              {"text", Text(e.text)},
+              {"ratings", ratings}};
+}
+
+}  // namespace
+
+std::string SummaryJson(const Summary& s) {
+  json network = nullptr;
+  if (s.network.valid) {
+    json streams = json::array();
+    for (const TransportStreamSummary& ts : s.network.streams) {
+      json services = json::array();
+      for (const auto& service : ts.serviceList) services.push_back({{"id", service.first}, {"type", service.second}});
+      streams.push_back({{"id", ts.id},
+                         {"original_network_id", ts.originalNetworkId},
+                         {"name", Text(ts.name)},
+                         {"remote_control_key", ts.remoteControlKey < 0 ? json(nullptr) : json(ts.remoteControlKey)},
+                         {"area_code", ts.areaCode < 0 ? json(nullptr) : json(ts.areaCode)},
+                         {"guard_interval", ts.guardInterval < 0 ? json(nullptr) : json(ts.guardInterval)},
+                         {"transmission_mode", ts.transmissionMode < 0 ? json(nullptr) : json(ts.transmissionMode)},
+                         {"frequencies", ts.frequencies},
+                         {"partial_reception", ts.partialReception},
+                         {"services", services}});
+    }
+    network = {{"id", s.network.id}, {"name", Text(s.network.name)}, {"transport_streams", streams}};
+  }
+
+  json services = json::array();
+  for (const ServiceSummary& service : s.services) {
+    json streams = json::array();
+    for (const StreamSummary& stream : service.streams) {
+      streams.push_back({{"stream_type", stream.streamType},
+                         {"pid", stream.pid},
+                         {"component_tag", stream.componentTag < 0 ? json(nullptr) : json(stream.componentTag)}});
+    }
+    services.push_back({{"id", service.id},
+                        {"type", service.type < 0 ? json(nullptr) : json(service.type)},
+                        {"name", Text(service.name)},
+                        {"provider", Text(service.provider)},
+                        {"one_segment", service.oneSegment},
+                        {"pmt_pid", Pid(service.pmtPid)},
+                        {"pcr_pid", Pid(service.pcrPid)},
+                        {"video_pid", Pid(service.videoPid)},
+                        {"audio_pids", service.audioPids},
+                        {"caption_pid", Pid(service.captionPid)},
+                        {"streams", streams},
+                        {"present", Event(service.present)},
+                        {"following", Event(service.following)}});
+  }
+
+  json time = nullptr;
+  if (s.time.valid) {
+    json offsets = json::array();
+    for (const LocalOffset& o : s.time.offsets) {
+      offsets.push_back({{"country", Text(o.country)},
+                         {"region_id", o.regionId},
+                         {"polarity", o.polarity},
+                         {"offset", {{"hours", o.offsetHours}, {"minutes", o.offsetMinutes}}},
+                         {"time_of_change", When(o.timeOfChange)},
+                         {"next_offset", {{"hours", o.nextHours}, {"minutes", o.nextMinutes}}}});
+    }
+    time = {{"source", s.time.source}, {"time", When(s.time.time)}, {"local_time_offsets", offsets}};
+  }
+
+  json applications = json::array();
+  for (const ApplicationSummary& app : s.applications) {
+    applications.push_back({{"pid", Pid(app.pid)},
+                            {"application_type", app.applicationType},
+                            {"organization_id", app.organizationId},
+                            {"application_id", app.applicationId},
+                            {"control_code", app.controlCode},
+                            {"document_resolution", app.documentResolution},
+                            {"name", Text(app.name)},
+                            {"path", Text(app.path)},
+                            {"file", Text(app.file)}});
+  }
+
+  json carousels = json::array();
+  for (const CarouselSummary& c : s.carousels) {
+    json modules = json::array();
+    for (const ModuleSummary& m : c.modules) {
+      modules.push_back({{"id", m.id},
+                         {"size", m.size},
+                         {"version", m.version},
+                         {"name", Text(m.name)},
+                         {"blocks_received", m.blocksReceived},
+                         {"blocks_total", m.blocksTotal},
+                         {"complete", m.complete},
+                         {"file", m.file.empty() ? json(nullptr) : json(EscapeBytes(m.file))}});
+    }
+    carousels.push_back(
+        {{"pid", Pid(c.pid)}, {"download_id", c.downloadId}, {"block_size", c.blockSize}, {"modules", modules}});
+  }
+
+  json document = {{"standard", s.standard},
+                   {"transport_stream_id", s.transportStreamId < 0 ? json(nullptr) : json(s.transportStreamId)},
+                   {"network", network},
+                   {"services", services},
+                   {"time", time},
+                   {"applications", applications},
+                   {"carousels", carousels}};
+  return document.dump(2) + "\n";
+}
+
+}  // namespace ravel_dump

@@ -1,0 +1,205 @@
+// The summary as text for a person at a terminal.
+#include <cstdarg>
+
+#include "ByteText.h"
+#include "Summary.h"
+
+namespace ravel_dump {
+namespace {
+
+std::string Format(const char* format, ...) __attribute__((format(printf, 1, 2)));
+std::string Format(const char* format, ...) {
+  char buffer[512];
+  va_list args;
+  va_start(args, format);
+  std::vsnprintf(buffer, sizeof buffer, format, args);
+  va_end(args);
+  return buffer;
+}
+
+std::string Quoted(const std::string& text) { return "\"" + EscapeBytes(text) + "\""; }
+
+std::string When(const DateTime& t) {
+  if (!t.valid) return "?";
+  return Format("%04d-%02d-%02d %02d:%02d:%02d", t.year, t.month, t.day, t.hour, t.minute, t.second);
+}
+
+std::string Pid(int pid) { return pid < 0 ? std::string("-") : Format("0x%04x", pid); }
+
+const char* GuardName(int guard) {
+  static const char* const kNames[] = {"1/32", "1/16", "1/8", "1/4"};
+  return guard >= 0 && guard < 4 ? kNames[guard] : "?";
+}
+
+void PrintEvent(std::FILE* out, const char* label, const EventSummary& event) {
+  if (!event.valid) {
+    std::fprintf(out, "    %-10s (none)\n", label);
+    return;
+  }
+  std::string line = Format("    %-10s %s for %02d:%02d:%02d ", label, When(event.start).c_str(),
+                            event.duration.hours, event.duration.minutes, event.duration.seconds);
+  line += event.name.empty() ? std::string("(no name)") : Quoted(event.name);
+  for (const Rating& rating : event.ratings) {
+    line += " rating " + EscapeBytes(rating.country) + Format(" age %d", rating.minimumAge);
+    if (rating.content != 0) line += Format(" content 0x%x", rating.content);
+  }
+  std::fprintf(out, "%s (event 0x%04x)\n", line.c_str(), event.eventId);
+}
+
+}  // namespace
+
+const char* ServiceTypeName(int type) {
+  switch (type) {
+    case 0x01: return "digital TV";
+    case 0x02: return "digital radio";
+    case 0x0C: return "data broadcast";
+    case 0xA1: return "special video";
+    case 0xA2: return "special audio";
+    case 0xA3: return "special data";
+    case 0xA4: return "engineering";
+    case 0xA5: return "promotion video";
+    case 0xA6: return "promotion audio";
+    case 0xA7: return "promotion data";
+    case 0xC0: return "data";
+    default: return "service";
+  }
+}
+
+const char* StreamTypeName(int type) {
+  switch (type) {
+    case 0x01: return "MPEG-1 video";
+    case 0x02: return "MPEG-2 video";
+    case 0x03: return "MPEG-1 audio";
+    case 0x04: return "MPEG-2 audio";
+    case 0x05: return "private sections";
+    case 0x06: return "PES private data";
+    case 0x0B: return "DSM-CC U-N messages";
+    case 0x0C: return "DSM-CC stream descriptors";
+    case 0x0D: return "DSM-CC sections";
+    case 0x0F: return "AAC (ADTS)";
+    case 0x11: return "AAC (LATM)";
+    case 0x1B: return "H.264 video";
+    case 0x24: return "HEVC video";
+    default: return "stream";
+  }
+}
+
+const char* ControlCodeName(uint32_t code) {
+  switch (code) {
+    case 1: return "autostart";
+    case 2: return "present";
+    case 3: return "destroy";
+    case 4: return "kill";
+    case 5: return "prefetch";
+    case 6: return "remote";
+    case 7: return "disabled";
+    case 8: return "playback autostart";
+    default: return "?";
+  }
+}
+
+void PrintSummaryText(const Summary& s, std::FILE* out) {
+  std::fprintf(out, "Standard: %s\n", s.standard.c_str());
+  if (s.network.valid) {
+    std::fprintf(out, "Network: %s (network_id 0x%04x)\n",
+                 s.network.name.empty() ? "(no name)" : Quoted(s.network.name).c_str(), s.network.id);
+  } else {
+    std::fputs("Network: (no NIT)\n", out);
+  }
+  if (s.transportStreamId >= 0) std::fprintf(out, "Transport stream: 0x%04x\n", s.transportStreamId);
+  for (const TransportStreamSummary& ts : s.network.streams) {
+    std::string line = Format("  TS 0x%04x of network 0x%04x", ts.id, ts.originalNetworkId);
+    if (!ts.name.empty()) line += " " + Quoted(ts.name);
+    if (ts.remoteControlKey >= 0) line += Format(", remote control key %d", ts.remoteControlKey);
+    std::fprintf(out, "%s\n", line.c_str());
+    if (ts.areaCode >= 0) {
+      std::fprintf(out, "    area code 0x%03x, guard interval %s, mode %d\n", ts.areaCode,
+                   GuardName(ts.guardInterval), ts.transmissionMode + 1);
+    }
+    if (!ts.frequencies.empty()) {
+      line = "    frequencies:";
+      for (unsigned int f : ts.frequencies) line += Format(" %.3f MHz (%u)", f / 7.0, f);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+    if (!ts.partialReception.empty()) {
+      line = "    partial reception:";
+      for (int id : ts.partialReception) line += Format(" 0x%02x", id);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+    if (!ts.serviceList.empty()) {
+      line = "    service list:";
+      for (const auto& service : ts.serviceList) line += Format(" 0x%04x/0x%02x", service.first, service.second);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+  }
+
+  std::fprintf(out, "Services (%zu):\n", s.services.size());
+  for (const ServiceSummary& service : s.services) {
+    std::string line = Format("  Service 0x%04x", service.id);
+    if (service.type >= 0) line += Format(" %s (0x%02x)", ServiceTypeName(service.type), service.type);
+    if (service.oneSegment) line += " one-segment";
+    if (!service.name.empty()) line += " " + Quoted(service.name);
+    if (!service.provider.empty()) line += " provider " + Quoted(service.provider);
+    std::fprintf(out, "%s\n", line.c_str());
+    if (service.pmtPid >= 0) {
+      line = "    PMT " + Pid(service.pmtPid) + ", PCR " + Pid(service.pcrPid) + ", video " + Pid(service.videoPid) +
+             ", audio";
+      if (service.audioPids.empty()) line += " -";
+      for (int pid : service.audioPids) line += " " + Pid(pid);
+      line += ", captions " + Pid(service.captionPid);
+      std::fprintf(out, "%s\n", line.c_str());
+      for (const StreamSummary& stream : service.streams) {
+        line = Format("      stream 0x%02x %s on %s", stream.streamType, StreamTypeName(stream.streamType),
+                      Pid(stream.pid).c_str());
+        if (stream.componentTag >= 0) line += Format(", component tag 0x%02x", stream.componentTag);
+        std::fprintf(out, "%s\n", line.c_str());
+      }
+    }
+    if (service.present.valid || service.following.valid) {
+      PrintEvent(out, "present:", service.present);
+      PrintEvent(out, "following:", service.following);
+    }
+  }
+
+  if (s.time.valid) {
+    std::fprintf(out, "Time: %s (%s)\n", When(s.time.time).c_str(), s.time.source.c_str());
+    for (const LocalOffset& o : s.time.offsets) {
+      char sign = o.polarity ? '-' : '+';
+      std::fprintf(out, "  local time offset %s region %d: %c%02d:%02d, changes %s to %c%02d:%02d\n",
+                   EscapeBytes(o.country).c_str(), o.regionId, sign, o.offsetHours, o.offsetMinutes,
+                   When(o.timeOfChange).c_str(), sign, o.nextHours, o.nextMinutes);
+    }
+  } else {
+    std::fputs("Time: (no TDT or TOT)\n", out);
+  }
+
+  std::fprintf(out, "Ginga applications (%zu):\n", s.applications.size());
+  for (const ApplicationSummary& app : s.applications) {
+    std::fprintf(out,
+                 "  PID %s type 0x%04x: organization 0x%08x application 0x%04x control %u (%s) name %s path %s "
+                 "file %s\n",
+                 Pid(app.pid).c_str(), app.applicationType, app.organizationId, app.applicationId, app.controlCode,
+                 ControlCodeName(app.controlCode), Quoted(app.name).c_str(), Quoted(app.path).c_str(),
+                 Quoted(app.file).c_str());
+  }
+
+  std::size_t modules = 0;
+  for (const CarouselSummary& c : s.carousels) modules += c.modules.size();
+  std::fprintf(out, "Carousel modules (%zu):\n", modules);
+  for (const CarouselSummary& c : s.carousels) {
+    std::fprintf(out, "  PID %s download 0x%08x, block size %d\n", Pid(c.pid).c_str(), c.downloadId, c.blockSize);
+    for (const ModuleSummary& m : c.modules) {
+      std::string line = Format("    module 0x%04x version %d, %u bytes", m.id, m.version, m.size);
+      if (!m.name.empty()) line += " " + Quoted(m.name);
+      if (m.complete) {
+        line += ", complete";
+      } else {
+        line += Format(", %u of %u blocks", m.blocksReceived, m.blocksTotal);
+      }
+      if (!m.file.empty()) line += " -> " + EscapeBytes(m.file);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+  }
+}
+
+}  // namespace ravel_dump

@@ -1,0 +1,187 @@
+// ravel-dump: reads a capture end to end through the section parser's public
+// interface, the way a receiver application does, and prints what it holds.
+#include <cstdio>
+#include <string>
+#include <vector>
+
+#include "Capture.h"
+#include "Demux.h"
+#include "Input.h"
+#include "Options.h"
+#include "Output.h"
+#include "PacketReader.h"
+#include "Progress.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_Cfg.h"
+#include "Report.h"
+#include "Stats.h"
+#include "TraceOutput.h"
+
+namespace {
+
+using namespace ravel_dump;
+
+const int kExitBadInput = 1;
+const int kExitUsage = 2;
+
+int Fail(const std::string& message) {
+  std::fprintf(stderr, "ravel-dump: %s\n", message.c_str());
+  return kExitBadInput;
+}
+
+// A file of concatenated raw sections (each 3 + section_length bytes; 0xFF
+// bytes between them are stuffing).
+bool ReadSections(InputFile& input, Capture& capture, Stats& stats, InputSummary& summary, std::string& error) {
+  std::vector<uint8_t> data;
+  if (!ReadWholeInput(input, data, error)) return false;
+  summary.bytes = data.size();
+  if (data.empty()) {
+    error = input.Name() + ": empty input";
+    return false;
+  }
+  std::size_t syncAt = 0;
+  int stride = 0;
+  if (data[0] == 0x47 && PacketReader::FindLock(data.data(), data.size(), syncAt, stride) && syncAt == 0) {
+    error = input.Name() + ": a transport stream, not raw sections (drop --sections)";
+    return false;
+  }
+  std::size_t pos = 0;
+  uint64_t sections = 0;
+  while (pos < data.size()) {
+    if (data[pos] == 0xFF) {
+      ++pos;
+      continue;
+    }
+    if (data.size() - pos < 3) {
+      error = input.Name() + ": truncated: the input ends inside a section header at byte " + std::to_string(pos);
+      return false;
+    }
+    std::size_t size = static_cast<std::size_t>(RavelSectionSize(data.data() + pos));
+    if (size > data.size() - pos) {
+      if (sections == 0) {
+        error = input.Name() + ": not a file of raw sections (the first would need " + std::to_string(size) +
+                " bytes, the input holds " + std::to_string(data.size() - pos) + ")";
+      } else {
+        error = input.Name() + ": truncated: the section at byte " + std::to_string(pos) + " needs " +
+                std::to_string(size) + " bytes, " + std::to_string(data.size() - pos) + " are left";
+      }
+      return false;
+    }
+    pos += size;
+    ++sections;
+  }
+  // Only a walk that fits the file exactly gets here; now hand the sections on.
+  pos = 0;
+  while (pos < data.size()) {
+    if (data[pos] == 0xFF) {
+      ++pos;
+      continue;
+    }
+    std::size_t size = static_cast<std::size_t>(RavelSectionSize(data.data() + pos));
+    ++stats.sectionsAssembled;
+    capture.OnSection(kNoPid, data.data() + pos, size);
+    pos += size;
+  }
+  uint64_t accepted = 0;
+  for (const KindStats& k : stats.kinds) accepted += k.sections;
+  if (sections > 0 && accepted == 0) {
+    error = input.Name() + ": not a file of sections (none has a valid CRC and structure)";
+    return false;
+  }
+  return true;
+}
+
+bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, InputSummary& summary,
+                         std::string& error) {
+  PacketReader reader(input);
+  if (!reader.Start(error)) return false;
+  Progress progress(options.progress, input.Size());
+  while (const uint8_t* packet = reader.Next()) {
+    demux.OnPacket(packet);
+    progress.Update(reader.Offset());
+  }
+  progress.Finish();
+  summary.packets = reader.Packets();
+  summary.packetSize = reader.PacketSize();
+  summary.skippedBytes = reader.SkippedBytes();
+  summary.resyncs = reader.Resyncs();
+  summary.bytes = reader.Offset();
+  if (!reader.Error().empty()) {
+    error = reader.Error();
+    return false;
+  }
+  return true;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  Options options;
+  std::string error;
+  switch (ParseOptions(argc, argv, options, error)) {
+    case ParseOutcome::kExitOk:
+      return 0;
+    case ParseOutcome::kUsageError:
+      std::fprintf(stderr, "ravel-dump: %s (see ravel-dump --help)\n", error.c_str());
+      return kExitUsage;
+    case ParseOutcome::kRun:
+      break;
+  }
+  if (options.standard >= 0) RavelCfg_SetStandard(options.standard);
+
+  Stats stats;
+  TraceOutput trace(options.traceLevels, stats);
+  InputFile input;
+  if (!input.Open(options.input, error)) return Fail(error);
+
+  Capture capture(stats);
+  Demux demux(stats, capture);
+  InputSummary inputSummary;
+  inputSummary.name = input.Name();
+  inputSummary.sections = options.sections;
+  if (options.sections) {
+    if (!ReadSections(input, capture, stats, inputSummary, error)) return Fail(error);
+  } else {
+    capture.SetDemux(&demux);
+    if (options.pids.empty()) {
+      demux.AddStandardPids();
+    } else {
+      demux.RestrictTo(options.pids);
+    }
+    if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (options.pids.empty() && stats.pids[0].sections == 0) {
+      stats.Problem("no PAT read: only the PIDs every receiver reads were read; name others with --pid");
+    }
+  }
+
+  // Everything is read: now the outputs, modules first so that a failure to
+  // write them leaves no half output behind.
+  Summary summary;
+  bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
+                     !options.extractDirectory.empty();
+  if (wantSummary) summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
+  if (!options.extractDirectory.empty()) {
+    if (!capture.Carousel().WriteModules(options.extractDirectory, summary.carousels, error)) return Fail(error);
+  }
+  switch (options.mode) {
+    case OutputMode::kDump:
+      DumpTables(capture.Registry(), options.tables, trace, stdout);
+      break;
+    case OutputMode::kSummary:
+      PrintSummaryText(summary, stdout);
+      break;
+    case OutputMode::kJson:
+      std::fputs(SummaryJson(summary).c_str(), stdout);
+      break;
+    case OutputMode::kNone:
+      for (const CarouselSummary& carousel : summary.carousels) {
+        for (const ModuleSummary& module : carousel.modules) {
+          if (!module.file.empty()) std::printf("%s\n", module.file.c_str());
+        }
+      }
+      break;
+  }
+  if (std::fflush(stdout) != 0 || std::ferror(stdout)) return Fail("cannot write the output");
+  if (options.report) PrintReport(stderr, inputSummary, stats, demux.Roles(), capture.Registry());
+  return 0;
+}
