@@ -8,7 +8,7 @@
 #   ravel-dump / libdvbpsi on the SI-heavy capture,                target >= 1.0
 #
 # Environment: RAVEL_BENCH_MB   size of each large capture in MB (default 300)
-#              RAVEL_BENCH_RUNS timed runs of each program, best kept (default 5)
+#              RAVEL_BENCH_RUNS timed runs of each program, best kept (default 10)
 #              RAVEL_CAPTURES   folder of the shared captures (default ../shared/captures)
 #              RAVEL_BENCH_FILTER  regex of the Google benchmarks to run (default all)
 #              RAVEL_BENCH_MIN_TIME  --benchmark_min_time of each (default 0.5)
@@ -18,7 +18,7 @@ root="$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)"
 build="$root/build-bench"
 captures="${RAVEL_CAPTURES:-$root/../shared/captures}"
 size_mb="${RAVEL_BENCH_MB:-300}"
-runs="${RAVEL_BENCH_RUNS:-5}"
+runs="${RAVEL_BENCH_RUNS:-10}"
 filter="${RAVEL_BENCH_FILTER:-.}"
 min_time="${RAVEL_BENCH_MIN_TIME:-0.5}"
 
@@ -89,8 +89,10 @@ awk -v out="$rows" '
   }' "$work/bench.json"
 
 # --- End to end ---------------------------------------------------------------
-# Best wall time of `runs` runs (after one untimed run that fills the page
-# cache), as MB/s (1 MB = 10^6 bytes) of the file.
+# Each program reads the whole file once untimed (which also fills the page
+# cache), then the programs take turns for `runs` rounds so that the load of a
+# shared machine falls on all of them alike; the best wall time of each is
+# kept and given as MB/s (1 MB = 10^6 bytes) of the file.
 # A program may end with a nonzero status to report what it found in the
 # capture; one killed by a signal has not done the job.
 run_once() {  # file program args...
@@ -98,23 +100,9 @@ run_once() {  # file program args...
   "$@" "$file" >/dev/null 2>"$work/last.err" || status=$?
   if [ "$status" -ge 128 ]; then
     tail -n 5 "$work/last.err" >&2
-    echo "$1 died (status $status)" >&2
-    return 1
+    echo "$1 died (status $status) on $file" >&2
+    exit 1
   fi
-}
-best_mbps() {  # file program args...
-  local file="$1"; shift
-  local bytes best=0 start end ns i
-  bytes=$(stat -c %s "$file")
-  run_once "$file" "$@" || return 1
-  for ((i = 0; i < runs; i++)); do
-    start=$(date +%s%N)
-    run_once "$file" "$@" || return 1
-    end=$(date +%s%N)
-    ns=$((end - start))
-    if [ "$best" -eq 0 ] || [ "$ns" -lt "$best" ]; then best=$ns; fi
-  done
-  awk -v b="$bytes" -v ns="$best" 'BEGIN { printf "%.1f", b / 1e6 / (ns / 1e9) }'
 }
 
 make_capture() {  # source name -> path of a file of about size_mb MB
@@ -137,6 +125,16 @@ else
   row "ravel-dump --summary" "skipped" "" "ravel-dump is not built on this branch yet"
 fi
 
+# The programs timed, by name: the command line before the file.
+declare -A command
+command[bare]="$bare"
+command[dvbpsi]="$dvbpsi"
+order=(bare dvbpsi)
+if [ "$have_dump" = 1 ]; then
+  command[dump]="$dump ${dump_args[*]}"
+  order+=(dump)
+fi
+
 ratio_live="n/a"
 ratio_epg="n/a"
 for kind in live epg; do
@@ -147,19 +145,36 @@ for kind in live epg; do
   fi
   echo "Making a ${size_mb} MB capture from dvb-$kind.ts and timing (best of $runs) ..." >&2
   big="$(make_capture "$source" "big-$kind.ts")"
-  mb=$(awk -v b="$(stat -c %s "$big")" 'BEGIN { printf "%.0f", b / 1e6 }')
-  what="dvb-$kind.ts x$(( $(stat -c %s "$big") / $(stat -c %s "$source") )) ($mb MB)"
-  bare_rate=$(best_mbps "$big" "$bare")
-  dvbpsi_rate=$(best_mbps "$big" "$dvbpsi")
-  row "$kind: bare loop (read, count per PID)" "$bare_rate" "MB/s" "$what"
-  row "$kind: libdvbpsi harness" "$dvbpsi_rate" "MB/s" "$what"
+  bytes=$(stat -c %s "$big")
+  what="dvb-$kind.ts x$((bytes / $(stat -c %s "$source"))) ($(awk -v b="$bytes" 'BEGIN { printf "%.0f", b / 1e6 }') MB)"
+  declare -A best=()
+  for name in "${order[@]}"; do
+    # shellcheck disable=SC2086  # the command line is split on purpose
+    run_once "$big" ${command[$name]}
+    best[$name]=0
+  done
+  for ((i = 0; i < runs; i++)); do
+    for name in "${order[@]}"; do
+      start=$(date +%s%N)
+      # shellcheck disable=SC2086
+      run_once "$big" ${command[$name]}
+      end=$(date +%s%N)
+      ns=$((end - start))
+      if [ "${best[$name]}" -eq 0 ] || [ "$ns" -lt "${best[$name]}" ]; then best[$name]=$ns; fi
+    done
+  done
+  declare -A rate=()
+  for name in "${order[@]}"; do
+    rate[$name]=$(awk -v b="$bytes" -v ns="${best[$name]}" 'BEGIN { printf "%.0f", b / 1e6 / (ns / 1e9) }')
+  done
+  row "$kind: bare loop (read, count per PID)" "${rate[bare]}" "MB/s" "$what"
+  row "$kind: libdvbpsi harness" "${rate[dvbpsi]}" "MB/s" "$what"
   if [ "$have_dump" = 1 ]; then
-    dump_rate=$(best_mbps "$big" "$dump" "${dump_args[@]}")
-    row "$kind: ravel-dump ${dump_args[*]}" "$dump_rate" "MB/s" "$what"
+    row "$kind: ravel-dump ${dump_args[*]}" "${rate[dump]}" "MB/s" "$what"
     if [ "$kind" = live ]; then
-      ratio_live=$(awk -v a="$dump_rate" -v b="$bare_rate" 'BEGIN { printf "%.2f", a / b }')
+      ratio_live=$(awk -v a="${rate[dump]}" -v b="${rate[bare]}" 'BEGIN { printf "%.2f", a / b }')
     else
-      ratio_epg=$(awk -v a="$dump_rate" -v b="$dvbpsi_rate" 'BEGIN { printf "%.2f", a / b }')
+      ratio_epg=$(awk -v a="${rate[dump]}" -v b="${rate[dvbpsi]}" 'BEGIN { printf "%.2f", a / b }')
     fi
   fi
   rm -f "$big"
