@@ -72,7 +72,11 @@ awk -v out="$rows" '
   /^ *\}/ {
     if (!("name" in f)) next
     name = f["name"]
-    if (f["error_occurred"] == "true") { printf "%s|skipped||%s\n", name, f["error_message"] >> out; next }
+    if (f["error_occurred"] == "true") {
+      printf "%s|skipped||%s\n", name, f["error_message"] >> out
+      delete f
+      next
+    }
     items = f["items_per_second"] + 0; bytes = f["bytes_per_second"] + 0
     if (name ~ /^BM_SectionCRC32/) {
       printf "%s|%.0f|MB/s|%.1f M sections/s\n", name, bytes / 1e6, items / 1e6 >> out
