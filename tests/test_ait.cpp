@@ -236,6 +236,7 @@ TEST(AitParse, FailuresLeaveNoApplications) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, ait.ParseRawData(section)) << c.label;
     EXPECT_EQ((TraceLines{{kInfo, ParseLine(section)}, {kError, c.message}}), recorder.Lines()) << c.label;
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableAIT", r.file);
     EXPECT_EQ(0, ait.GetApplicationList()->iCount) << c.label;
     EXPECT_EQ(c.tableId, ait.iTableId) << c.label;
     // CRC failures keep the previous header; a foreign table_id leaves the new one.
@@ -334,6 +335,7 @@ TEST(AitCopy, CopiesTheHeaderButNoApplicationsAndMergesNothing) {
     RavelCAIT& result = (source += other);
     EXPECT_EQ(&source, &result) << m.label;
     EXPECT_EQ(m.traces, recorder.Lines()) << m.label;
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableAIT", r.file);
     ASSERT_EQ(3, source.GetApplicationList()->iCount) << m.label;
     EXPECT_EQ(3u, At(source, 2).iOrganizationId) << m.label;
     EXPECT_EQ(6, source.iVersionNumber) << m.label;

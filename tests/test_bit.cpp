@@ -147,6 +147,7 @@ TEST(BITParse, RefusesNullBadCrcAndForeignTableIds) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, bit.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableBIT", r.file);
     EXPECT_EQ(0, bit.GetBroadcasterCount());
     EXPECT_EQ(c.tableId, bit.iTableId);
     EXPECT_EQ(c.extension, bit.iTableIdExtension);

@@ -19,6 +19,7 @@
 #include "Ravel_CDescriptorParentalRating.h"
 #include "Ravel_CDescriptorSeries.h"
 #include "Ravel_CDescriptorShortEvent.h"
+#include "BitWalk.h"
 #include "Ravel_CDescriptorTargetRegion.h"
 #include "StreamBuilder.h"
 #include "TraceRecorder.h"
@@ -659,4 +660,89 @@ TEST(ContentDescriptor, GenreIndexOutOfRangeTracesAndGivesZero) {
     EXPECT_EQ(TraceLines({{kWarning, c.message}, {kWarning, c.message}}), recorder.Lines());
     EXPECT_EQ(0, recorder.PanicCount());
   }
+}
+
+// ---------------------------------------------------------------------------
+// Every wire bit of the fixed fields, one at a time
+
+namespace {
+
+using bitwalk::Base;
+using bitwalk::Field;
+using Values = std::vector<int64_t>;
+
+Values AudioComponentFields(unsigned char* raw) {
+  RavelCAudioComponentDescriptor d(raw);
+  return {d.GetStreamContent(),      d.GetComponentType(),     d.GetComponentTag(),
+          d.GetStreamType(),         d.GetSimulcastGroupTag(), d.GetESMultiLingualFlag(),
+          d.GetMainComponentFlag(),  d.GetQualityIndicator(),  d.GetSampleRate(),
+          d.GetISO639LanguageCode(), d.GetISO639LanguageCode2()};
+}
+
+const std::vector<Field> kAudioComponentFields = {
+    {"stream content", {{20, 4}}},          {"component type", {{24, 8}}},
+    {"component tag", {{32, 8}}},           {"stream type", {{40, 8}}},
+    {"simulcast group tag", {{48, 8}}},     {"ES multi-lingual flag", {{56, 1}}},
+    {"main component flag", {{57, 1}}},     {"quality indicator", {{58, 2}}},
+    {"sampling rate", {{60, 3}}},           {"ISO 639 language code", {{64, 24}}},
+    {"ISO 639 language code 2", {{88, 24}}},
+};
+
+}  // namespace
+
+TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
+  const bitwalk::Walk walks[] = {
+      {"extended event", Base({0x4E, 5}, 8), 16, 24,
+       {{"descriptor number", {{16, 4}}}, {"last descriptor number", {{20, 4}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCExtendedEventDescriptor d(raw);
+         return {d.GetDescriptorNumber(), d.GetLastDescriptorNumber()};
+       }},
+      {"component", Base({0x50, 6}, 8), 16, 64,
+       {{"stream content", {{20, 4}}},
+        {"component type", {{24, 8}}},
+        {"component tag", {{32, 8}}},
+        {"ISO 639 language code", {{40, 24}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCComponentDescriptor d(raw);
+         return {d.GetStreamContent(), d.GetComponentType(), d.GetComponentTag(), d.GetISO639LanguageCode()};
+       }},
+      // The ES multi-lingual bit alone reads a second code, from zeros here.
+      {"audio component", Base({0xC4, 0x20}, 40), 16, 88, kAudioComponentFields, AudioComponentFields},
+      {"audio component, second code", Base({0xC4, 0x20, 0, 0, 0, 0, 0, 0x80}, 40), 88, 112, kAudioComponentFields,
+       AudioComponentFields},
+      {"content", Base({0x54, 2}, 4), 16, 32,
+       {{"content nibble level 1", {{16, 4}}}, {"content nibble level 2", {{20, 4}}}, {"user genre", {{24, 8}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCContentDescriptor d(raw);
+         unsigned char level1 = 0, level2 = 0;
+         d.GetGenre(0, level1, level2);
+         return {level1, level2, d.GetUserGenre(0)};
+       }},
+      {"data component", Base({0xFD, 2}, 4), 16, 32, {{"data component id", {{16, 16}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCDataComponentDescriptor d(raw);
+         return {d.GetDataComponentId()};
+       }},
+      {"series", Base({0xD5, 8}, 12), 16, 80,
+       {{"series id", {{16, 16}}},
+        {"repeat label", {{32, 4}}},
+        {"program pattern", {{36, 3}}},
+        {"expire date valid flag", {{39, 1}}},
+        {"expire date", {{40, 16}}},
+        {"episode number", {{56, 12}}},
+        {"last episode number", {{68, 12}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCSeriesDescriptor d(raw);
+         return {d.GetSeriesId(),   d.GetRepeatLabel(),     d.GetProgramPattern(),     d.GetExpireDateValidFlag(),
+                 d.GetExpireDate(), d.GetEpisodeNumber(), d.GetLastEpisodeNumber()};
+       }},
+      {"copyright", Base({0x0D, 4}, 12), 16, 48, {{"copyright id", {{16, 32}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCCopyrightDescriptor d(raw);
+         return {d.GetCopyrightId()};
+       }},
+  };
+  TraceRecorder recorder;  // the content descriptor reports every genre
+  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
 }

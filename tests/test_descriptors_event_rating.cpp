@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "BitWalk.h"
 #include "Ravel_CDescriptorCountryAvailability.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
 #include "Ravel_CDescriptorParentalRating.h"
@@ -369,4 +370,62 @@ TEST(CountryAvailabilityDescriptor, CodeIndexOutOfRangePanicsAndYieldsNull) {
     EXPECT_EQ(TraceLines({{0x40000001u, "Array Bound Overflow! anIndex=[" + std::to_string(index) + "], iCount=[2]\n"}}),
               recorder.Lines());
   }
+}
+
+// ---------------------------------------------------------------------------
+// Every wire bit of the fixed fields, one at a time
+
+namespace {
+
+using bitwalk::Base;
+using bitwalk::Field;
+using Values = std::vector<int64_t>;
+
+// The first entry of a local time offset descriptor, whose entry starts at byte
+// 2: everything but the MJD of the time of change (bytes 8 and 9), which is no
+// sum of its bits. The BCD digits count ten times in their tens place.
+Values LocalTimeOffsetFields(unsigned char* raw) {
+  RavelCLocalTimeOffsetDescriptor d(raw);
+  RavelCLocalTimeOffset* e = d.GetLocalTimeOffset(0);
+  return {e->GetCountryRegionId(),     e->GetLocalTimeOffsetPolarity(), e->GetLocalTimeOffsetHour(),
+          e->GetLocalTimeOffsetMinute(), e->GetTimeOfChange().iHour,      e->GetTimeOfChange().iMinute,
+          e->GetTimeOfChange().iSecond,  e->GetNextTimeOffsetHour(),      e->GetNextTimeOffsetMinute()};
+}
+
+const std::vector<Field> kLocalTimeOffsetFields = {
+    {"country region id", {{40, 6}}},
+    {"local time offset polarity", {{47, 1}}},
+    {"local time offset hour", {{48, 4, 10}, {52, 4}}},
+    {"local time offset minute", {{56, 4, 10}, {60, 4}}},
+    {"time of change hour", {{80, 4, 10}, {84, 4}}},
+    {"time of change minute", {{88, 4, 10}, {92, 4}}},
+    {"time of change second", {{96, 4, 10}, {100, 4}}},
+    {"next time offset hour", {{104, 4, 10}, {108, 4}}},
+    {"next time offset minute", {{112, 4, 10}, {116, 4}}},
+};
+
+}  // namespace
+
+TEST(RatingDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
+  StandardScope brazil(0);
+  const bitwalk::Walk walks[] = {
+      // Selector 1 ("L", age 0) stays; the content nibble above it is walked.
+      {"parental rating content", Base({0x55, 4, 'B', 'R', 'A', 0x01}, 8), 40, 44,
+       {{"content", {{40, 4}}}, {"minimum age", {}}},
+       [](unsigned char* raw) -> Values {
+         RavelCParentalRatingDescriptor d(raw);
+         return {d.GetParentalRating(0)->GetContent(), d.GetParentalRating(0)->GetMinimumAge()};
+       }},
+      {"local time offset region and offset", Base({0x58, 13, 'B', 'R', 'A'}, 16), 40, 64, kLocalTimeOffsetFields,
+       LocalTimeOffsetFields},
+      {"local time offset change and next offset", Base({0x58, 13, 'B', 'R', 'A'}, 16), 80, 120,
+       kLocalTimeOffsetFields, LocalTimeOffsetFields},
+      {"country availability", Base({0x49, 1}, 4), 16, 24, {{"country availability flag", {{16, 1}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCCountryAvailabilityDescriptor d(raw);
+         return {d.GetCountryAvailabilityFlag()};
+       }},
+  };
+  TraceRecorder recorder;
+  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
 }

@@ -7,6 +7,7 @@
 #include <memory>
 #include <string>
 
+#include "BitWalk.h"
 #include "Ravel_CAdditionalGingaInfo.h"
 #include "Ravel_CDescriptorApplication.h"
 #include "Ravel_CDescriptorApplicationName.h"
@@ -435,4 +436,81 @@ TEST(GingaAppDataComponentDescriptor, CopiesOwnTheirRecords) {
   EXPECT_EQ(nullptr, assigned.pAdditionalGingaInfo);
   EXPECT_EQ(0, assigned.iDataComponentId);
   EXPECT_EQ(0, assigned.iDescriptorTag);
+}
+
+// ---------------------------------------------------------------------------
+// Every wire bit of the fixed fields, one at a time
+
+namespace {
+
+using Values = std::vector<int64_t>;
+
+// The data component id, the additional Ginga information from byte 4 and,
+// for transmission format 2, its object carousel record (zeros without one).
+Values GingaDataComponentFields(unsigned char* raw) {
+  RavelCGingaAppDataComponentDescriptor d(raw);
+  const RavelCAdditionalGingaInfo* info = d.GetAdditionalGingaInfo();
+  const RavelCObjectCarouselTransmissionFormat* carousel = info->GetData();
+  return {d.GetDataComponentId(),
+          info->GetTransmissionFormat(),
+          info->GetApplicationIdentifierFlag(),
+          info->GetDocumentResolution(),
+          info->GetIndependentFlag(),
+          info->iApplicationIdentifierOrgId,
+          info->GetApplicationIdentifierAppId(),
+          carousel ? carousel->iCarouselId : 0,
+          carousel ? carousel->GetOnDemandRetrievalFlag() : 0,
+          carousel ? carousel->GetFileStorableFlag() : 0,
+          carousel ? carousel->GetEventSectionFlag() : 0};
+}
+
+// The application identifier follows the flags byte when its flag is set, and
+// the carousel record follows them.
+std::vector<bitwalk::Field> GingaDataComponentLayout(bool identified, bool carousel) {
+  const int at = identified ? 88 : 40;
+  return {{"data component id", {{16, 16}}},
+          {"transmission format", {{32, 2}}},
+          {"application identifier flag", {{34, 1}}},
+          {"document resolution", {{35, 4}}},
+          {"independent flag", {{39, 1}}},
+          {"organization id", {{40, identified ? 32 : 0}}},
+          {"application id", {{72, identified ? 16 : 0}}},
+          {"carousel id", {{at, carousel ? 32 : 0}}},
+          {"on demand retrieval flag", {{at + 32, carousel ? 1 : 0}}},
+          {"file storable flag", {{at + 33, carousel ? 1 : 0}}},
+          {"event section flag", {{at + 34, carousel ? 1 : 0}}}};
+}
+
+}  // namespace
+
+TEST(GingaDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
+  using bitwalk::Base;
+  const bitwalk::Walk walks[] = {
+      // The profiles length is read and dropped; one profile is read whatever it says.
+      {"application", Base({0x00, 9}, 12), 16, 88,
+       {{"application profile", {{24, 16}}},
+        {"version major", {{40, 8}}},
+        {"version minor", {{48, 8}}},
+        {"version micro", {{56, 8}}},
+        {"service bound flag", {{64, 1}}},
+        {"visibility", {{65, 2}}},
+        {"application priority", {{72, 8}}},
+        {"transport protocol label", {{80, 8}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCApplicationDescriptor d(raw);
+         return {d.GetApplicationProfile(), d.GetVersionMajor(),     d.GetVersionMinor(),    d.GetVersionMicro(),
+                 d.GetServiceBoundFlag(),   d.GetVisibility(),       d.GetAppPriority(),     d.GetAppTransportLabel()};
+       }},
+      // The flags byte; the identifier and the carousel record then come from zeros.
+      {"ginga data component", Base({0xFD, 0x20}, 40), 16, 40, GingaDataComponentLayout(false, false),
+       GingaDataComponentFields},
+      {"application identifier", Base({0xFD, 0x20, 0, 0, 0x20}, 40), 40, 88, GingaDataComponentLayout(true, false),
+       GingaDataComponentFields},
+      {"object carousel", Base({0xFD, 0x20, 0, 0, 0x80}, 40), 40, 80, GingaDataComponentLayout(false, true),
+       GingaDataComponentFields},
+      {"object carousel after the identifier", Base({0xFD, 0x20, 0, 0, 0xA0}, 40), 88, 128,
+       GingaDataComponentLayout(true, true), GingaDataComponentFields},
+  };
+  TraceRecorder recorder;  // the Ginga data component traces every value it reads
+  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
 }

@@ -18,6 +18,7 @@
 #include "Ravel_CDescriptorTerrDeliverySystem.h"
 #include "Ravel_CTxType.h"
 #include "Ravel_Cfg.h"
+#include "BitWalk.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
 #include "TraceRecorder.h"
@@ -386,6 +387,9 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
   Bytes tsRaw = Descriptor(0xCD, Cat({Bytes{0x05, (1 << 2) | 1}, Text("A"), Bytes{0x0F, 1}, U16(0x4800)}));
   Bytes systemRaw = Descriptor(0xFE, Bytes{0xC5, 0x02});
   Bytes terrRaw = Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234)}));
+  Bytes broadcasterRaw = Descriptor(0xCE, Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05});
+  Bytes logoRaw = Descriptor(0xCF, Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A});
+  Bytes logoTextRaw = Descriptor(0xCF, Bytes{0x03, 'a', 'b'});
 
   for (bool useNull : {false, true}) {
     SCOPED_TRACE(useNull ? "null" : "foreign tag");
@@ -403,17 +407,31 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
     EXPECT_EQ(kRavelErrInvalidArgument, stream.ParseRawData(bad));
     EXPECT_EQ(0, stream.GetComponentTag());
 
-    // The TS information descriptor zeroes its key id on null only; its name and
-    // records are released either way.
+    // The TS information descriptor zeroes its key id and its record count on
+    // null only: a foreign tag keeps both, with the records they count. The name
+    // is released either way.
     RavelCTSInformationDescriptor ts(tsRaw.data());
     EXPECT_EQ(kRavelErrInvalidArgument, ts.ParseRawData(bad));
     EXPECT_EQ(useNull ? 0 : 0x05, ts.GetRemoteControlKeyId());
-    EXPECT_EQ(0, ts.GetTransmissionTypeCount());
+    EXPECT_EQ(useNull ? 0 : 1, ts.GetTransmissionTypeCount());
     EXPECT_STREQ("", ts.GetTsName());
-    EXPECT_EQ(0, ts.cTxTypes[0].GetNumOfService());
-    EXPECT_EQ(nullptr, ts.cTxTypes[0].pServiceIds);
+    EXPECT_EQ(useNull ? 0 : 0x0F, ts.cTxTypes[0].GetTransmissionTypeInfo());
+    EXPECT_EQ(useNull ? 0 : 1, ts.cTxTypes[0].GetNumOfService());
+    if (useNull) {
+      EXPECT_EQ(nullptr, ts.cTxTypes[0].pServiceIds);
+    } else {
+      EXPECT_EQ(0x4800, ts.cTxTypes[0].GetServiceId(0));
+      recorder.Clear();
+      ts.Show();
+      EXPECT_EQ((TraceLines{{kDump, Banner("TS Information Descriptor")},
+                            {kDump, BaseLine(0x42, 7, "Unknown Descriptor")},
+                            {kDump, "\tRemote Control Key Id=[0x05], Ts Name=[], Tx Type Count=[1]\n"},
+                            {kDump, "\t\tTramsmission Type Info=[0x0f], Num of Service=[1]\n"},
+                            {kDump, "\t\t\tTS Info: Service Id=[0x4800]\n"}}),
+                recorder.Lines());
+    }
 
-    // The others keep their scalar fields and lose their lists.
+    // The others keep their scalar fields and lose their texts and lists.
     RavelCSystemManagementDescriptor system(systemRaw.data());
     EXPECT_EQ(kRavelErrInvalidArgument, system.ParseRawData(bad));
     EXPECT_EQ(0x01, system.GetBroadcastingFlag());
@@ -425,6 +443,66 @@ TEST(ServiceDescriptorFailure, OnlyLinkageStreamIdAndTsInfoZeroTheirFields) {
     EXPECT_EQ(0x801, terr.GetAreaCode());
     EXPECT_EQ(0, terr.GetFrequencyCount());
     EXPECT_EQ(nullptr, terr.pFrequencies);
+
+    RavelCExtendedBroadcasterDescriptor broadcaster(broadcasterRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, broadcaster.ParseRawData(bad));
+    EXPECT_EQ(1, broadcaster.GetBroadcasterType());
+    EXPECT_EQ(0x0123, broadcaster.GetTerrestrialBroadcasterId());
+    EXPECT_EQ(0, broadcaster.GetNumberOfAffiliationIds());
+    EXPECT_EQ(0, broadcaster.GetNumberOfBroadcasterIds());
+    EXPECT_EQ(0, broadcaster.GetAffiliationId(0));
+    EXPECT_EQ(0, broadcaster.GetOriginalNetworkId(0));
+    EXPECT_EQ(0, broadcaster.GetBroadcasterId(0));
+
+    RavelCLogoTransmissionDescriptor logo(logoRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, logo.ParseRawData(bad));
+    EXPECT_EQ(1, logo.GetLogoTransmissionType());
+    EXPECT_EQ(0x123, logo.GetLogoId());
+    EXPECT_EQ(0x456, logo.GetLogoVersion());
+    EXPECT_EQ(0x789A, logo.GetDownloadDataId());
+
+    RavelCLogoTransmissionDescriptor logoText(logoTextRaw.data());
+    EXPECT_EQ(kRavelErrInvalidArgument, logoText.ParseRawData(bad));
+    EXPECT_EQ(3, logoText.GetLogoTransmissionType());
+    EXPECT_EQ(nullptr, logoText.GetLogoCharacters());
+    EXPECT_EQ(0, logoText.GetLogoCharactersLength());
+  }
+}
+
+TEST(ServiceDescriptorFailure, ADescriptorOfAnotherTypeKeepsNothingOfTheLastOne) {
+  // Only types 1 and 2 carry a broadcaster id, only types 1 and 2 a logo id and
+  // only type 1 a version and a download data id.
+  Bytes broadcasterRaw = Descriptor(0xCE, Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05});
+  Bytes logoRaw = Descriptor(0xCF, Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A});
+  struct Case {
+    uint8_t type;
+  } broadcasterTypes[] = {{0x0}, {0x3}, {0xF}};
+  for (const Case& c : broadcasterTypes) {
+    RavelCExtendedBroadcasterDescriptor d(broadcasterRaw.data());
+    Bytes other = Descriptor(0xCE, Bytes{static_cast<uint8_t>(c.type << 4), 0x45, 0x67, 0x11, 0x01, 0x02, 0x03, 0x04});
+    EXPECT_EQ(kRavelOk, d.ParseRawData(other.data()));
+    EXPECT_EQ(c.type, d.GetBroadcasterType());
+    EXPECT_EQ(0, d.GetTerrestrialBroadcasterId()) << int(c.type);
+    EXPECT_EQ(0, d.GetNumberOfAffiliationIds());
+    EXPECT_EQ(0, d.GetAffiliationId(0));
+    EXPECT_EQ(0, d.GetOriginalNetworkId(0));
+  }
+  struct LogoCase {
+    Bytes body;
+    uint16_t id, version, download;
+  } logoCases[] = {
+      {Bytes{0x02, 0xFE, 0x07}, 0x007, 0, 0},
+      {Bytes{0x03, 'a'}, 0, 0, 0},
+      {Bytes{0x04, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF}, 0, 0, 0},
+  };
+  for (const LogoCase& c : logoCases) {
+    RavelCLogoTransmissionDescriptor d(logoRaw.data());
+    Bytes other = Descriptor(0xCF, c.body);
+    EXPECT_EQ(kRavelOk, d.ParseRawData(other.data()));
+    EXPECT_EQ(c.body[0], d.GetLogoTransmissionType());
+    EXPECT_EQ(c.id, d.GetLogoId()) << int(c.body[0]);
+    EXPECT_EQ(c.version, d.GetLogoVersion()) << int(c.body[0]);
+    EXPECT_EQ(c.download, d.GetDownloadDataId()) << int(c.body[0]);
   }
 }
 
@@ -585,6 +663,36 @@ TEST(LogoTransmissionDescriptor, DecodesEachTransmissionType) {
   }
 }
 
+TEST(LogoTransmissionDescriptor, CopiesTheCharactersUpToTheirFirstZeroByte) {
+  // Like every owned text, the characters are duplicated as a C text: a 0 byte
+  // among them ends the copy, and the rest of the copy's characters are 0.
+  struct Case {
+    Bytes characters;
+    Bytes copied;
+  } cases[] = {
+      {Bytes{'a', 'b', 'c'}, Bytes{'a', 'b', 'c'}},
+      {Bytes{'a', 0x00, 'c', 'd'}, Bytes{'a', 0x00, 0x00, 0x00}},
+      {Bytes{0x00, 'b'}, Bytes{0x00, 0x00}},
+      {Bytes{0x1B, 0xE9}, Bytes{0x1B, 0xE9}},
+  };
+  for (const Case& c : cases) {
+    Bytes raw = Descriptor(0xCF, Cat({U8(0x03), c.characters}));
+    RavelCLogoTransmissionDescriptor source(raw.data());
+    RavelCLogoTransmissionDescriptor constructed(source);
+    Bytes other = Descriptor(0xCF, Bytes{0x03, 'z'});
+    RavelCLogoTransmissionDescriptor assigned(other.data());
+    assigned = source;
+    const int count = static_cast<int>(c.characters.size());
+    ASSERT_EQ(count, source.GetLogoCharactersLength());
+    EXPECT_EQ(c.characters, Bytes(source.GetLogoCharacters(), source.GetLogoCharacters() + count));
+    for (RavelCLogoTransmissionDescriptor* copy : {&constructed, &assigned}) {
+      ASSERT_EQ(count, copy->GetLogoCharactersLength());
+      EXPECT_EQ(c.copied, Bytes(copy->GetLogoCharacters(), copy->GetLogoCharacters() + count));
+      EXPECT_EQ(0, copy->GetLogoCharacters()[count]);
+    }
+  }
+}
+
 TEST(LogoTransmissionDescriptor, CharactersAreTheLengthMinusOneBytesAfterTheType) {
   // Bytes after the descriptor must not leak into the text, and a copy holds the same characters.
   Bytes raw = Cat({Descriptor(0xCF, Bytes{0x03, 'a', 'b', 'c'}), Bytes{'X', 'Y', 'Z'}});
@@ -741,4 +849,115 @@ TEST(SystemManagementDescriptor, FlagAndIdentifierOverlapInTheLowBits) {
     EXPECT_EQ(c.identifier, d.GetBroadcastingIdentifier());
     EXPECT_EQ(c.additional, d.GetAdditionalBroadcastingIdentification());
   }
+}
+
+// ---------------------------------------------------------------------------
+// Every wire bit of the fixed fields, one at a time
+
+namespace {
+
+using bitwalk::Base;
+using bitwalk::Field;
+using Values = std::vector<int64_t>;
+
+// The TS name and its records are read from 'A' bytes, so that a name length
+// bit shows in the name's length (and a record has 0x41 services).
+Bytes TsInformationBase() {
+  Bytes raw(400, 'A');
+  raw[0] = 0xCD;
+  raw[1] = 0xFF;
+  raw[2] = 0x00;
+  raw[3] = 0x00;
+  return raw;
+}
+
+Values ExtendedBroadcasterHeader(unsigned char* raw) {
+  RavelCExtendedBroadcasterDescriptor d(raw);
+  return {d.GetBroadcasterType(), d.GetTerrestrialBroadcasterId(), d.GetNumberOfAffiliationIds(),
+          d.GetNumberOfBroadcasterIds()};
+}
+
+const std::vector<Field> kExtendedBroadcasterHeader = {
+    {"broadcaster type", {{16, 4}}},
+    {"terrestrial broadcaster id", {{24, 16}}},
+    {"affiliation id count", {{40, 4}}},
+    {"broadcaster id count", {{44, 4}}},
+};
+
+Values LogoFields(unsigned char* raw) {
+  RavelCLogoTransmissionDescriptor d(raw);
+  return {d.GetLogoId(), d.GetLogoVersion(), d.GetDownloadDataId()};
+}
+
+}  // namespace
+
+TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
+  const bitwalk::Walk walks[] = {
+      {"linkage", Base({0x4A, 7}, 9), 16, 72,
+       {{"transport stream id", {{16, 16}}},
+        {"original network id", {{32, 16}}},
+        {"service id", {{48, 16}}},
+        {"linkage type", {{64, 8}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCLinkageDescriptor d(raw);
+         return {d.GetTransportStreamId(), d.GetOriginalNetworkId(), d.GetServiceId(), d.GetLinkageType()};
+       }},
+      {"TS information", TsInformationBase(), 16, 32,
+       {{"remote control key id", {{16, 8}}}, {"TS name length", {{24, 6}}}, {"transmission type count", {{30, 2}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCTSInformationDescriptor d(raw);
+         return {d.GetRemoteControlKeyId(), static_cast<int64_t>(std::strlen(d.GetTsName())),
+                 d.GetTransmissionTypeCount()};
+       }},
+      // Types 0 to 15; only types 1 and 2 read more, from zeros here.
+      {"extended broadcaster type", Base({0xCE, 0x20, 0x00}, 40), 16, 24, kExtendedBroadcasterHeader,
+       ExtendedBroadcasterHeader},
+      {"extended broadcaster type 1", Base({0xCE, 0x20, 0x10}, 40), 24, 48, kExtendedBroadcasterHeader,
+       ExtendedBroadcasterHeader},
+      {"extended broadcaster type 2", Base({0xCE, 0x20, 0x20}, 40), 24, 48, kExtendedBroadcasterHeader,
+       ExtendedBroadcasterHeader},
+      // Two affiliation ids taken from bytes 6 and 8; the broadcaster loop then
+      // starts at byte 8, so byte 8 is both affiliation id 1 and the high byte of
+      // the first original network id, and byte 7 is read by nobody.
+      {"extended broadcaster loops", Base({0xCE, 0x20, 0x10, 0x00, 0x00, 0x22}, 40), 48, 112,
+       {{"affiliation id 0", {{48, 8}}},
+        {"affiliation id 1", {{64, 8}}},
+        {"original network id 0", {{64, 16}}},
+        {"broadcaster id 0", {{80, 8}}},
+        {"original network id 1", {{88, 16}}},
+        {"broadcaster id 1", {{104, 8}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCExtendedBroadcasterDescriptor d(raw);
+         return {d.GetAffiliationId(0), d.GetAffiliationId(1), d.GetOriginalNetworkId(0),
+                 d.GetBroadcasterId(0),  d.GetOriginalNetworkId(1), d.GetBroadcasterId(1)};
+       }},
+      {"logo transmission type 1", Base({0xCF, 7, 0x01}, 9), 24, 72,
+       {{"logo id", {{31, 9}}}, {"logo version", {{44, 12}}}, {"download data id", {{56, 16}}}}, LogoFields},
+      {"logo transmission type 2", Base({0xCF, 7, 0x02}, 9), 24, 72,
+       {{"logo id", {{31, 9}}}, {"logo version", {}}, {"download data id", {}}}, LogoFields},
+      {"terrestrial delivery system", Base({0xFA, 2}, 4), 16, 32,
+       {{"area code", {{16, 12}}}, {"guard interval", {{28, 2}}}, {"transmission mode", {{30, 2}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCTerrDeliverySystemDescriptor d(raw);
+         return {d.GetAreaCode(), d.GetGuardInterval(), d.GetTransmissionMode()};
+       }},
+      // Only the high byte of each service id is kept.
+      {"partial reception", Base({0xFB, 4}, 6), 16, 48, {{"service id 0", {{16, 8}}}, {"service id 1", {{32, 8}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCPartialReceptionDescriptor d(raw);
+         return {d.GetServiceId(0), d.GetServiceId(1)};
+       }},
+      // The flag is the two lowest bits, inside the identifier; the two top bits
+      // of the byte are read by nobody.
+      {"system management", Base({0xFE, 2}, 4), 16, 32,
+       {{"broadcasting flag", {{22, 2}}},
+        {"broadcasting identifier", {{18, 6}}},
+        {"additional broadcasting identification", {{24, 8}}}},
+       [](unsigned char* raw) -> Values {
+         RavelCSystemManagementDescriptor d(raw);
+         return {d.GetBroadcastingFlag(), d.GetBroadcastingIdentifier(), d.GetAdditionalBroadcastingIdentification()};
+       }},
+  };
+  TraceRecorder recorder;
+  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
 }

@@ -216,7 +216,8 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
     TraceRecorder recorder;
     RavelCDsmccDSI dsi(message.data());
     EXPECT_EQ(c.trace, recorder.Lines());
-    EXPECT_EQ("SectionParser/source/Ravel_CNASP", recorder.Records()[0].file);
+    // The server id record is part of the DSI's source and reports from it.
+    EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records()[0].file);
     EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records().back().file);
     RavelCNASP& nasp = dsi.GetNASP();
     EXPECT_EQ(0x00, nasp.GetAFI());

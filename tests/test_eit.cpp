@@ -585,6 +585,7 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, eit.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableEIT", r.file);
     EXPECT_EQ(0, eit.GetEventCount());
     EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
     if (c.headerParsed) {
@@ -745,6 +746,7 @@ TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
                           {kError, "THIS: TS ID=[32464], Org Network ID=[32465], VersionNum=[4]\n"},
                           {kError, otherLine}}),
               recorder.Lines());
+              for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableEIT", r.file);
     EXPECT_EQ((std::vector<int>{2, 1}), EventIds(target));  // not even sorted
   }
 }

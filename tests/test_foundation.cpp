@@ -104,7 +104,9 @@ TEST(BitInputStream, ReadsMsbFirstAndNeverPastItsBuffer) {
   const unsigned char data[] = {0xA5, 0x3C, 0xFF};
   RavelCBitInputStream reader(data, 2, 0);
   unsigned char status = 0;
+  EXPECT_EQ(0u, reader.GetByteIndex());
   EXPECT_EQ(1, reader.ReadBit(status));
+  EXPECT_EQ(1u, reader.GetByteIndex());  // a byte begun counts as taken
   EXPECT_EQ(0x02, reader.ReadByte(3, status));
   EXPECT_EQ(0x053Cu, reader.ReadShort(12, status));
   EXPECT_EQ(0, status);
@@ -219,6 +221,8 @@ TEST(CArray, GrowsByEightAndChecksItsBounds) {
     EXPECT_EQ(0x40000001u, recorder.Records()[0].mask);
     EXPECT_EQ("Argument Invalid! aPos=[" + std::to_string(c.pos) + "], iCount=[" + std::to_string(count) + "]\n",
               recorder.Records()[0].text);
+    EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.Records()[0].file);
+    EXPECT_EQ(0, recorder.PanicCount());
   }
   for (int index : {-1, array.iCount}) {
     recorder.Clear();
@@ -230,6 +234,8 @@ TEST(CArray, GrowsByEightAndChecksItsBounds) {
               recorder.Records()[0].text);
     EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.Records()[0].file);
     EXPECT_EQ(1, recorder.PanicCount());
+    // The panic reports the template's own location, as the trace before it.
+    EXPECT_EQ("SectionParser/../CommonUtility/include/Ravel_CArray", recorder.LastPanicFile());
   }
 }
 

@@ -179,6 +179,7 @@ TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, nit.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", r.file);
     EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
     EXPECT_EQ(0, nit.GetTSInfoCount());
     EXPECT_STREQ(c.name, nit.sTableName.GetString());
@@ -373,6 +374,7 @@ TEST(NITMerge, SameVersionTakesMissingNetworkDescriptorsAndAppendsStreams) {
     RavelCNIT& result = (target += *other);
     EXPECT_EQ(&target, &result);
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", r.file);
     EXPECT_EQ(otherNetwork, NetworkSummary(*other));
     EXPECT_EQ(otherStreams, Streams(*other));
     other.reset();  // the merged parts are copies

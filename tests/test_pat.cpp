@@ -133,6 +133,7 @@ TEST(PATParse, RefusesNullBadCrcAndForeignTableIds) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, pat.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTablePAT", r.file);
     EXPECT_EQ(0, pat.GetProgramCount());
     if (c.section == nullptr) continue;
     EXPECT_EQ(c.tableId, pat.iTableId);

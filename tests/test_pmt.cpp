@@ -290,6 +290,7 @@ TEST(PMTParse, RefusesNullBadCrcAndForeignTableIds) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, pmt.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTablePMT", r.file);
     EXPECT_EQ(0, pmt.GetMapInfoCount());
     EXPECT_EQ(nullptr, pmt.GetParentalRating());
     EXPECT_EQ(0, pmt.GetPCRPID());

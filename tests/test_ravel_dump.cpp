@@ -695,19 +695,25 @@ TEST_F(RavelDumpTest, ModuleDirectoryThatCannotBeMadeFailsCleanly) {
 TEST_F(RavelDumpTest, ObjectCarouselCaptureModulesAreComplete) {
   std::string capture = captures::Path("object-carousel.ts");
   if (capture.empty()) GTEST_SKIP() << "shared capture object-carousel.ts absent";
-  std::string out = Path("modules");
-  ToolRun run = Run({"--pid", "0x076a", "--extract-modules", out, "--json", capture});
-  ASSERT_EQ(0, run.status) << run.err;
-  nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
-  ASSERT_EQ(1u, carousels.size());
-  const nlohmann::json& modules = carousels[0]["modules"];
-  ASSERT_EQ(3u, modules.size());
-  for (const nlohmann::json& module : modules) {
-    EXPECT_TRUE(module["complete"].get<bool>()) << module.dump();
-    std::string file = module["file"].get<std::string>();
-    EXPECT_EQ(module["size"].get<uintmax_t>(), fs::file_size(file)) << file;
+  // Named with --pid, or found by its DSM-CC section starts when nothing names it.
+  const std::vector<std::vector<std::string>> pidOptions = {{"--pid", "0x076a"}, {}};
+  for (const std::vector<std::string>& pidOption : pidOptions) {
+    std::string out = Path(pidOption.empty() ? "modules-found" : "modules-named");
+    std::vector<std::string> args = pidOption;
+    for (const char* arg : {"--extract-modules", out.c_str(), "--json", capture.c_str()}) args.push_back(arg);
+    ToolRun run = Run(args);
+    ASSERT_EQ(0, run.status) << run.err;
+    nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
+    ASSERT_EQ(1u, carousels.size());
+    const nlohmann::json& modules = carousels[0]["modules"];
+    ASSERT_EQ(3u, modules.size());
+    for (const nlohmann::json& module : modules) {
+      EXPECT_TRUE(module["complete"].get<bool>()) << module.dump();
+      std::string file = module["file"].get<std::string>();
+      EXPECT_EQ(module["size"].get<uintmax_t>(), fs::file_size(file)) << file;
+    }
+    EXPECT_NE(std::string::npos, run.err.find("0x076a       6405")) << run.err;
   }
-  EXPECT_NE(std::string::npos, run.err.find("0x076a       6405")) << run.err;
 }
 
 // --- A receiver's whole path -------------------------------------------------

@@ -154,6 +154,7 @@ TEST(SDTParse, NamesActualAndOtherAndRefusesEverythingElse) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, sdt.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableSDT", r.file);
     EXPECT_STREQ(c.name, sdt.sTableName.GetString());
     EXPECT_EQ(c.tableId, sdt.iTableId);
     EXPECT_EQ(c.services, sdt.GetServiceCount());

@@ -1,7 +1,9 @@
 // DSM-CC stream descriptor sections: NPT references and general events.
 #include <gtest/gtest.h>
 
+#include <memory>
 #include <string>
+#include <type_traits>
 #include <vector>
 
 #include "Captures.h"
@@ -157,32 +159,61 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
   }
 }
 
-TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
-  TraceRecorder recorder;
-  Bytes section = StreamSection({Npt(9), Event(1, "a"), Event(2, "b"), Event(3, "c")});
-  RavelCDsmccStreamEvent table(section.data());
-  table.iSession = 0x5A;
-  ASSERT_EQ(3, table.GetNumberOfGeneralEvents());
+// Callers index the general events through the plain pointer array the table
+// declares; the table, not the array, deletes them.
+static_assert(std::is_same<decltype(RavelCDsmccStreamEvent::cGeneralEvents),
+                           RavelCArray<RavelCGeneralEventDescriptor*> >::value,
+              "general events are kept in a RavelCArray of pointers");
 
-  recorder.Clear();
-  RavelCDsmccStreamEvent copy(table);
+TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
+  enum How { kCopyConstruct, kAssign, kAssignToItself };
+  struct Case {
+    const char* what;
+    How how;
+    bool keepsNpt;
+  } cases[] = {
+      {"copy constructor", kCopyConstruct, true},
+      {"assignment over a table with events", kAssign, true},
+      // The target's descriptors are released before the source is read.
+      {"assignment to itself", kAssignToItself, false},
+  };
+  Bytes section = StreamSection({Npt(9), Event(1, "a"), Event(2, "b"), Event(3, "c")});
   Bytes other = StreamSection({Event(8), Event(9)});
-  RavelCDsmccStreamEvent assigned(other.data());
-  EXPECT_TRUE(recorder.Records().empty());
-  assigned = table;
-  EXPECT_TRUE(recorder.Records().empty());  // the NPT reference is copied, not parsed again
-  for (RavelCDsmccStreamEvent* t : {&copy, &assigned}) {
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.what);
+    RavelCDsmccStreamEvent table(section.data());
+    table.iSession = 0x5A;
+    ASSERT_EQ(3, table.GetNumberOfGeneralEvents());
+    RavelCDsmccStreamEvent assigned(other.data());
+    TraceRecorder recorder;
+    RavelCDsmccStreamEvent* t = &assigned;
+    std::unique_ptr<RavelCDsmccStreamEvent> copy;
+    if (c.how == kCopyConstruct) {
+      copy.reset(new RavelCDsmccStreamEvent(table));
+      t = copy.get();
+    } else if (c.how == kAssign) {
+      assigned = table;
+    } else {
+      RavelCDsmccStreamEvent& self = table;
+      table = self;
+      t = &table;
+    }
+    EXPECT_TRUE(recorder.Records().empty());  // the NPT reference is copied, not parsed again
     EXPECT_EQ(0x5A, t->iSession);
     EXPECT_EQ(0x3D, t->iTableId);
-    EXPECT_EQ(table.iSectionLength, t->iSectionLength);
+    EXPECT_EQ(section.size() - 3, t->iSectionLength);
     EXPECT_EQ(3, t->iVersionNumber);
     EXPECT_STREQ("Stream Descriptor Event Table", t->sTableName.GetString());
-    ASSERT_NE(nullptr, t->GetNPTReference());
-    EXPECT_NE(table.GetNPTReference(), t->GetNPTReference());
-    EXPECT_EQ(9, t->GetNPTReference()->GetContentId());
+    if (c.keepsNpt) {
+      ASSERT_NE(nullptr, t->GetNPTReference());
+      EXPECT_NE(table.GetNPTReference(), t->GetNPTReference());
+      EXPECT_EQ(9, t->GetNPTReference()->GetContentId());
+      EXPECT_EQ(3, table.GetNumberOfGeneralEvents());
+    } else {
+      EXPECT_EQ(nullptr, t->GetNPTReference());
+    }
     EXPECT_EQ(0, t->GetNumberOfGeneralEvents());
   }
-  EXPECT_EQ(3, table.GetNumberOfGeneralEvents());
 }
 
 TEST(StreamEventTable, ParsesAgainFromScratchAndReleasesOnNull) {

@@ -149,6 +149,10 @@ TEST(TimeTablesParse, NullClearsAndForeignTableIdsKeepTheEarlierTime) {
     EXPECT_EQ(c.tdtResult, tdt.ParseRawData(raw));
     EXPECT_EQ(c.totResult, tot.ParseRawData(raw));
     EXPECT_EQ(c.traces, recorder.Lines());
+    for (const TraceRecord& r : recorder.Records()) {
+      const bool tdtLine = r.text.find("TDT") != std::string::npos;
+      EXPECT_EQ(tdtLine ? "SectionParser/source/Ravel_CTableTDT" : "SectionParser/source/Ravel_CTableTOT", r.file);
+    }
     // The descriptor goes whatever the outcome.
     EXPECT_EQ(nullptr, tot.pLocalTimeOffsetDescriptor);
     EXPECT_STREQ("TDT", tdt.sTableName.GetString());

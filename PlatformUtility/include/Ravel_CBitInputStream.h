@@ -16,7 +16,8 @@ class RavelCBitInputStream {
   // Copies the next whole bytes (starting at the current byte index) and advances.
   void GetByteArray(unsigned char* destination, int byteCount);
 
-  // Index of the byte that holds the next bit.
+  // Index of the next whole byte: the byte that holds the next bit when the
+  // reader stands on a byte boundary, the byte after it otherwise.
   unsigned int GetByteIndex() const;
 
  private:

@@ -15,8 +15,13 @@
 // Foundation.
 #include "Ravel_CArray.h"
 #include "Ravel_ResultCode.h"
-#include "Ravel_ByteOrder.h"
 #include "Ravel_CDateCode.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_DescriptorText.h"
+#include "Ravel_FixedText.h"
+#include "Ravel_RecordList.h"
+#include "Ravel_TableMerge.h"
+#include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
 
 // Transport stream layer.
@@ -88,7 +93,5 @@
 #include "Ravel_CDescriptors.h"
 #include "Ravel_CObjectCarouselTransmissionFormat.h"
 #include "Ravel_CTxType.h"
-#include "Ravel_DescriptorText.h"
-#include "Ravel_FixedText.h"
 
 #endif

@@ -19,7 +19,8 @@ class RavelCTSInformationDescriptor : public RavelCDescriptorBase {
   RavelCTSInformationDescriptor& operator=(RavelCTSInformationDescriptor& other);
   virtual ~RavelCTSInformationDescriptor();
 
-  // Null zeroes the key id and the count; a foreign tag leaves the key id alone.
+  // Null zeroes the key id and the count; a foreign tag leaves both, and the
+  // records, as they were (only the name is released).
   virtual int ParseRawData(unsigned char* raw);
   virtual void Show();
 
@@ -36,6 +37,7 @@ class RavelCTSInformationDescriptor : public RavelCDescriptorBase {
 
  private:
   void Release();
+  void ClearTxTypes();
 };
 
 #endif

@@ -2,6 +2,7 @@
 // Ginga service location record:
 //   AFI 8 | type 8 | carouselId 32 | specifier 32
 //   transport_stream_id 16 | original_network_id 16 | service_id 16 | 4 bytes not read
+// It is built and traced by the DSI's source (Ravel_CDsmccDSI.cpp).
 #ifndef RAVEL_CNASP_H
 #define RAVEL_CNASP_H
 

@@ -15,7 +15,8 @@ class RavelCDsmccStreamEvent : public RavelCTableBase {
  public:
   explicit RavelCDsmccStreamEvent(unsigned char* section);
   // Copies keep the header, the name and the NPT reference, but never any general
-  // event descriptor: a copy's general event list is always empty.
+  // event descriptor: a copy's general event list is always empty. The target's
+  // descriptors are released first, so a table assigned to itself keeps neither.
   RavelCDsmccStreamEvent(RavelCDsmccStreamEvent& other);
   RavelCDsmccStreamEvent& operator=(RavelCDsmccStreamEvent& other);
   virtual ~RavelCDsmccStreamEvent();
@@ -32,7 +33,8 @@ class RavelCDsmccStreamEvent : public RavelCTableBase {
   RavelCGeneralEventDescriptor* GetGeneralEvent(int index) { return cGeneralEvents[index]; }
 
   RavelCNPTReferenceDescriptor* pNPTReference;
-  RavelCPointerArray<RavelCGeneralEventDescriptor> cGeneralEvents;  // owns its descriptors
+  // A plain array of pointers: the table deletes the descriptors itself.
+  RavelCArray<RavelCGeneralEventDescriptor*> cGeneralEvents;
 
  private:
   void ReleaseDescriptors();

@@ -13,13 +13,14 @@ const RavelCDescriptorKind RavelCExtendedBroadcasterDescriptor::kKind = {
     "This Descriptor isn't Extended Broadcaster Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Extended Broadcaster Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(unsigned char* raw) : iBroadcasterType(0) {
+RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(unsigned char* raw)
+    : iBroadcasterType(0), iTerrestrialBroadcasterId(0) {
   Release();
   ParseRawData(raw);
 }
 
 RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(RavelCExtendedBroadcasterDescriptor& other)
-    : RavelCDescriptorBase(other), iBroadcasterType(0) {
+    : RavelCDescriptorBase(other), iBroadcasterType(0), iTerrestrialBroadcasterId(0) {
   Release();
   *this = other;
 }
@@ -39,10 +40,8 @@ RavelCExtendedBroadcasterDescriptor& RavelCExtendedBroadcasterDescriptor::operat
 
 RavelCExtendedBroadcasterDescriptor::~RavelCExtendedBroadcasterDescriptor() {}
 
-// Everything but the type, so that a descriptor of another broadcaster type
-// keeps nothing of an earlier parse.
+// The two id lists and their counts.
 void RavelCExtendedBroadcasterDescriptor::Release() {
-  iTerrestrialBroadcasterId = 0;
   iNumberOfAffiliationIds = 0;
   iNumberOfBroadcasterIds = 0;
   std::memset(aAffiliationIds, 0, sizeof(aAffiliationIds));
@@ -53,7 +52,10 @@ void RavelCExtendedBroadcasterDescriptor::Release() {
 int RavelCExtendedBroadcasterDescriptor::ParseRawData(unsigned char* raw) {
   Release();
   int result = ParseHeader(raw, kKind);
+  // A refused descriptor keeps the type and the broadcaster id it had.
   if (result != kRavelOk) return result;
+  // A descriptor of another broadcaster type keeps nothing of an earlier one.
+  iTerrestrialBroadcasterId = 0;
   iBroadcasterType = raw[2] >> 4;  // xxxx----
   if (iBroadcasterType != 1 && iBroadcasterType != 2) return kRavelOk;
 

@@ -30,6 +30,21 @@ char* NewLogoCharacters(const unsigned char* text, int descriptorLength) {
   return buffer;
 }
 
+// The copy made by assignment: like every owned text it is duplicated up to its
+// first 0 byte. The buffer keeps the source's size, zero-filled, so that the
+// copy still holds descriptor_length - 1 readable characters.
+char* DuplicateLogoCharacters(const char* text, int descriptorLength) {
+  int count = descriptorLength > 0 ? descriptorLength - 1 : 0;
+  std::size_t size = static_cast<std::size_t>(count) + 2;
+  char* buffer = static_cast<char*>(std::malloc(size));
+  if (buffer == 0) return 0;
+  std::memset(buffer, 0, size);
+  std::size_t length = std::strlen(text);
+  if (length > static_cast<std::size_t>(count)) length = static_cast<std::size_t>(count);
+  std::memcpy(buffer, text, length);
+  return buffer;
+}
+
 }  // namespace
 
 RavelCLogoTransmissionDescriptor::RavelCLogoTransmissionDescriptor(unsigned char* raw)
@@ -57,22 +72,14 @@ RavelCLogoTransmissionDescriptor& RavelCLogoTransmissionDescriptor::operator=(
   iLogoVersion = other.iLogoVersion;
   iDownloadDataId = other.iDownloadDataId;
   if (other.pLogoCharacters != 0) {
-    pLogoCharacters = NewLogoCharacters(reinterpret_cast<const unsigned char*>(other.pLogoCharacters),
-                                        other.iDescriptorLength);
+    pLogoCharacters = DuplicateLogoCharacters(other.pLogoCharacters, other.iDescriptorLength);
   }
   return *this;
 }
 
 RavelCLogoTransmissionDescriptor::~RavelCLogoTransmissionDescriptor() { Release(); }
 
-// Everything but the type, so that a descriptor of another transmission type
-// keeps nothing of an earlier parse.
-void RavelCLogoTransmissionDescriptor::Release() {
-  iLogoId = 0;
-  iLogoVersion = 0;
-  iDownloadDataId = 0;
-  RavelText_FreeCText(pLogoCharacters);
-}
+void RavelCLogoTransmissionDescriptor::Release() { RavelText_FreeCText(pLogoCharacters); }
 
 int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
   if (pLogoCharacters == 0 || iDescriptorLength == 0) return 0;
@@ -82,7 +89,12 @@ int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
 int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
   Release();
   int result = ParseHeader(raw, kKind);
+  // A refused descriptor keeps the type, ids and version it had.
   if (result != kRavelOk) return result;
+  // A descriptor of another transmission type keeps nothing of an earlier one.
+  iLogoId = 0;
+  iLogoVersion = 0;
+  iDownloadDataId = 0;
   iLogoTransmissionType = raw[2];
   switch (iLogoTransmissionType) {
     case 1:

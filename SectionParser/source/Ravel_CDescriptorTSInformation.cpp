@@ -35,18 +35,25 @@ RavelCTSInformationDescriptor::~RavelCTSInformationDescriptor() {}
 
 void RavelCTSInformationDescriptor::Release() {
   sTsName = "";
-  iTransmissionTypeCount = 0;
+  ClearTxTypes();
+}
+
+void RavelCTSInformationDescriptor::ClearTxTypes() {
   for (int i = 0; i < kTxTypeSlots; ++i) cTxTypes[i].ParseRawData(0);
 }
 
 int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
-  Release();
+  sTsName = "";
   int result = ParseHeader(raw, kKind);
   if (raw == 0) {
     iRemoteControlKeyId = 0;
     iTransmissionTypeCount = 0;
+    ClearTxTypes();
   }
+  // A foreign tag leaves the key id, the count and the records of the last
+  // descriptor as they were; only the name is released.
   if (result != kRavelOk) return result;
+  ClearTxTypes();
   iRemoteControlKeyId = raw[2];
   int nameLength = raw[3] >> 2;              // xxxxxx--
   iTransmissionTypeCount = raw[3] & 0x03;    // ------xx

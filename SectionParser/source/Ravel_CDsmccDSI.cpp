@@ -6,6 +6,56 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDsmccDSI");
 
+// ---------------------------------------------------------------------------
+// RavelCNASP, the server id record, lives with the message that carries it and
+// reports its traces from here.
+
+RavelCNASP::RavelCNASP(unsigned char* data) {
+  Clear();
+  ParseRawData(data);
+}
+
+RavelCNASP::~RavelCNASP() {}
+
+void RavelCNASP::Clear() {
+  iAFI = 0;
+  iType = 0;
+  iCarouselId = 0;
+  iSpecifier = 0;
+  iTransportStreamId = 0;
+  iOriginalNetworkId = 0;
+  iServiceId = 0;
+}
+
+int RavelCNASP::ParseRawData(unsigned char* data) {
+  if (data == 0) {
+    RAVEL_TRACE(RAVEL_CAROUSEL_WARNING, "NASP Input Data is NULL!\n");
+    Clear();
+    return kRavelErrInvalidArgument;
+  }
+  iAFI = data[0];
+  iType = data[1];
+  iCarouselId = RavelRead32(data + 2);
+  iSpecifier = RavelRead32(data + 6);
+  iTransportStreamId = RavelRead16(data + 10);
+  iOriginalNetworkId = RavelRead16(data + 12);
+  iServiceId = RavelRead16(data + 14);
+  return kRavelOk;
+}
+
+void RavelCNASP::Show() {
+  // "CaourselID" is the label the receivers' logs are matched against.
+  RAVEL_TRACE(RAVEL_CAROUSEL_DUMP, "\t\tNASP: AFI=[0x%02x], Type=[0x%02x], CaourselID=[0x%08x], iSpecifier=[0x%08x]\n",
+              iAFI, iType, iCarouselId, iSpecifier);
+  RAVEL_TRACE(RAVEL_CAROUSEL_DUMP,
+              "\t\tNASP(Ginga Service Location): Transport Stream Id=[0x%04x], Original Network ID=[0x%04x], Service "
+              "ID=[0x%04x]\n",
+              iTransportStreamId, iOriginalNetworkId, iServiceId);
+}
+
+// ---------------------------------------------------------------------------
+// RavelCDsmccDSI
+
 RavelCDsmccDSI::RavelCDsmccDSI(unsigned char* data)
     : RavelCDsmccBase(0), cNASP(0), iPrivateDataLength(0), pPrivateData(0) {
   ParseRawData(data);

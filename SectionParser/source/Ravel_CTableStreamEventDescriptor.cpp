@@ -1,5 +1,6 @@
 #include "Ravel_CTableStreamEventDescriptor.h"
 
+#include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_Util.h"
@@ -20,12 +21,13 @@ RavelCDsmccStreamEvent::RavelCDsmccStreamEvent(RavelCDsmccStreamEvent& other)
 }
 
 RavelCDsmccStreamEvent& RavelCDsmccStreamEvent::operator=(RavelCDsmccStreamEvent& other) {
-  if (this == &other) return *this;
   CopyHeader(other);
+  // Released before `other` is read: assigned to itself, a table is left with
+  // neither its NPT reference nor its general events.
   ReleaseDescriptors();
   if (other.pNPTReference != 0) pNPTReference = new RavelCNPTReferenceDescriptor(*other.pNPTReference);
-  // General events are never copied: a copy's list is always empty, and callers
-  // rely on that.
+  // General events are never copied: the copy runs over the target's own count,
+  // which is 0 here, so a copy's list is always empty; callers rely on that.
   return *this;
 }
 
@@ -34,7 +36,7 @@ RavelCDsmccStreamEvent::~RavelCDsmccStreamEvent() { ReleaseDescriptors(); }
 void RavelCDsmccStreamEvent::ReleaseDescriptors() {
   delete pNPTReference;
   pNPTReference = 0;
-  cGeneralEvents.RemoveAll();
+  RavelRecordList_DeleteAll(cGeneralEvents);
 }
 
 int RavelCDsmccStreamEvent::ParseRawData(unsigned char* section) {

@@ -1,9 +1,7 @@
 #include "Ravel_CTableTDT.h"
 
-#include "Ravel_ByteOrder.h"
-#include "Ravel_CBitInputStream.h"
-#include "Ravel_CDateCode.h"
 #include "Ravel_ResultCode.h"
+#include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableTDT");
@@ -11,7 +9,6 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableTDT");
 namespace {
 
 const unsigned char kTDTTableId = 0x70;
-const int kShortHeaderSize = 3;
 
 }  // namespace
 
@@ -42,37 +39,8 @@ int RavelCTDT::SetTableName(const char* name) {
 }
 
 int RavelCTDT::ParseRawData(unsigned char* section) {
-  if (section == 0) {
-    iTableId = 0;
-    bSectionSyntaxIndicator = 0;
-    iSectionLength = 0;
-    iYear = 0;
-    iMonth = 0;
-    iDay = 0;
-    iHour = 0;
-    iMinute = 0;
-    iSecond = 0;
-    return kRavelErrNullSection;
-  }
-  RavelCBitInputStream reader(section, kShortHeaderSize, 0);
-  unsigned char status = 0;
-  iTableId = reader.ReadByte(8, status);
-  unsigned char syntaxIndicator = reader.ReadBit(status);
-  reader.Skip(3);
-  unsigned short sectionLength = reader.ReadShort(12, status);
-  if (iTableId != kTDTTableId) {
-    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Table ID isn't for TDT! Table ID=[0x%02x]\n", iTableId);
-    return kRavelErrInvalidArgument;
-  }
-  SetTableName("TDT");
-  bSectionSyntaxIndicator = syntaxIndicator;
   // Nothing is checked against the length: the TDT carries no CRC_32.
-  iSectionLength = sectionLength;
-  RavelDateCode_DecodeMJD(RavelRead16(section + 3), iYear, iMonth, iDay);
-  iHour = RavelBcd(section[5]);
-  iMinute = RavelBcd(section[6]);
-  iSecond = RavelBcd(section[7]);
-  return kRavelOk;
+  return RavelTimeTable_ParseHeaderAndTime(*this, section, kTDTTableId, "TDT", kRavelTraceSourcePath);
 }
 
 void RavelCTDT::Show() {

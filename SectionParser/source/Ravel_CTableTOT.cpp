@@ -1,10 +1,9 @@
 #include "Ravel_CTableTOT.h"
 
 #include "Ravel_ByteOrder.h"
-#include "Ravel_CBitInputStream.h"
-#include "Ravel_CDateCode.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
 #include "Ravel_ResultCode.h"
+#include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableTOT");
@@ -13,7 +12,6 @@ namespace {
 
 const unsigned char kTOTTableId = 0x73;
 const unsigned char kTagLocalTimeOffset = 0x58;
-const int kShortHeaderSize = 3;
 // table_id to descriptors_loop_length.
 const int kDescriptorLoopStart = 10;
 
@@ -53,15 +51,7 @@ RavelCTOT& RavelCTOT::operator=(RavelCTOT& other) {
 RavelCTOT::~RavelCTOT() { delete pLocalTimeOffsetDescriptor; }
 
 void RavelCTOT::ClearFields() {
-  iTableId = 0;
-  bSectionSyntaxIndicator = 0;
-  iSectionLength = 0;
-  iYear = 0;
-  iMonth = 0;
-  iDay = 0;
-  iHour = 0;
-  iMinute = 0;
-  iSecond = 0;
+  RavelTimeTable_Clear(*this);
   iDescriptorsLoopLength = 0;
 }
 
@@ -78,27 +68,9 @@ int RavelCTOT::SetTableName(const char* name) {
 int RavelCTOT::ParseRawData(unsigned char* section) {
   delete pLocalTimeOffsetDescriptor;
   pLocalTimeOffsetDescriptor = 0;
-  if (section == 0) {
-    ClearFields();
-    return kRavelErrNullSection;
-  }
-  RavelCBitInputStream reader(section, kShortHeaderSize, 0);
-  unsigned char status = 0;
-  iTableId = reader.ReadByte(8, status);
-  unsigned char syntaxIndicator = reader.ReadBit(status);
-  reader.Skip(3);
-  unsigned short sectionLength = reader.ReadShort(12, status);
-  if (iTableId != kTOTTableId) {
-    RAVEL_TRACE(RAVEL_PARSER_ERROR, "Table ID isn't for TOT! Table ID=[0x%02x]\n", iTableId);
-    return kRavelErrInvalidArgument;
-  }
-  SetTableName("TOT");
-  bSectionSyntaxIndicator = syntaxIndicator;
-  iSectionLength = sectionLength;
-  RavelDateCode_DecodeMJD(RavelRead16(section + 3), iYear, iMonth, iDay);
-  iHour = RavelBcd(section[5]);
-  iMinute = RavelBcd(section[6]);
-  iSecond = RavelBcd(section[7]);
+  if (section == 0) iDescriptorsLoopLength = 0;
+  int result = RavelTimeTable_ParseHeaderAndTime(*this, section, kTOTTableId, "TOT", kRavelTraceSourcePath);
+  if (result != kRavelOk) return result;
 
   // The CRC_32 is not verified: a corrupted TOT is taken as it stands.
   iDescriptorsLoopLength = RavelRead12(section + 8);  // ....xxxx xxxxxxxx

@@ -65,8 +65,11 @@ void Demux::OnPacket(const uint8_t* packet) {
     }
     lastCounter_[pid] = counter;
   }
-  const int slot = slot_[pid];
-  if (slot < 0) return;
+  int slot = slot_[pid];
+  if (slot < 0) {
+    if (restricted_ || !AdoptedBySectionStart(pid, packet, control)) return;
+    slot = slot_[pid];
+  }
   // Payloads the assembler cannot take: none at all, or an adaptation field
   // that leaves no payload byte (its length is at most 182 when a payload follows).
   if (control == 0x00 || (control == 0x03 && packet[4] > 182)) {
@@ -75,6 +78,25 @@ void Demux::OnPacket(const uint8_t* packet) {
   }
   if (control == 0x02) return;
   Assemble(pid, *stores_[slot], packet);
+}
+
+bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int control) {
+  // Only an unscrambled packet that starts a payload unit can start a section.
+  if ((packet[1] & 0x40) == 0 || (control & 0x01) == 0 || (packet[3] & 0xC0) != 0) return false;
+  unsigned int at = 4;
+  if (control == 0x03) at += 1u + packet[4];
+  if (at >= 188) return false;
+  at += 1u + packet[at];  // pointer_field
+  if (at + 3 > 188) return false;
+  // A PES packet starts 00 00 01, so its "table_id" is 0 and never matches.
+  const uint8_t tableId = packet[at];
+  const bool longForm = (packet[at + 1] & 0x80) != 0;
+  PidRole role = PidRole::kNone;
+  if (tableId == 0x3B || tableId == 0x3C) role = PidRole::kCarousel;
+  if (tableId == 0x3D) role = PidRole::kStreamEvents;
+  if (role == PidRole::kNone || !longForm) return false;
+  AddSectionPid(pid, role);
+  return true;
 }
 
 void Demux::Assemble(int pid, RavelCTSPktStore& store, const uint8_t* packet) {

@@ -46,6 +46,10 @@ class Demux {
   const std::vector<PidRole>& Roles() const { return roles_; }
 
  private:
+  // A capture of one carousel or stream-event PID has no PAT or PMT to name
+  // it: the start of a DSM-CC section on an unread PID makes it a section PID
+  // from that packet on. (An AIT waits for its PMT, as in a receiver.)
+  bool AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int control);
   void Assemble(int pid, RavelCTSPktStore& store, const uint8_t* packet);
 
   Stats& stats_;

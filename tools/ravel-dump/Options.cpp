@@ -85,7 +85,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
                 << "Without --summary or --json, each distinct table is dumped by the library's own Show(),\n"
                 << "in the order first seen. Section PIDs are those a receiver reads (PAT, NIT, SDT, EIT,\n"
                 << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
-                << "PMTs name); a capture without them (one carousel PID, say) is read with --pid.\n"
+                << "PMTs name), and any PID where a DSM-CC carousel or stream-event section starts;\n"
+                << "other PIDs are read with --pid.\n"
                 << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
                 << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
       return ParseOutcome::kExitOk;

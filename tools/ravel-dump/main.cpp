@@ -150,7 +150,7 @@ int main(int argc, char** argv) {
     }
     if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
     if (options.pids.empty() && stats.pids[0].sections == 0) {
-      stats.Problem("no PAT read: only the PIDs every receiver reads were read; name others with --pid");
+      stats.Problem("no PAT read: only the PIDs every receiver reads and DSM-CC PIDs were read; name others with --pid");
     }
   }
 
