@@ -172,7 +172,8 @@ const std::vector<ClassCase>& Classes() {
         "\tExpireDate=[0]\n", "\tEpisodeNumber=[0]\n", "\tLastEpisodeNumber=[0]\n", "\tSeriesName=[(null)]\n"}},
       {CLASS(RavelCDataComponentDescriptor), 0xFD, "Data Component Descriptor", kWarning,
        Wrong("Data Component Descriptor"), kDump, Banner("Data Component Descriptor"), false,
-       Descriptor(0xFD, Cat({U16(0x00A0), U8(0x33)})), {}, kEmptied, true, true, {"\tiDataComponentId=[0x0000]\n"}},
+       Descriptor(0xFD, Cat({U16(0x00A0), U8(0x33)})), Dump({"\tiDataComponentId=[0x00a0]\n"}), kEmptied, true, true,
+       {"\tiDataComponentId=[0x0000]\n"}},
       // Module info and stream descriptor section descriptors.
       {CLASS(RavelCTypeDescriptor), 0x01, "Type Descriptor", kWarning, Wrong("Type Descriptor"), kDump,
        Banner("Type Descriptor"), false, Descriptor(0x01, Text("text/html")), Dump({"\tiType=[text/html]\n"}), kEmptied,
