@@ -58,8 +58,7 @@ Bytes Location(const std::string& base, const std::string& classPath, const std:
 
 std::string ParseLine(const unsigned char* section) {
   char text[64];
-  std::snprintf(text, sizeof(text), "RavelCAIT::ParseRawData... apRawData=[%p]\n",
-                static_cast<const void*>(section));
+  std::snprintf(text, sizeof(text), "RavelCAIT::ParseRawData... apRawData=[%p]\n", static_cast<const void*>(section));
   return text;
 }
 
@@ -136,14 +135,8 @@ TEST(AitParse, TakesNameAndLocationTextsAndOverwritesWithoutClearing) {
     std::string name, path, file;
     TraceLines descriptorTraces;
   } cases[] = {
-      {"name and location",
-       {Name("Quiz"), Location("/quiz", "lib", "main.ncl")},
-       "Quiz",
-       "/quiz",
-       "main.ncl",
-       {{kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-        {kInfo, "Application name = Quiz"},
+      {"name and location", {Name("Quiz"), Location("/quiz", "lib", "main.ncl")}, "Quiz", "/quiz", "main.ncl",
+       {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = Quiz"},
         {kInfo, kProcess},
         {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
         {kInfo, "Application path = /quiz"},
@@ -155,9 +148,7 @@ TEST(AitParse, TakesNameAndLocationTextsAndOverwritesWithoutClearing) {
        "Shortr" "Name",
        "/b/long/dir",
        "xnitial.ncl",
-       {{kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-        {kInfo, "Application name = LongerName"},
+       {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = LongerName"},
         {kInfo, kProcess},
         {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
         {kInfo, "Application name = ShortrName"},

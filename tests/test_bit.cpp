@@ -64,8 +64,7 @@ Bytes BitBody(bool viewPropriety, const std::vector<Bytes>& firstDescriptors, co
   return Cat({body, first, Cat(records)});
 }
 
-Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3,
-                 uint8_t tableId = 0xC4) {
+Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3, uint8_t tableId = 0xC4) {
   sb::SectionOptions options;
   options.tableId = tableId;
   options.tableIdExtension = originalNetworkId;
@@ -283,8 +282,7 @@ TEST(BITBroadcasterLoop, RecordParseClearsOnFailureAndReleasesOnReparse) {
     std::string summary;
   } cases[] = {
       {"null clears both fields", nullptr, kRavelErrInvalidArgument, {}, "id=0x00 len=0"},
-      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}},
-       "id=0x00 len=0"},
+      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}}, "id=0x00 len=0"},
       {"another tag releases the held descriptor", &other, kRavelOk, {{kWarning, RecordUnknown(0xD7)}},
        "id=0x0a len=4"},
   };
@@ -422,9 +420,7 @@ TEST(BITCapture, TwoSectionsYieldTheirBroadcasterRecords) {
   // The first broadcaster has no descriptors: its look at byte 3 finds the
   // second broadcaster's id (0xCD) as a tag.
   EXPECT_EQ((std::vector<std::string>{"id=0xab len=0", "id=0xcd len=12"}), Records(second));
-  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xFD)},
-                        {kBit, FirstLoopUnknown(0xFD)},
-                        {kWarning, RecordUnknown(0xCD)},
+  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xFD)}, {kBit, FirstLoopUnknown(0xFD)}, {kWarning, RecordUnknown(0xCD)},
                         {kWarning, RecordUnknown(0xFD)}}),
             recorder.Lines());
 

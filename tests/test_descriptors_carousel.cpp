@@ -186,9 +186,7 @@ std::vector<bitwalk::Field> GeneralEventLayout(int mode) {
     return std::vector<bitwalk::Segment>{{at, read ? 4 : 0, 10}, {at + 4, read ? 4 : 0}};
   };
   auto bits = [](bool read, int at, int width) { return std::vector<bitwalk::Segment>{{at, read ? width : 0}}; };
-  return {{"event message group id", {{16, 12}}},
-          {"MJD/JST hour", bcd(jst, 56)},
-          {"MJD/JST minute", bcd(jst, 64)},
+  return {{"event message group id", {{16, 12}}}, {"MJD/JST hour", bcd(jst, 56)}, {"MJD/JST minute", bcd(jst, 64)},
           {"MJD/JST second", bcd(jst, 72)},
           {"NPT bit 32", bits(npt, 47, 1)},
           {"NPT byte 1", bits(npt, 48, 8)},
@@ -220,8 +218,7 @@ TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          RavelCCRC32Descriptor d(raw);
          return {d.GetCRC32()[0], d.GetCRC32()[1], d.GetCRC32()[2], d.GetCRC32()[3]};
        }},
-      {"location", Base({0x06, 1}, 3), 16, 24, {{"location tag", {{16, 8}}}},
-       [](unsigned char* raw) -> Values {
+      {"location", Base({0x06, 1}, 3), 16, 24, {{"location tag", {{16, 8}}}}, [](unsigned char* raw) -> Values {
          RavelCLocationDescriptor d(raw);
          return {d.GetLocationTag()};
        }},
@@ -230,15 +227,13 @@ TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          RavelCEstDownloadTimeDescriptor d(raw);
          return {d.GetEstDownloadTime()};
        }},
-      {"compression type", Base({0xC2, 5}, 7), 16, 56,
-       {{"compression type", {{16, 8}}}, {"original size", {{24, 32}}}},
+      {"compression type", Base({0xC2, 5}, 7), 16, 56, {{"compression type", {{16, 8}}}, {"original size", {{24, 32}}}},
        [](unsigned char* raw) -> Values {
          RavelCCompressionTypeDescriptor d(raw);
          return {d.GetCompressionType(), d.GetOriginalSize()};
        }},
       // Bytes 8 to 10 and the top seven bits of bytes 3 and 11 are read by nobody.
-      {"NPT reference", Base({0x17, 18}, 20), 16, 160,
-       {{"post discontinuity indicator", {{16, 1}}},
+      {"NPT reference", Base({0x17, 18}, 20), 16, 160, {{"post discontinuity indicator", {{16, 1}}},
         {"content id", {{17, 7}}},
         {"STC reference bit 32", {{31, 1}}},
         {"STC reference byte 1", {{32, 8}}},

@@ -332,9 +332,7 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          RavelCExtendedEventDescriptor d(raw);
          return {d.GetDescriptorNumber(), d.GetLastDescriptorNumber()};
        }},
-      {"component", Base({0x50, 6}, 8), 16, 64,
-       {{"stream content", {{20, 4}}},
-        {"component type", {{24, 8}}},
+      {"component", Base({0x50, 6}, 8), 16, 64, {{"stream content", {{20, 4}}}, {"component type", {{24, 8}}},
         {"component tag", {{32, 8}}},
         {"ISO 639 language code", {{40, 24}}}},
        [](unsigned char* raw) -> Values {
@@ -358,9 +356,7 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          RavelCDataComponentDescriptor d(raw);
          return {d.GetDataComponentId()};
        }},
-      {"series", Base({0xD5, 8}, 12), 16, 80,
-       {{"series id", {{16, 16}}},
-        {"repeat label", {{32, 4}}},
+      {"series", Base({0xD5, 8}, 12), 16, 80, {{"series id", {{16, 16}}}, {"repeat label", {{32, 4}}},
         {"program pattern", {{36, 3}}},
         {"expire date valid flag", {{39, 1}}},
         {"expire date", {{40, 16}}},
@@ -371,8 +367,7 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {d.GetSeriesId(),   d.GetRepeatLabel(),     d.GetProgramPattern(),     d.GetExpireDateValidFlag(),
                  d.GetExpireDate(), d.GetEpisodeNumber(), d.GetLastEpisodeNumber()};
        }},
-      {"copyright", Base({0x0D, 4}, 12), 16, 48, {{"copyright id", {{16, 32}}}},
-       [](unsigned char* raw) -> Values {
+      {"copyright", Base({0x0D, 4}, 12), 16, 48, {{"copyright id", {{16, 32}}}}, [](unsigned char* raw) -> Values {
          RavelCCopyrightDescriptor d(raw);
          return {d.GetCopyrightId()};
        }},

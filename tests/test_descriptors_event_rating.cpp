@@ -123,14 +123,12 @@ TEST(ParentalRatingDescriptor, WalksFourByteEntriesAndShowsEachOne) {
     std::vector<std::string> entryLines;
   } cases[] = {
       {"length 0", RawDescriptor(0x55, 0, {}), {}, {}},
-      {"two entries", sb::Descriptor(0x55, sb::Cat({Rating("BRA", 0x23), Rating("ARG", 0x06)})),
-       {"BRA", "ARG"},
+      {"two entries", sb::Descriptor(0x55, sb::Cat({Rating("BRA", 0x23), Rating("ARG", 0x06)})), {"BRA", "ARG"},
        {"\t\tCountry Code=[BRA], Content=[0x02], Mimimum Age = [12] \n",
         "\t\tCountry Code=[ARG], Content=[0x00], Mimimum Age = [18] \n"}},
       // A length that is not a multiple of 4: the last entry starts inside the
       // body and is read whole (here from the zero padding).
-      {"length 5", RawDescriptor(0x55, 5, sb::Cat({Rating("BRA", 0x45), sb::U8(0)})),
-       {"BRA", ""},
+      {"length 5", RawDescriptor(0x55, 5, sb::Cat({Rating("BRA", 0x45), sb::U8(0)})), {"BRA", ""},
        {"\t\tCountry Code=[BRA], Content=[0x04], Mimimum Age = [16] \n",
         "\t\tCountry Code=[], Content=[0x00], Mimimum Age = [0] \n"}},
   };

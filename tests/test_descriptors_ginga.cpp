@@ -258,9 +258,7 @@ Values GingaDataComponentFields(unsigned char* raw) {
   RavelCGingaAppDataComponentDescriptor d(raw);
   const RavelCAdditionalGingaInfo* info = d.GetAdditionalGingaInfo();
   const RavelCObjectCarouselTransmissionFormat* carousel = info->GetData();
-  return {d.GetDataComponentId(),
-          info->GetTransmissionFormat(),
-          info->GetApplicationIdentifierFlag(),
+  return {d.GetDataComponentId(), info->GetTransmissionFormat(), info->GetApplicationIdentifierFlag(),
           info->GetDocumentResolution(),
           info->GetIndependentFlag(),
           info->iApplicationIdentifierOrgId,
@@ -275,8 +273,7 @@ Values GingaDataComponentFields(unsigned char* raw) {
 // the carousel record follows them.
 std::vector<bitwalk::Field> GingaDataComponentLayout(bool identified, bool carousel) {
   const int at = identified ? 88 : 40;
-  return {{"data component id", {{16, 16}}},
-          {"transmission format", {{32, 2}}},
+  return {{"data component id", {{16, 16}}}, {"transmission format", {{32, 2}}},
           {"application identifier flag", {{34, 1}}},
           {"document resolution", {{35, 4}}},
           {"independent flag", {{39, 1}}},
@@ -294,9 +291,7 @@ TEST(GingaDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   using bitwalk::Base;
   const bitwalk::Walk walks[] = {
       // The profiles length is read and dropped; one profile is read whatever it says.
-      {"application", Base({0x00, 9}, 12), 16, 88,
-       {{"application profile", {{24, 16}}},
-        {"version major", {{40, 8}}},
+      {"application", Base({0x00, 9}, 12), 16, 88, {{"application profile", {{24, 16}}}, {"version major", {{40, 8}}},
         {"version minor", {{48, 8}}},
         {"version micro", {{56, 8}}},
         {"service bound flag", {{64, 1}}},

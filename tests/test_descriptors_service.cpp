@@ -530,9 +530,7 @@ Values LogoFields(unsigned char* raw) {
 
 TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
-      {"linkage", Base({0x4A, 7}, 9), 16, 72,
-       {{"transport stream id", {{16, 16}}},
-        {"original network id", {{32, 16}}},
+      {"linkage", Base({0x4A, 7}, 9), 16, 72, {{"transport stream id", {{16, 16}}}, {"original network id", {{32, 16}}},
         {"service id", {{48, 16}}},
         {"linkage type", {{64, 8}}}},
        [](unsigned char* raw) -> Values {
@@ -557,9 +555,7 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       // starts at byte 8, so byte 8 is both affiliation id 1 and the high byte of
       // the first original network id, and byte 7 is read by nobody.
       {"extended broadcaster loops", Base({0xCE, 0x20, 0x10, 0x00, 0x00, 0x22}, 40), 48, 112,
-       {{"affiliation id 0", {{48, 8}}},
-        {"affiliation id 1", {{64, 8}}},
-        {"original network id 0", {{64, 16}}},
+       {{"affiliation id 0", {{48, 8}}}, {"affiliation id 1", {{64, 8}}}, {"original network id 0", {{64, 16}}},
         {"broadcaster id 0", {{80, 8}}},
         {"original network id 1", {{88, 16}}},
         {"broadcaster id 1", {{104, 8}}}},
@@ -586,8 +582,7 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
        }},
       // The flag is the two lowest bits, inside the identifier; the two top bits
       // of the byte are read by nobody.
-      {"system management", Base({0xFE, 2}, 4), 16, 32,
-       {{"broadcasting flag", {{22, 2}}},
+      {"system management", Base({0xFE, 2}, 4), 16, 32, {{"broadcasting flag", {{22, 2}}},
         {"broadcasting identifier", {{18, 6}}},
         {"additional broadcasting identification", {{24, 8}}}},
        [](unsigned char* raw) -> Values {

@@ -176,12 +176,10 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
     Bytes privateData;
     TraceLines trace;
   } cases[] = {
-      {"plain", 0, 0x1006, Bytes{1, 2, 3},
-       At(kCarouselWarning,
+      {"plain", 0, 0x1006, Bytes{1, 2, 3}, At(kCarouselWarning,
           {"NASP Input Data is NULL!\n", "RavelCDsmccDSI::ParseRawData... \n", "Private data length [3]\n"})},
       // Server id from byte 16 of the message.
-      {"adaptation 4", 4, 0x1006, Bytes(),
-       At(kCarouselWarning,
+      {"adaptation 4", 4, 0x1006, Bytes(), At(kCarouselWarning,
           {"NASP Input Data is NULL!\n", "RavelCDsmccDSI::ParseRawData... \n", "Private data length [0]\n"})},
       {"foreign message id", 0, 0x1001, Bytes{9},
        At(kCarouselWarning, {"NASP Input Data is NULL!\n", "Unknown DSMCC Type! dsmccType=[0x03]\n",
@@ -213,8 +211,7 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
     TraceLines dump{
         {kCarouselDump, Format("DSMCC Header: protocolDiscriminator=[0x%02x], dsmccType=[0x%02x], messageID=[0x%04x]\n",
                                0x11, 0x03, c.messageId, 0)},
-        {kCarouselDump,
-         Format("DSMCC Header: transaction_id=[0x%08x], adaptationLength=[%d], messageLength=[%d]\n",
+        {kCarouselDump, Format("DSMCC Header: transaction_id=[0x%08x], adaptationLength=[%d], messageLength=[%d]\n",
                 static_cast<int>(0x80000002u), c.adaptationLength, static_cast<int>(message.size()) - 12, 0)},
         {kCarouselDump, "\t\tNASP: AFI=[0x00], Type=[0x01], CaourselID=[0x0000abcd], iSpecifier=[0x00010203]\n"},
         {kCarouselDump,

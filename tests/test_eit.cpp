@@ -468,8 +468,7 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
   Bytes zeroLength = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}),
                                                Ev(3, At(2020, 4, 5, 21, 0), {Bytes{0x4D, 0x00}})});
   Bytes zeroTag = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {Bytes{0x00, 0x03, 1, 2, 3}})});
-  Bytes badCrcAndTableId = EitSection(
-      [] {
+  Bytes badCrcAndTableId = EitSection([] {
         EitOptions s;
         s.tableId = 0x51;
         s.corruptCrc = true;
@@ -567,8 +566,7 @@ TEST(EITMerge, JoinsMatchingTablesSortedByStartTimeKeepingTiesInOrder) {
     std::vector<EventRecord> theirs;
     std::vector<int> ids;
   } cases[] = {
-      {"out of order across sections",
-       {Ev(3, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
+      {"out of order across sections", {Ev(3, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
        {Ev(2, At(2020, 4, 5, 20, 0)), Ev(0, At(2020, 4, 5, 18, 0))},
        {0, 1, 2, 3}},
       {"ties: held events before appended ones, each in its order",
@@ -580,9 +578,7 @@ TEST(EITMerge, JoinsMatchingTablesSortedByStartTimeKeepingTiesInOrder) {
        {Ev(3, At(2013, 3, 2, 0, 0))},
        {2, 1, 3}},
       {"seconds decide", {Ev(1, At(2020, 4, 5, 19, 0, 2))}, {Ev(2, At(2020, 4, 5, 19, 0, 1))}, {2, 1}},
-      {"empty other: the held events are sorted",
-       {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
-       {},
+      {"empty other: the held events are sorted", {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {},
        {1, 2}},
       {"empty target", {}, {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {1, 2}},
   };
@@ -746,8 +742,7 @@ TEST(EITShow, DumpsHeaderBodyEventsAndDescriptorsInAFixedOrder) {
   options.version = 19;
   options.lastTableId = 0x4F;
   // Wire order differs from dump order; the audio components keep theirs.
-  Bytes section = EitSection(
-      options, {EventRecord{0x0EDD, At(2013, 1, 1, 19, 0), Duration(1, 30, 9), 4, 1,
+  Bytes section = EitSection(options, {EventRecord{0x0EDD, At(2013, 1, 1, 19, 0), Duration(1, 30, 9), 4, 1,
                             {Series(12, "Ser"), AudioComponent(0x11), ExtendedEvent(0, 0, "Ext"), Copyright(7),
                              AudioComponent(0x10), ParentalRating(0x03), Component(0x00), Content(0x10),
                              ShortEvent("Name", "Text"), DigitalCopyControl()}},
@@ -897,8 +892,7 @@ TEST(EITCapture, DvbEpgSectionsParseExceptTheCorruptOne) {
     EXPECT_EQ(goodCrc ? kRavelOk : kRavelErrCorruptSection, result) << "section " << i;
     ++results[{section[0], result}];
   }
-  EXPECT_EQ((std::map<std::pair<int, int>, int>{{{0x4E, kRavelOk}, 597},
-                                                {{0x4E, kRavelErrCorruptSection}, 1},
+  EXPECT_EQ((std::map<std::pair<int, int>, int>{{{0x4E, kRavelOk}, 597}, {{0x4E, kRavelErrCorruptSection}, 1},
                                                 {{0x4F, kRavelOk}, 636},
                                                 {{0x50, kRavelOk}, 205}}),
             results);

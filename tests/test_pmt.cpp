@@ -154,8 +154,7 @@ TEST(PMTStreamSelection, WalksOnlyTheFirst256StreamsAndComesRoundAgain) {
 
 TEST(PMTParse, KeepsTheDescriptorsAReceiverUsesAndTracesTheOthers) {
   StandardScope brazil;
-  Bytes section = PmtSection(
-      {
+  Bytes section = PmtSection({
           {0x1B, 0x0111, {StreamId(0x00), sb::Descriptor(0xC8, {0x47}), CaDescriptor(0x0123)}},
           {0x0F, 0x0112, {StreamId(0x10)}},
           {0x06, 0x0113, {StreamId(0x30), DataComponent(0x0008), sb::Descriptor(0xC6, {0x01, 'A', 'B', 'C'})}},

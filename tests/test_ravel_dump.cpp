@@ -722,8 +722,7 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
   std::string file = Write("oneseg.ts", ReceiverStream());
   ToolRun run = Run({"--summary", file});
   ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_EQ(
-      "Standard: brazil\n"
+  EXPECT_EQ("Standard: brazil\n"
       "Network: \"Rede Teste\" (network_id 0x0640)\n"
       "Transport stream: 0x0640\n"
       "  TS 0x0640 of network 0x0640 \"Teste\", remote control key 5\n"

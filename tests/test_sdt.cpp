@@ -211,9 +211,7 @@ TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAM
         {kWarning, "SDT Info Parsing Fail! Maybe data has been corrupted!\n"}},
        {},
        {}},
-      {"tag 0 fails the section",
-       {Service(0x4800, {sb::Descriptor(0x00, {0x01})})},
-       kRavelErrCorruptSection,
+      {"tag 0 fails the section", {Service(0x4800, {sb::Descriptor(0x00, {0x01})})}, kRavelErrCorruptSection,
        {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x00], descrLen=[1]\n"},
         {kWarning, "SDT Info Parsing Fail! Maybe data has been corrupted!\n"}},
        {},
@@ -382,8 +380,7 @@ TEST(SDTCopy, CopiesHeaderNameNetworkIdAndEveryService) {
 }
 
 TEST(SDTShow, DumpsHeaderBodyAndEachServiceWithItsDescriptors) {
-  Bytes section = SdtSection(
-      {ServiceDef{0x4980, 5, false, true, 1, true,
+  Bytes section = SdtSection({ServiceDef{0x4980, 5, false, true, 1, true,
                    {CountryAvailability("BRA"), LogoType1(3, 0x12, 0x4980), ServiceDescriptor(0xC0, "Pr", "Seg")}},
        Service(0x4800)},
       0x42, 2, 0x0640);
