@@ -95,21 +95,13 @@ TEST(AitParse, ReportsEachDescriptorTagAsItsTableSays) {
     std::string detected;
   } cases[] = {
       {0x00, kInfo, "Detected an APPLICATION_DESCRIPTOR"},
-      {0x02, kInfo, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"},
-      {0x03, kDump, invalid},
-      {0x04, kDump, invalid},
+      {0x02, kInfo, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"}, {0x03, kDump, invalid}, {0x04, kDump, invalid},
       {0x05, kInfo, "Detected an APPLICATION_AUTH_EXT_DESCRIPTOR"},
-      {0x06, kInfo, "Detected an APPLICATION_GINGA_APP_DESCRIPTOR"},
-      {0x08, kDump, invalid},
-      {0x09, kDump, invalid},
-      {0x0A, kDump, invalid},
-      {0x0B, kInfo, "Detected an APPLICATION_ICON_DESCRIPTOR"},
+      {0x06, kInfo, "Detected an APPLICATION_GINGA_APP_DESCRIPTOR"}, {0x08, kDump, invalid}, {0x09, kDump, invalid},
+      {0x0A, kDump, invalid}, {0x0B, kInfo, "Detected an APPLICATION_ICON_DESCRIPTOR"},
       {0x0C, kInfo, "Detected an APPLICATION_PREFETCH_DESCRIPTOR"},
-      {0x0D, kInfo, "Detected an APPLICATION_DII_LOCATION_DESCRIPTOR"},
-      {0x0E, kDump, invalid},
-      {0x40, kDump, invalid},
-      {0xFD, kInfo, "Detected an APPLICATION_DATA_COMPONENT_DESCRIPTOR"},
-      {0xFE, kDump, invalid},
+      {0x0D, kInfo, "Detected an APPLICATION_DII_LOCATION_DESCRIPTOR"}, {0x0E, kDump, invalid}, {0x40, kDump, invalid},
+      {0xFD, kInfo, "Detected an APPLICATION_DATA_COMPONENT_DESCRIPTOR"}, {0xFE, kDump, invalid},
   };
   for (const Case& c : cases) {
     // A body that every class could read as text: nothing of it may reach the record.
@@ -137,28 +129,18 @@ TEST(AitParse, TakesNameAndLocationTextsAndOverwritesWithoutClearing) {
   } cases[] = {
       {"name and location", {Name("Quiz"), Location("/quiz", "lib", "main.ncl")}, "Quiz", "/quiz", "main.ncl",
        {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = Quiz"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /quiz"},
-        {kInfo, "Application filename = main.ncl"}}},
+        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /quiz"}, {kInfo, "Application filename = main.ncl"}}},
       {"neither", {}, "", "", "", {}},
       // A shorter second text overwrites only its own length; the trace shows the record.
       {"second texts shorter",
        {Name("LongerName"), Name("Short"), Location("/a/long/dir", "", "initial.ncl"), Location("/b", "cp", "x")},
-       "Shortr" "Name",
-       "/b/long/dir",
-       "xnitial.ncl",
+       "Shortr" "Name", "/b/long/dir", "xnitial.ncl",
        {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = LongerName"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-        {kInfo, "Application name = ShortrName"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /a/long/dir"},
-        {kInfo, "Application filename = initial.ncl"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /b/long/dir"},
+        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = ShortrName"},
+        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /a/long/dir"}, {kInfo, "Application filename = initial.ncl"}, {kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"}, {kInfo, "Application path = /b/long/dir"},
         {kInfo, "Application filename = xnitial.ncl"}}},
   };
   for (const Case& c : cases) {
@@ -244,8 +226,7 @@ TEST(AitParse, ReadsTheLoopLengthsOneAfterTheOther) {
     std::vector<Bytes> apps;
     int count;
   } cases[] = {
-      {"empty loop", {}, {}, 0},
-      {"two applications", {}, {app1, app2}, 2},
+      {"empty loop", {}, {}, 0}, {"two applications", {}, {app1, app2}, 2},
       // application_loop_length comes from bytes 10-11, the common descriptor's
       // first two bytes: here 0x0 | 9, so only the first application is read.
       {"common descriptor giving 9", {sb::Descriptor(0x00, Bytes(9, 0xEE))}, {app1, app2}, 1},
@@ -316,8 +297,7 @@ TEST(AitCopy, CopiesTheHeaderButNoApplicationsAndMergesNothing) {
     uint8_t otherVersion;
     TraceLines traces;
   } merges[] = {
-      {"same version", 6, {}},
-      {"other version", 2, {{kError, "Two AIT Information have different information!\n"}}},
+      {"same version", 6, {}}, {"other version", 2, {{kError, "Two AIT Information have different information!\n"}}},
   };
   for (const Merge& m : merges) {
     RavelCAIT other;
@@ -341,23 +321,17 @@ TEST(AitShow, DumpsHeaderAndApplicationsWithoutLineEnds) {
   ait.Show();
   const std::string rule = "#################################################################\n";
   TraceLines expected = {
-      {kDump, rule},
-      {kDump, "###################### AIT Table Information ######################\n"},
-      {kDump, rule},
+      {kDump, rule}, {kDump, "###################### AIT Table Information ######################\n"}, {kDump, rule},
       {kDump, "####################### Header Information ########################\n"},
       {kDump, "Session = [0x00], Talbe identifier=[0x74], Table Name=[Unknown]\n"},
       {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
                   "], Any Identifier(?)=[0x0010]\n"},
       {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-      {kDump, "####################### Body Information ########################\n"},
-      {kDump, rule},
+      {kDump, "####################### Body Information ########################\n"}, {kDump, rule},
       {kDump, "- - - - - - - - - - - - - - - - Application Information - - - - - - - - - - - - "},
-      {kDump, "\t App Name.........: Quiz"},
-      {kDump, "\t App File Path....: /q"},
-      {kDump, "\t App File Name....: main.ncl"},
-      {kDump, "\t App orgId........: 11"},
-      {kDump, "\t App appId........: 6837"},
-      {kDump, "\t App control code.: 2"},
+      {kDump, "\t App Name.........: Quiz"}, {kDump, "\t App File Path....: /q"},
+      {kDump, "\t App File Name....: main.ncl"}, {kDump, "\t App orgId........: 11"},
+      {kDump, "\t App appId........: 6837"}, {kDump, "\t App control code.: 2"},
       {kDump, "- - - - - - - - - - - - - - - End of Application Information - - - - - - - - - -"},
   };
   EXPECT_EQ(expected, recorder.Lines());

@@ -55,8 +55,7 @@ TEST(InfoDescriptor, KeepsTheTextWithTwoZeroBytesAndCopiesItUpToTheFirstZero) {
       {"plain", sb::Text("jpnEPG guide"), "jpn", sb::Text("EPG guide"), "EPG guide"},
       {"embedded zero", sb::Cat({sb::Text("spa"), Bytes{'a', 0, 'b'}}), "spa", Bytes{'a', 0, 'b'}, "a"},
       // Shorter than a language code: no text at all, never a negative size.
-      {"length 2", Bytes{'p', 'o'}, "po", Bytes(), ""},
-      {"length 0", Bytes(), "", Bytes(), ""},
+      {"length 2", Bytes{'p', 'o'}, "po", Bytes(), ""}, {"length 0", Bytes(), "", Bytes(), ""},
   };
   for (Case& c : cases) {
     SCOPED_TRACE(c.what);
@@ -95,8 +94,7 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
       // The BCD digits are read four bits into byte 5.
       {3, Bytes{0xF1, 0x23, 0x45, 0x6F, 0xFF}, false, Dump({"\t EventMsg_RelativeTime =[12:34:56]\n"})},
       {4, Bytes{0x11, 0x22, 0x33, 0x44, 0x55}, true, {{kWarning, "Unknown Time Mode =[0x4]\n"}}},
-      {5, mjdTime, false, Dump({jst})},
-      {0xFF, Bytes(5, 0), true, {{kWarning, "Unknown Time Mode =[0xff]\n"}}},
+      {5, mjdTime, false, Dump({jst})}, {0xFF, Bytes(5, 0), true, {{kWarning, "Unknown Time Mode =[0xff]\n"}}},
   };
   for (Case& c : cases) {
     SCOPED_TRACE(int(c.mode));
@@ -187,16 +185,10 @@ std::vector<bitwalk::Field> GeneralEventLayout(int mode) {
   };
   auto bits = [](bool read, int at, int width) { return std::vector<bitwalk::Segment>{{at, read ? width : 0}}; };
   return {{"event message group id", {{16, 12}}}, {"MJD/JST hour", bcd(jst, 56)}, {"MJD/JST minute", bcd(jst, 64)},
-          {"MJD/JST second", bcd(jst, 72)},
-          {"NPT bit 32", bits(npt, 47, 1)},
-          {"NPT byte 1", bits(npt, 48, 8)},
-          {"NPT byte 2", bits(npt, 56, 8)},
-          {"NPT byte 3", bits(npt, 64, 8)},
-          {"NPT byte 4", bits(npt, 72, 8)},
-          {"relative hours", bcd(relative, 44)},
-          {"relative minutes", bcd(relative, 52)},
-          {"relative seconds", bcd(relative, 60)},
-          {"event message type", {{80, 8}}},
+          {"MJD/JST second", bcd(jst, 72)}, {"NPT bit 32", bits(npt, 47, 1)}, {"NPT byte 1", bits(npt, 48, 8)},
+          {"NPT byte 2", bits(npt, 56, 8)}, {"NPT byte 3", bits(npt, 64, 8)}, {"NPT byte 4", bits(npt, 72, 8)},
+          {"relative hours", bcd(relative, 44)}, {"relative minutes", bcd(relative, 52)},
+          {"relative seconds", bcd(relative, 60)}, {"event message type", {{80, 8}}},
           {"event message id", {{88, 16}}}};
 }
 
@@ -234,18 +226,10 @@ TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
        }},
       // Bytes 8 to 10 and the top seven bits of bytes 3 and 11 are read by nobody.
       {"NPT reference", Base({0x17, 18}, 20), 16, 160, {{"post discontinuity indicator", {{16, 1}}},
-        {"content id", {{17, 7}}},
-        {"STC reference bit 32", {{31, 1}}},
-        {"STC reference byte 1", {{32, 8}}},
-        {"STC reference byte 2", {{40, 8}}},
-        {"STC reference byte 3", {{48, 8}}},
-        {"STC reference byte 4", {{56, 8}}},
-        {"NPT reference bit 32", {{95, 1}}},
-        {"NPT reference byte 1", {{96, 8}}},
-        {"NPT reference byte 2", {{104, 8}}},
-        {"NPT reference byte 3", {{112, 8}}},
-        {"NPT reference byte 4", {{120, 8}}},
-        {"scale numerator", {{128, 16}}},
+        {"content id", {{17, 7}}}, {"STC reference bit 32", {{31, 1}}}, {"STC reference byte 1", {{32, 8}}},
+        {"STC reference byte 2", {{40, 8}}}, {"STC reference byte 3", {{48, 8}}}, {"STC reference byte 4", {{56, 8}}},
+        {"NPT reference bit 32", {{95, 1}}}, {"NPT reference byte 1", {{96, 8}}}, {"NPT reference byte 2", {{104, 8}}},
+        {"NPT reference byte 3", {{112, 8}}}, {"NPT reference byte 4", {{120, 8}}}, {"scale numerator", {{128, 16}}},
         {"scale denominator", {{144, 16}}}},
        [](unsigned char* raw) -> Values {
          RavelCNPTReferenceDescriptor d(raw);

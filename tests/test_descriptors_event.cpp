@@ -119,9 +119,7 @@ TEST(SeriesDescriptor, DecodesPackedFieldsAndSizesTheNameFromTheLength) {
     Bytes name;
     const char* stored;  // null: no name
   } cases[] = {
-      {8, {}, nullptr},
-      {9, Text("N"), "N"},
-      {14, Text("Novela"), "Novela"},
+      {8, {}, nullptr}, {9, Text("N"), "N"}, {14, Text("Novela"), "Novela"},
       {10, Text("Novela"), "No"},  // the name takes length - 8 bytes whatever follows
   };
   for (const Case& c : cases) {
@@ -151,11 +149,9 @@ TEST(FixedLengthTexts, CopyLengthMinusOneBytesAndStayTerminated) {
       // Copyright: 4 id bytes, then length - 1 bytes from byte 6, three more
       // than the descriptor holds (the padding letters).
       {"copyright with info", 0x0D, 8, Cat({sb::U32(7), Text("ABCD")}), 7, "ABCDQQQ"},
-      {"copyright length 1", 0x0D, 1, sb::U32(7), 0, ""},
-      {"copyright length 0", 0x0D, 0, sb::U32(7), 255, "QQQ"},
+      {"copyright length 1", 0x0D, 1, sb::U32(7), 0, ""}, {"copyright length 0", 0x0D, 0, sb::U32(7), 255, "QQQ"},
       {"region with three letters", 0xC6, 4, Cat({U8(2), Text("RJ1")}), 3, "RJ1"},
-      {"region length 1", 0xC6, 1, U8(2), 0, ""},
-      {"region length 0", 0xC6, 0, U8(2), 255, "QQQ"},
+      {"region length 1", 0xC6, 1, U8(2), 0, ""}, {"region length 0", 0xC6, 0, U8(2), 255, "QQQ"},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
@@ -333,8 +329,7 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {d.GetDescriptorNumber(), d.GetLastDescriptorNumber()};
        }},
       {"component", Base({0x50, 6}, 8), 16, 64, {{"stream content", {{20, 4}}}, {"component type", {{24, 8}}},
-        {"component tag", {{32, 8}}},
-        {"ISO 639 language code", {{40, 24}}}},
+        {"component tag", {{32, 8}}}, {"ISO 639 language code", {{40, 24}}}},
        [](unsigned char* raw) -> Values {
          RavelCComponentDescriptor d(raw);
          return {d.GetStreamContent(), d.GetComponentType(), d.GetComponentTag(), d.GetISO639LanguageCode()};
@@ -357,11 +352,8 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {d.GetDataComponentId()};
        }},
       {"series", Base({0xD5, 8}, 12), 16, 80, {{"series id", {{16, 16}}}, {"repeat label", {{32, 4}}},
-        {"program pattern", {{36, 3}}},
-        {"expire date valid flag", {{39, 1}}},
-        {"expire date", {{40, 16}}},
-        {"episode number", {{56, 12}}},
-        {"last episode number", {{68, 12}}}},
+        {"program pattern", {{36, 3}}}, {"expire date valid flag", {{39, 1}}}, {"expire date", {{40, 16}}},
+        {"episode number", {{56, 12}}}, {"last episode number", {{68, 12}}}},
        [](unsigned char* raw) -> Values {
          RavelCSeriesDescriptor d(raw);
          return {d.GetSeriesId(),   d.GetRepeatLabel(),     d.GetProgramPattern(),     d.GetExpireDateValidFlag(),

@@ -79,23 +79,17 @@ TEST(ParentalRatingAge, FollowsTheStandardInForceAtParseTime) {
   } cases[] = {
       // Brazil: content in the upper nibble, age selector in the lower.
       {RAVEL_STANDARD_BRAZIL, 0x01, 0, 0, nullptr},  // "L": free for all ages
-      {RAVEL_STANDARD_BRAZIL, 0x12, 1, 10, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x23, 2, 12, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x34, 3, 14, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x45, 4, 16, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x56, 5, 18, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x00, 0, 0, "Unknown ageSelector=[0]\n"},
+      {RAVEL_STANDARD_BRAZIL, 0x12, 1, 10, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x23, 2, 12, nullptr},
+      {RAVEL_STANDARD_BRAZIL, 0x34, 3, 14, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x45, 4, 16, nullptr},
+      {RAVEL_STANDARD_BRAZIL, 0x56, 5, 18, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x00, 0, 0, "Unknown ageSelector=[0]\n"},
       {RAVEL_STANDARD_BRAZIL, 0x67, 6, 0, "Unknown ageSelector=[7]\n"},
       {RAVEL_STANDARD_BRAZIL, 0xFF, 15, 0, "Unknown ageSelector=[15]\n"},
       // Any standard other than 1 follows the Brazilian table.
       {7, 0x23, 2, 12, nullptr},
       // Japan: rating + 3 for 1 to 15, otherwise 0; content never set.
-      {RAVEL_STANDARD_JAPAN, 0x00, 0, 0, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x01, 0, 4, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x05, 0, 8, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x0F, 0, 18, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x10, 0, 0, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x23, 0, 0, nullptr},
+      {RAVEL_STANDARD_JAPAN, 0x00, 0, 0, nullptr}, {RAVEL_STANDARD_JAPAN, 0x01, 0, 4, nullptr},
+      {RAVEL_STANDARD_JAPAN, 0x05, 0, 8, nullptr}, {RAVEL_STANDARD_JAPAN, 0x0F, 0, 18, nullptr},
+      {RAVEL_STANDARD_JAPAN, 0x10, 0, 0, nullptr}, {RAVEL_STANDARD_JAPAN, 0x23, 0, 0, nullptr},
       {RAVEL_STANDARD_JAPAN, 0xFF, 0, 0, nullptr},
   };
   for (const Case& c : cases) {
@@ -246,8 +240,7 @@ TEST(LocalTimeOffsetDescriptor, WalksThirteenByteEntries) {
     Bytes descriptor;
     std::vector<std::string> countries;
   } cases[] = {
-      {"length 0", RawDescriptor(0x58, 0, {}), {}},
-      {"one entry", sb::Descriptor(0x58, one), {"BRA"}},
+      {"length 0", RawDescriptor(0x58, 0, {}), {}}, {"one entry", sb::Descriptor(0x58, one), {"BRA"}},
       {"two entries", sb::Descriptor(0x58, sb::Cat({one, two})), {"BRA", "ARG"}},
       // One byte past a whole entry starts a second one, read from what follows.
       {"length 14", RawDescriptor(0x58, 14, sb::Cat({one, two})), {"BRA", "ARG"}},
@@ -391,14 +384,10 @@ Values LocalTimeOffsetFields(unsigned char* raw) {
 }
 
 const std::vector<Field> kLocalTimeOffsetFields = {
-    {"country region id", {{40, 6}}},
-    {"local time offset polarity", {{47, 1}}},
-    {"local time offset hour", {{48, 4, 10}, {52, 4}}},
-    {"local time offset minute", {{56, 4, 10}, {60, 4}}},
-    {"time of change hour", {{80, 4, 10}, {84, 4}}},
-    {"time of change minute", {{88, 4, 10}, {92, 4}}},
-    {"time of change second", {{96, 4, 10}, {100, 4}}},
-    {"next time offset hour", {{104, 4, 10}, {108, 4}}},
+    {"country region id", {{40, 6}}}, {"local time offset polarity", {{47, 1}}},
+    {"local time offset hour", {{48, 4, 10}, {52, 4}}}, {"local time offset minute", {{56, 4, 10}, {60, 4}}},
+    {"time of change hour", {{80, 4, 10}, {84, 4}}}, {"time of change minute", {{88, 4, 10}, {92, 4}}},
+    {"time of change second", {{96, 4, 10}, {100, 4}}}, {"next time offset hour", {{104, 4, 10}, {108, 4}}},
     {"next time offset minute", {{112, 4, 10}, {116, 4}}},
 };
 

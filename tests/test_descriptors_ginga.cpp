@@ -274,12 +274,9 @@ Values GingaDataComponentFields(unsigned char* raw) {
 std::vector<bitwalk::Field> GingaDataComponentLayout(bool identified, bool carousel) {
   const int at = identified ? 88 : 40;
   return {{"data component id", {{16, 16}}}, {"transmission format", {{32, 2}}},
-          {"application identifier flag", {{34, 1}}},
-          {"document resolution", {{35, 4}}},
-          {"independent flag", {{39, 1}}},
-          {"organization id", {{40, identified ? 32 : 0}}},
-          {"application id", {{72, identified ? 16 : 0}}},
-          {"carousel id", {{at, carousel ? 32 : 0}}},
+          {"application identifier flag", {{34, 1}}}, {"document resolution", {{35, 4}}},
+          {"independent flag", {{39, 1}}}, {"organization id", {{40, identified ? 32 : 0}}},
+          {"application id", {{72, identified ? 16 : 0}}}, {"carousel id", {{at, carousel ? 32 : 0}}},
           {"on demand retrieval flag", {{at + 32, carousel ? 1 : 0}}},
           {"file storable flag", {{at + 33, carousel ? 1 : 0}}},
           {"event section flag", {{at + 34, carousel ? 1 : 0}}}};
@@ -292,12 +289,8 @@ TEST(GingaDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
       // The profiles length is read and dropped; one profile is read whatever it says.
       {"application", Base({0x00, 9}, 12), 16, 88, {{"application profile", {{24, 16}}}, {"version major", {{40, 8}}},
-        {"version minor", {{48, 8}}},
-        {"version micro", {{56, 8}}},
-        {"service bound flag", {{64, 1}}},
-        {"visibility", {{65, 2}}},
-        {"application priority", {{72, 8}}},
-        {"transport protocol label", {{80, 8}}}},
+        {"version minor", {{48, 8}}}, {"version micro", {{56, 8}}}, {"service bound flag", {{64, 1}}},
+        {"visibility", {{65, 2}}}, {"application priority", {{72, 8}}}, {"transport protocol label", {{80, 8}}}},
        [](unsigned char* raw) -> Values {
          RavelCApplicationDescriptor d(raw);
          return {d.GetApplicationProfile(), d.GetVersionMajor(),     d.GetVersionMinor(),    d.GetVersionMicro(),

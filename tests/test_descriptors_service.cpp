@@ -72,8 +72,7 @@ TEST(ServiceDescriptor, ReadsBothNamesAndLeavesEmptyOnesNull) {
     const char* provider;
     const char* name;
   } cases[] = {
-      {Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}, "ABC", "TV"},
-      {Bytes{0x01, 0, 2, 'T', 'V'}, nullptr, "TV"},
+      {Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}, "ABC", "TV"}, {Bytes{0x01, 0, 2, 'T', 'V'}, nullptr, "TV"},
       {Bytes{0xC0, 3, 'A', 'B', 'C', 0}, "ABC", nullptr},
       // Control codes and 8-bit text are kept byte for byte.
       {Bytes{0x01, 2, 0x1B, 0x7C, 1, 0xE9}, "\x1B\x7C", "\xE9"},
@@ -355,10 +354,8 @@ TEST(LogoTransmissionDescriptor, CopiesTheCharactersUpToTheirFirstZeroByte) {
     Bytes characters;
     Bytes copied;
   } cases[] = {
-      {Bytes{'a', 'b', 'c'}, Bytes{'a', 'b', 'c'}},
-      {Bytes{'a', 0x00, 'c', 'd'}, Bytes{'a', 0x00, 0x00, 0x00}},
-      {Bytes{0x00, 'b'}, Bytes{0x00, 0x00}},
-      {Bytes{0x1B, 0xE9}, Bytes{0x1B, 0xE9}},
+      {Bytes{'a', 'b', 'c'}, Bytes{'a', 'b', 'c'}}, {Bytes{'a', 0x00, 'c', 'd'}, Bytes{'a', 0x00, 0x00, 0x00}},
+      {Bytes{0x00, 'b'}, Bytes{0x00, 0x00}}, {Bytes{0x1B, 0xE9}, Bytes{0x1B, 0xE9}},
   };
   for (const Case& c : cases) {
     Bytes raw = Cat({Descriptor(0xCF, Cat({U8(0x03), c.characters})), Bytes{'X', 'Y', 'Z'}});
@@ -387,8 +384,7 @@ TEST(TerrDeliverySystemDescriptor, SplitsAreaGuardAndModeAndCountsFrequencies) {
     unsigned char guard, mode;
     int count;
   } cases[] = {
-      {Cat({Bytes{0x80, 0x1B}, U16(0x1234), U16(0x0D4A)}), 0x801, 2, 3, 2},
-      {Bytes{0xFF, 0xF4}, 0xFFF, 1, 0, 0},
+      {Cat({Bytes{0x80, 0x1B}, U16(0x1234), U16(0x0D4A)}), 0x801, 2, 3, 2}, {Bytes{0xFF, 0xF4}, 0xFFF, 1, 0, 0},
       {Bytes{0x12, 0x38, 0x99}, 0x123, 2, 0, 0},  // a lone byte is no frequency
       {Cat({Bytes{0x00, 0x01}, U16(0x0100), U8(0x55)}), 0x000, 0, 1, 1},
   };
@@ -452,8 +448,7 @@ TEST(PartialReceptionDescriptor, KeepsOnlyTheHighByteOfEachServiceId) {
     Bytes descriptor;  // with whatever follows it
     std::vector<unsigned short> ids;
   } cases[] = {
-      {Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)})), {0x12, 0x56}},
-      {Descriptor(0xFB, Bytes()), {}},
+      {Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)})), {0x12, 0x56}}, {Descriptor(0xFB, Bytes()), {}},
       // An odd length takes its last byte as one more id.
       {Cat({Descriptor(0xFB, Bytes{0x12, 0x34, 0x56}), Bytes{0x78, 0x9A}}), {0x12, 0x56}},
   };
@@ -515,9 +510,7 @@ Values ExtendedBroadcasterHeader(unsigned char* raw) {
 }
 
 const std::vector<Field> kExtendedBroadcasterHeader = {
-    {"broadcaster type", {{16, 4}}},
-    {"terrestrial broadcaster id", {{24, 16}}},
-    {"affiliation id count", {{40, 4}}},
+    {"broadcaster type", {{16, 4}}}, {"terrestrial broadcaster id", {{24, 16}}}, {"affiliation id count", {{40, 4}}},
     {"broadcaster id count", {{44, 4}}},
 };
 
@@ -531,8 +524,7 @@ Values LogoFields(unsigned char* raw) {
 TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
       {"linkage", Base({0x4A, 7}, 9), 16, 72, {{"transport stream id", {{16, 16}}}, {"original network id", {{32, 16}}},
-        {"service id", {{48, 16}}},
-        {"linkage type", {{64, 8}}}},
+        {"service id", {{48, 16}}}, {"linkage type", {{64, 8}}}},
        [](unsigned char* raw) -> Values {
          RavelCLinkageDescriptor d(raw);
          return {d.GetTransportStreamId(), d.GetOriginalNetworkId(), d.GetServiceId(), d.GetLinkageType()};
@@ -556,9 +548,7 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       // the first original network id, and byte 7 is read by nobody.
       {"extended broadcaster loops", Base({0xCE, 0x20, 0x10, 0x00, 0x00, 0x22}, 40), 48, 112,
        {{"affiliation id 0", {{48, 8}}}, {"affiliation id 1", {{64, 8}}}, {"original network id 0", {{64, 16}}},
-        {"broadcaster id 0", {{80, 8}}},
-        {"original network id 1", {{88, 16}}},
-        {"broadcaster id 1", {{104, 8}}}},
+        {"broadcaster id 0", {{80, 8}}}, {"original network id 1", {{88, 16}}}, {"broadcaster id 1", {{104, 8}}}},
        [](unsigned char* raw) -> Values {
          RavelCExtendedBroadcasterDescriptor d(raw);
          return {d.GetAffiliationId(0), d.GetAffiliationId(1), d.GetOriginalNetworkId(0),
@@ -583,8 +573,7 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       // The flag is the two lowest bits, inside the identifier; the two top bits
       // of the byte are read by nobody.
       {"system management", Base({0xFE, 2}, 4), 16, 32, {{"broadcasting flag", {{22, 2}}},
-        {"broadcasting identifier", {{18, 6}}},
-        {"additional broadcasting identification", {{24, 8}}}},
+        {"broadcasting identifier", {{18, 6}}}, {"additional broadcasting identification", {{24, 8}}}},
        [](unsigned char* raw) -> Values {
          RavelCSystemManagementDescriptor d(raw);
          return {d.GetBroadcastingFlag(), d.GetBroadcastingIdentifier(), d.GetAdditionalBroadcastingIdentification()};

@@ -125,8 +125,7 @@ TEST(DsmccHeader, ReadsEveryMessageAndReportsUnknownIdsByTheirDsmccType) {
     uint8_t dsmccType;
     TraceLines trace;
   } cases[] = {
-      {0x1003, 0x03, {}},
-      {0x1001, 0x03, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x03]\n"}}},
+      {0x1003, 0x03, {}}, {0x1001, 0x03, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x03]\n"}}},
       {0x0000, 0x7F, {{kCarouselWarning, "Unknown DSMCC Type! dsmccType=[0x7f]\n"}}},
   };
   for (const Case& c : cases) {
@@ -242,8 +241,7 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
     int blockDataLen;
     TraceLines trace;
   } cases[] = {
-      {"empty block", 0, 0, kRavelOk, 0, {}},
-      {"after an adaptation header", 100, 4, kRavelOk, 100, {}},
+      {"empty block", 0, 0, kRavelOk, 0, {}}, {"after an adaptation header", 100, 4, kRavelOk, 100, {}},
       {"the limit", 4096, 0, kRavelOk, 4096, {}},
       {"one over the limit", 4097, 8, kRavelErrCorruptSection, 0, {{kCarouselError, "Invalid Block Data Length=[4097]\n"}}},
   };

@@ -231,8 +231,7 @@ TEST(EITEventFields, ComparisonsOrderByStartTime) {
     Bytes* b;
     int lt, le, gt, ge;
   } cases[] = {
-      {"earlier", &early, &late, 1, 1, 0, 0},
-      {"later", &late, &early, 0, 0, 1, 1},
+      {"earlier", &early, &late, 1, 1, 0, 0}, {"later", &late, &early, 0, 0, 1, 1},
       {"equal", &early, &early, 0, 1, 0, 1},
       {"day 31 of April sorts after 30 April", &firstOfMay, &lastOfApril, 0, 0, 1, 1},
   };
@@ -264,13 +263,9 @@ TEST(EITEventDescriptors, LastOfEachKindWinsAndEveryAudioComponentIsKept) {
        {"raw genre = 0x12!\n"}},
       {"two short events: the second", {ShortEvent("First"), ShortEvent("Second")}, "short:Second ", {}},
       {"three extended events: only the last text survives",
-       {ExtendedEvent(0, 2, "a"), ExtendedEvent(1, 2, "b"), ExtendedEvent(2, 2, "c")},
-       "extended:2 ",
-       {}},
+       {ExtendedEvent(0, 2, "a"), ExtendedEvent(1, 2, "b"), ExtendedEvent(2, 2, "c")}, "extended:2 ", {}},
       {"three audio components, all in arrival order",
-       {AudioComponent(0x12), AudioComponent(0x10), AudioComponent(0x11)},
-       "audio:18 audio:16 audio:17 ",
-       {}},
+       {AudioComponent(0x12), AudioComponent(0x10), AudioComponent(0x11)}, "audio:18 audio:16 audio:17 ", {}},
       {"repeated single kinds interleaved with audio",
        {Component(1), AudioComponent(0x10), Component(2), Content(0x20), AudioComponent(0x11), Content(0x30),
         ParentalRating(0x03), ParentalRating(0x04), Copyright(1), Copyright(2), Series(1, "a"), Series(2, "b")},
@@ -279,8 +274,7 @@ TEST(EITEventDescriptors, LastOfEachKindWinsAndEveryAudioComponentIsKept) {
       {"digital copy control and unknown tags are traced, not kept",
        {DigitalCopyControl(), sb::Descriptor(0xC7, Bytes(14, 0x00)), ShortEvent("N"),
         sb::Descriptor(0xD6, Bytes{0x11, 0x48, 0x00, 0x0E, 0xDD}), sb::Descriptor(0x49, Bytes{0x01})},
-       "short:N ",
-       {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
+       "short:N ", {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
         "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xc7]\n",
         "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xd6]\n",
         "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0x49]\n"}},
@@ -527,18 +521,13 @@ TEST(EITParse, EventLoopRunsFromByte14ToTheFirstCrcByte) {
     std::vector<int> loopLengths;
     std::vector<std::string> warnings;
   } cases[] = {
-      {"no events: section_length 15", Bytes(), {}, {}, {}},
-      {"events without descriptors",
+      {"no events: section_length 15", Bytes(), {}, {}, {}}, {"events without descriptors",
        sb::Cat({EventBytes(Ev(1, At(2020, 1, 2, 0, 0))), EventBytes(Ev(2, At(2020, 1, 2, 1, 0)))}),
-       {1, 2},
-       {0, 0},
-       {}},
+       {1, 2}, {0, 0}, {}},
       {"each event steps by 12 + its loop length",
        sb::Cat({EventBytes(Ev(3, At(2020, 1, 2, 0, 0), {ShortEvent("a"), AudioComponent(1)})),
                 EventBytes(Ev(4, At(2020, 1, 2, 1, 0))), EventBytes(Ev(5, At(2020, 1, 2, 2, 0), {Content(1)}))}),
-       {3, 4, 5},
-       {19, 0, 4},
-       {"raw genre = 0x1!\n"}},
+       {3, 4, 5}, {19, 0, 4}, {"raw genre = 0x1!\n"}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
@@ -567,16 +556,13 @@ TEST(EITMerge, JoinsMatchingTablesSortedByStartTimeKeepingTiesInOrder) {
     std::vector<int> ids;
   } cases[] = {
       {"out of order across sections", {Ev(3, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))},
-       {Ev(2, At(2020, 4, 5, 20, 0)), Ev(0, At(2020, 4, 5, 18, 0))},
-       {0, 1, 2, 3}},
+       {Ev(2, At(2020, 4, 5, 20, 0)), Ev(0, At(2020, 4, 5, 18, 0))}, {0, 1, 2, 3}},
       {"ties: held events before appended ones, each in its order",
        {Ev(10, At(2020, 4, 5, 20, 0)), Ev(11, At(2020, 4, 5, 20, 0)), Ev(12, At(2020, 4, 5, 19, 0))},
        {Ev(20, At(2020, 4, 5, 20, 0)), Ev(21, At(2020, 4, 5, 19, 0)), Ev(22, At(2020, 4, 5, 20, 0))},
        {12, 21, 10, 11, 20, 22}},
       {"the first of a month sorts as day 32 of the month before",
-       {Ev(1, At(2013, 3, 1, 0, 0)), Ev(2, At(2013, 2, 28, 23, 0))},
-       {Ev(3, At(2013, 3, 2, 0, 0))},
-       {2, 1, 3}},
+       {Ev(1, At(2013, 3, 1, 0, 0)), Ev(2, At(2013, 2, 28, 23, 0))}, {Ev(3, At(2013, 3, 2, 0, 0))}, {2, 1, 3}},
       {"seconds decide", {Ev(1, At(2020, 4, 5, 19, 0, 2))}, {Ev(2, At(2020, 4, 5, 19, 0, 1))}, {2, 1}},
       {"empty other: the held events are sorted", {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {},
        {1, 2}},
@@ -614,9 +600,7 @@ TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
     uint16_t originalNetworkId;
     uint8_t version;
   } cases[] = {
-      {"transport stream", 0x7ED2, 0x7ED1, 4},
-      {"original network", 0x7ED0, 0x0001, 4},
-      {"version", 0x7ED0, 0x7ED1, 5},
+      {"transport stream", 0x7ED2, 0x7ED1, 4}, {"original network", 0x7ED0, 0x0001, 4}, {"version", 0x7ED0, 0x7ED1, 5},
   };
   Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
   for (const Case& c : cases) {
@@ -893,8 +877,7 @@ TEST(EITCapture, DvbEpgSectionsParseExceptTheCorruptOne) {
     ++results[{section[0], result}];
   }
   EXPECT_EQ((std::map<std::pair<int, int>, int>{{{0x4E, kRavelOk}, 597}, {{0x4E, kRavelErrCorruptSection}, 1},
-                                                {{0x4F, kRavelOk}, 636},
-                                                {{0x50, kRavelOk}, 205}}),
+                                                {{0x4F, kRavelOk}, 636}, {{0x50, kRavelOk}, 205}}),
             results);
   // DVB descriptors the receiver does not keep are traced and skipped; the one
   // CRC error is the only failure.

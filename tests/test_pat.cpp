@@ -152,14 +152,12 @@ TEST(PATParse, ConstructedOverNullIsEmptyAndShowsAnUnknownName) {
   EXPECT_EQ(0, pat.iLastSectionNumber);
   pat.Show();
   EXPECT_EQ((TraceLines{
-                {kDump, "#################################################\n"},
-                {kDump, "#### PAT Table Information\n"},
+                {kDump, "#################################################\n"}, {kDump, "#### PAT Table Information\n"},
                 {kDump, "# Header Information\n"},
                 {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[Unknown]\n"},
                 {kDump, "Section syntax indicator=[0], Section length=[0], Any Identifier(?)=[0x0000]\n"},
                 {kDump, "Version number=[0], Current next indicator=[0], Section numbe=[0], Last section number=[0]\n"},
-                {kDump, "# Body Information\n"},
-                {kDump, "The number of PMT Table Info=[0]\n"},
+                {kDump, "# Body Information\n"}, {kDump, "The number of PMT Table Info=[0]\n"},
                 {kDump, "#################################################\n"},
             }),
             recorder.Lines());
@@ -174,12 +172,8 @@ TEST(PATParse, EntriesAreReadInFoursUntilTheFirstCrcByte) {
     unsigned short sectionLength;
     int entriesRead;
   } cases[] = {
-      {Bytes(), 9, 0},
-      {Bytes{0x00}, 10, 1},
-      {Bytes{0x12, 0x34}, 11, 1},
-      {Bytes{0x00, 0x05, 0xE1}, 12, 1},
-      {Bytes{0x00, 0x05, 0xE1, 0x23}, 13, 1},
-      {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00}, 14, 2},
+      {Bytes(), 9, 0}, {Bytes{0x00}, 10, 1}, {Bytes{0x12, 0x34}, 11, 1}, {Bytes{0x00, 0x05, 0xE1}, 12, 1},
+      {Bytes{0x00, 0x05, 0xE1, 0x23}, 13, 1}, {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00}, 14, 2},
       {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00, 0x06, 0xE1}, 16, 2},
       {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00, 0x06, 0xE1, 0x24}, 17, 2},
       {Bytes{0x00, 0x05, 0xE1, 0x23, 0x00, 0x06, 0xE1, 0x24, 0x00}, 18, 3},
@@ -259,14 +253,12 @@ TEST(PATShow, DumpsTheListAndEachEntryAtItsOwnMask) {
   TraceRecorder recorder;
   pat.Show();
   EXPECT_EQ((TraceLines{
-                {kDump, "#################################################\n"},
-                {kDump, "#### PAT Table Information\n"},
+                {kDump, "#################################################\n"}, {kDump, "#### PAT Table Information\n"},
                 {kDump, "# Header Information\n"},
                 {kDump, "Session = [0x00], Talbe identifier=[0x00], Table Name=[PAT]\n"},
                 {kDump, "Section syntax indicator=[1], Section length=[25], Any Identifier(?)=[0x7ed0]\n"},
                 {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-                {kDump, "# Body Information\n"},
-                {kDump, "The number of PMT Table Info=[3]\n"},
+                {kDump, "# Body Information\n"}, {kDump, "The number of PMT Table Info=[3]\n"},
                 {kDump, "[0]th Table Info: Program Number=[3], PID=[0x101]\n"},
                 {kDump, "[1]th Table Info: Program Number=[5], PID=[0x100]\n"},
                 {kDump, "[2]th Table Info: Program Number=[1], PID=[0x1fc8]\n"},
@@ -286,8 +278,7 @@ TEST(PMTInfo, ReadsProgramNumberAndThirteenBitPid) {
   } cases[] = {
       {Bytes{0x48, 0x00, 0xE1, 0xF0}, kRavelOk, 0x4800, 0x01F0},
       {Bytes{0xFF, 0xFF, 0xFF, 0xFF}, kRavelOk, 0xFFFF, 0x1FFF},
-      {Bytes{0x00, 0x01, 0x1F, 0xC8}, kRavelOk, 0x0001, 0x1FC8},
-      {Bytes(), kRavelErrInvalidArgument, 0, 0},
+      {Bytes{0x00, 0x01, 0x1F, 0xC8}, kRavelOk, 0x0001, 0x1FC8}, {Bytes(), kRavelErrInvalidArgument, 0, 0},
   };
   for (const Case& c : cases) {
     Bytes previous{0x12, 0x34, 0x05, 0x67};

@@ -298,8 +298,7 @@ TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
     const char* message;
   } cases[] = {
       {"missing path", {"@"}, {}, false, {}, "No such file or directory"},
-      {"directory", {"DIR"}, {}, false, {}, "is a directory"},
-      {"empty file", {"@"}, {}, true, {}, "empty input"},
+      {"directory", {"DIR"}, {}, false, {}, "is a directory"}, {"empty file", {"@"}, {}, true, {}, "empty input"},
       {"empty standard input", {"-"}, {}, false, {}, "standard input: empty input"},
       {"text file", {"@"}, text, true, {}, "not a transport stream"},
       {"cut in a packet", {"@"}, cut, true, {}, "truncated"},
@@ -343,15 +342,11 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
     std::vector<std::string> args;
     const char* message;
   } cases[] = {
-      {{}, "no capture given"},
-      {{"--frobnicate", file}, "frobnicate"},
-      {{"--standard", "mars", file}, "unknown standard 'mars'"},
-      {{"--pid", "9000", file}, "bad PID '9000'"},
-      {{"--pid", "0x10,zz", file}, "bad PID 'zz'"},
-      {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
+      {{}, "no capture given"}, {{"--frobnicate", file}, "frobnicate"},
+      {{"--standard", "mars", file}, "unknown standard 'mars'"}, {{"--pid", "9000", file}, "bad PID '9000'"},
+      {{"--pid", "0x10,zz", file}, "bad PID 'zz'"}, {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
       {{"--trace", "loud", file}, "unknown trace level 'loud'"},
-      {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"},
-      {{file, file}, "only one capture"},
+      {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"}, {{file, file}, "only one capture"},
   };
   for (const Case& c : cases) {
     ToolRun run = Run(c.args);
@@ -569,10 +564,8 @@ TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
     bool pat, ait;
   } cases[] = {
       {{file}, true, false},  // nothing names PID 0x0100 as an AIT PID
-      {{"--pid", "0x100", file}, false, true},
-      {{"--pid", "0,0x100", file}, true, true},
-      {{"--pid", "0", "--pid", "256", file}, true, true},
-      {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
+      {{"--pid", "0x100", file}, false, true}, {{"--pid", "0,0x100", file}, true, true},
+      {{"--pid", "0", "--pid", "256", file}, true, true}, {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
       {{"--pid", "0,0x100", "--table", "0x00", file}, true, false},
   };
   for (const Case& c : cases) {
@@ -801,10 +794,8 @@ TEST_F(RavelDumpTest, JapanesePsiSectionsGiveServicesAndTheirPids) {
     bool oneSegment;
   } expected[] = {
       // The PAT's order: by program number, the one-segment program last.
-      {0x4800, 0x01F0, 0x0100, {0x0110}, 0x0130, false},
-      {0x4801, 0x03F0, 0x0100, {0x0110}, 0x0130, false},
-      {0xFFF0, 0x1CF0, -1, {}, -1, false},
-      {0x4980, 0x1FC8, 0x0581, {0x0583}, 0x0587, true},
+      {0x4800, 0x01F0, 0x0100, {0x0110}, 0x0130, false}, {0x4801, 0x03F0, 0x0100, {0x0110}, 0x0130, false},
+      {0xFFF0, 0x1CF0, -1, {}, -1, false}, {0x4980, 0x1FC8, 0x0581, {0x0583}, 0x0587, true},
   };
   const nlohmann::json& services = summary["services"];
   ASSERT_EQ(4u, services.size()) << services.dump(1);
@@ -836,8 +827,7 @@ TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
     unsigned applicationId, controlCode;
     const char* name;
   } expected[] = {
-      {0x1EC5, 0x1AB5, 2, "Programmi TV BB SAT"},
-      {0x1EC6, 0x1AB6, 1, "Launcher SAT"},
+      {0x1EC5, 0x1AB5, 2, "Programmi TV BB SAT"}, {0x1EC6, 0x1AB6, 1, "Launcher SAT"},
       {0x1EC7, 0x1AB7, 2, "Programmi TV SAT"},
   };
   nlohmann::json applications = nlohmann::json::parse(run.out)["applications"];

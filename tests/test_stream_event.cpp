@@ -67,12 +67,9 @@ TEST(StreamEventTable, ChecksTheCrcOnlyWhenTheSyntaxIndicatorIsOne) {
       {"bad CRC", true, true, kRavelErrCorruptSection, {{kWarning, "Stream Descriptor Event: CRC Error!\n"}}, "", {}},
       // A checksum instead of a CRC: reported as unchecked, never verified.
       {"checksum, good", false, false, kRavelOk, {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}},
-       "Stream Descriptor Event Table",
-       {7}},
+       "Stream Descriptor Event Table", {7}},
       {"checksum, damaged", false, true, kRavelOk,
-       {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}},
-       "Stream Descriptor Event Table",
-       {7}},
+       {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}}, "Stream Descriptor Event Table", {7}},
   };
   for (Case& c : cases) {
     SCOPED_TRACE(c.what);
@@ -158,8 +155,7 @@ TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
     How how;
     bool keepsNpt;
   } cases[] = {
-      {"copy constructor", kCopyConstruct, true},
-      {"assignment over a table with events", kAssign, true},
+      {"copy constructor", kCopyConstruct, true}, {"assignment over a table with events", kAssign, true},
       // The target's descriptors are released before the source is read.
       {"assignment to itself", kAssignToItself, false},
   };
@@ -239,15 +235,12 @@ TEST(StreamEventTable, DumpsHeaderNptReferenceAndEvents) {
   table.Show();
   const std::string hashes = "#################################################\n";
   TraceLines expected{
-      {kDump, hashes},
-      {kDump, "#### DSMCC Stream Descriptor Table Information\n"},
-      {kDump, "# Header Information\n"},
+      {kDump, hashes}, {kDump, "#### DSMCC Stream Descriptor Table Information\n"}, {kDump, "# Header Information\n"},
       {kDump, "Session = [0x00], Talbe identifier=[0x3d], Table Name=[Stream Descriptor Event Table]\n"},
       {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
                   "], Any Identifier(?)=[0x0001]\n"},
       {kDump, "Version number=[3], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-      {kDump, "# Body Information\n"},
-      {kDump, "\t=================== NPT Reference Descriptor ===================\n"},
+      {kDump, "# Body Information\n"}, {kDump, "\t=================== NPT Reference Descriptor ===================\n"},
       {kDump, "\tDescriptor Tag=[0x17], Descriptor Length=[18], Name=[NPT Reference Descriptor]\n"},
       {kDump, "\t Post Discontinuity Indicator=[0], Dsm_ContentID=[2]\n"},
       {kDump, "\t STC_Reference=[0x00 0x00 0x00 0x00 0x10]\n"},
@@ -256,8 +249,7 @@ TEST(StreamEventTable, DumpsHeaderNptReferenceAndEvents) {
       {kDump, "# The number of General Event Descriptor=[1]\n"},
       {kDump, "\t=================== General Event Descriptor ===================\n"},
       {kDump, "\tDescriptor Tag=[0x40], Descriptor Length=[11], Name=[General Event Descriptor]\n"},
-      {kDump, "\t EventMsgGroupID=[1], TimeMode=[0]\n"},
-      {kWarning, "Unknown Time Mode =[0x0]\n"},
+      {kDump, "\t EventMsgGroupID=[1], TimeMode=[0]\n"}, {kWarning, "Unknown Time Mode =[0x0]\n"},
       {kDump, "\t EventMsgType=[1], EventMsgID=[0x0102]\n"},
       {kDump, hashes}};
   EXPECT_EQ(expected, recorder.Lines());

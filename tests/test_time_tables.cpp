@@ -215,9 +215,7 @@ TEST(TOTDescriptors, KeepsTheLastLocalTimeOffsetAndTracesOthers) {
     std::string kept;
     std::vector<std::string> warnings;
   } cases[] = {
-      {"no descriptors", {}, "-", {}},
-      {"one", {fra}, "FRA ", {}},
-      {"two: the second", {fra, bra}, "BRA BRA ", {}},
+      {"no descriptors", {}, "-", {}}, {"one", {fra}, "FRA ", {}}, {"two: the second", {fra, bra}, "BRA BRA ", {}},
       {"the second of two after an unknown one", {bra, sb::Descriptor(0x49, Bytes{1, 2, 3}), fra}, "FRA ",
        {"TOT Parsing.. Unknown Descriptor Tag=[0x49]\n"}},
       {"unknown only", {sb::Descriptor(0x49, Bytes{1, 2, 3})}, "-", {"TOT Parsing.. Unknown Descriptor Tag=[0x49]\n"}},
@@ -305,34 +303,27 @@ TEST(TimeTablesShow, ExactDumps) {
   RavelCTOT emptyTot(nullptr);
   TraceLines totLines = {{kDump, kRule},
                          {kDump, "###################### TOT Table Information ######################\n"},
-                         {kDump, kRule},
-                         {kDump, "Talbe identifier=[0x73], Table Name=[TOT]\n"},
+                         {kDump, kRule}, {kDump, "Talbe identifier=[0x73], Table Name=[TOT]\n"},
                          {kDump, "Section syntax indicator=[0], Section length=[26]\n"},
                          {kDump, "JST Time =[2019.1.22 - 12:51:9]\n"}};
   totLines.insert(totLines.end(), descriptorDump.begin(), descriptorDump.end());
   totLines.push_back({kDump, kRule});
   Case cases[] = {
       {"TDT", [&] { tdt.Show(); }, {{kDump, kRule},
-        {kDump, "###################### TDT Table Information ######################\n"},
-        {kDump, kRule},
+        {kDump, "###################### TDT Table Information ######################\n"}, {kDump, kRule},
         {kDump, "Talbe identifier=[0x70], Table Name=[TDT]\n"},
-        {kDump, "Section syntax indicator=[0], Section length=[5]\n"},
-        {kDump, "TDT =[2012.12.32 - 9:5:0]\n"},
+        {kDump, "Section syntax indicator=[0], Section length=[5]\n"}, {kDump, "TDT =[2012.12.32 - 9:5:0]\n"},
         {kDump, kRule}}},
       {"TOT with its descriptor", [&] { tot.Show(); }, totLines},
       {"empty TDT", [&] { emptyTdt.Show(); }, {{kDump, kRule},
-        {kDump, "###################### TDT Table Information ######################\n"},
-        {kDump, kRule},
+        {kDump, "###################### TDT Table Information ######################\n"}, {kDump, kRule},
         {kDump, "Talbe identifier=[0x00], Table Name=[Unknown]\n"},
-        {kDump, "Section syntax indicator=[0], Section length=[0]\n"},
-        {kDump, "TDT =[0.0.0 - 0:0:0]\n"},
+        {kDump, "Section syntax indicator=[0], Section length=[0]\n"}, {kDump, "TDT =[0.0.0 - 0:0:0]\n"},
         {kDump, kRule}}},
       {"empty TOT", [&] { emptyTot.Show(); }, {{kDump, kRule},
-        {kDump, "###################### TOT Table Information ######################\n"},
-        {kDump, kRule},
+        {kDump, "###################### TOT Table Information ######################\n"}, {kDump, kRule},
         {kDump, "Talbe identifier=[0x00], Table Name=[Unknown]\n"},
-        {kDump, "Section syntax indicator=[0], Section length=[0]\n"},
-        {kDump, "JST Time =[0.0.0 - 0:0:0]\n"},
+        {kDump, "Section syntax indicator=[0], Section length=[0]\n"}, {kDump, "JST Time =[0.0.0 - 0:0:0]\n"},
         {kDump, kRule}}},
   };
   for (const Case& c : cases) {

@@ -188,10 +188,8 @@ TEST(TSPacketHeader, ShowDumpsTheMembersWithAddressesAsNumbers) {
     TraceRecorder recorder;
     header.Show();
     TraceLines expected = {
-        {kDump, "#################################################\n"},
-        {kDump, "#### TS Packet Header Information\n"},
-        {kDump, c.flagsLine},
-        {kDump, c.fieldsLine},
+        {kDump, "#################################################\n"}, {kDump, "#### TS Packet Header Information\n"},
+        {kDump, c.flagsLine}, {kDump, c.fieldsLine},
         {kDump, "Adaptation Field Start Ptr Addr=[" + Hex32(header.pAdaptionFieldStartPtr) +
                     "], Payload Start Ptr Addr=[" + Hex32(header.pPayloadStartPtr) + "]\n"},
         {kDump, "#################################################\n"},
