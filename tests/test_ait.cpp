@@ -4,7 +4,6 @@
 
 #include <cstdio>
 #include <cstring>
-#include <map>
 #include <set>
 #include <string>
 #include <vector>
@@ -13,13 +12,14 @@
 #include "Ravel_CTableAIT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
+
+using namespace th;
 
 namespace {
 
-const unsigned int kDump = 0x10000020u;
-const unsigned int kInfo = 0x40000020u;
-const unsigned int kError = 0x80000020u;
+const unsigned int kInfo = kWarning;  // the AIT reports at the information level
 
 const char kProcess[] = "RavelCAIT::processDescriptors...\n";
 const char kUnsupportedResolution[] = "Document resolution not supported!!\n";
@@ -317,80 +317,32 @@ TEST(AitShow, DumpsHeaderAndApplicationsWithoutLineEnds) {
   Bytes section = Ait(AitBody({App(0x0B, 0x1AB5, 2, 0xC, {Name("Quiz"), Location("/q", "", "main.ncl")})}), 1);
   RavelCAIT ait;
   ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
-  TraceRecorder recorder;
-  ait.Show();
-  const std::string rule = "#################################################################\n";
-  TraceLines expected = {
-      {kDump, rule}, {kDump, "###################### AIT Table Information ######################\n"}, {kDump, rule},
-      {kDump, "####################### Header Information ########################\n"},
-      {kDump, "Session = [0x00], Talbe identifier=[0x74], Table Name=[Unknown]\n"},
-      {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
-                  "], Any Identifier(?)=[0x0010]\n"},
-      {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-      {kDump, "####################### Body Information ########################\n"}, {kDump, rule},
-      {kDump, "- - - - - - - - - - - - - - - - Application Information - - - - - - - - - - - - "},
-      {kDump, "\t App Name.........: Quiz"}, {kDump, "\t App File Path....: /q"},
-      {kDump, "\t App File Name....: main.ncl"}, {kDump, "\t App orgId........: 11"},
-      {kDump, "\t App appId........: 6837"}, {kDump, "\t App control code.: 2"},
-      {kDump, "- - - - - - - - - - - - - - - End of Application Information - - - - - - - - - -"},
-  };
-  EXPECT_EQ(expected, recorder.Lines());
+  const std::string rule = Rule(kLongRule);
+  TraceLines expected = Dump({rule, "###################### AIT Table Information ######################\n", rule,
+                              "####################### Header Information ########################\n"});
+  Add(expected, HeaderLines(0x74, "Unknown", 1, section.size() - 3, 0x0010, 1, 1, 0, 0));
+  Add(expected, Dump({"####################### Body Information ########################\n", rule,
+                      "- - - - - - - - - - - - - - - - Application Information - - - - - - - - - - - - ",
+                      "\t App Name.........: Quiz", "\t App File Path....: /q", "\t App File Name....: main.ncl",
+                      "\t App orgId........: 11", "\t App appId........: 6837", "\t App control code.: 2",
+                      "- - - - - - - - - - - - - - - End of Application Information - - - - - - - - - -"}));
+  EXPECT_EQ(expected, ShowLines(ait));
 }
-
-namespace {
-
-// The AIT sections of a transport stream: every PUSI packet whose section (after
-// the pointer_field) starts with table_id 0x74, completed from the PID's
-// following packets by its section_length.
-std::map<unsigned int, std::vector<Bytes>> AitSections(const Bytes& stream) {
-  std::map<unsigned int, std::vector<Bytes>> sections;
-  std::map<unsigned int, Bytes> pending;
-  for (size_t at = 0; at + 188 <= stream.size(); at += 188) {
-    const uint8_t* p = &stream[at];
-    if (p[0] != 0x47) continue;
-    unsigned int pid = ((p[1] & 0x1F) << 8) | p[2];
-    bool pusi = (p[1] & 0x40) != 0;
-    unsigned int control = (p[3] >> 4) & 0x3;
-    if (!(control & 0x1)) continue;
-    size_t offset = 4 + ((control & 0x2) ? 1 + p[4] : 0);
-    if (offset >= 188) continue;
-    Bytes payload(p + offset, p + 188);
-    Bytes& section = pending[pid];
-    if (pusi) {
-      size_t start = 1 + payload[0];
-      section.clear();
-      if (start < payload.size() && payload[start] == 0x74) section.assign(payload.begin() + start, payload.end());
-    } else if (!section.empty()) {
-      sb::Append(section, payload);
-    }
-    if (section.size() >= 3) {
-      size_t size = (((section[1] & 0x0F) << 8) | section[2]) + 3;
-      if (section.size() >= size) {
-        section.resize(size);
-        sections[pid].push_back(section);
-        section.clear();
-      }
-    }
-  }
-  return sections;
-}
-
-}  // namespace
 
 TEST(AitCapture, RealSectionsParseAndYieldApplications) {
   Bytes stream;
   RAVEL_LOAD_CAPTURE_OR_SKIP("ait.ts", stream);
-  std::map<unsigned int, std::vector<Bytes>> sections = AitSections(stream);
-  ASSERT_EQ(3u, sections.size());
   std::set<std::string> names;
   int applications = 0;
-  for (auto& pid : sections) {
-    for (Bytes& section : pid.second) {
+  for (unsigned int pid : {0x1EC5, 0x1EC6, 0x1EC7}) {  // named by the capture's PMTs
+    std::vector<Bytes> sections = captures::SectionsOfPid(stream, pid);
+    EXPECT_FALSE(sections.empty()) << "PID " << pid;
+    for (Bytes& section : sections) {
       RavelCAIT ait;
       TraceRecorder recorder;
-      ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << "PID " << pid.first;
+      ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << "PID " << pid;
       RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
-      EXPECT_GT(list->iCount, 0) << "PID " << pid.first;
+      EXPECT_GT(list->iCount, 0) << "PID " << pid;
       applications += list->iCount;
       for (int i = 0; i < list->iCount; ++i) {
         const GingaAITApplicationType& app = (*list)[i];
