@@ -417,45 +417,33 @@ TEST(SDTCapture, JapaneseChannelNamesItsServices) {
   const std::string nhk = "\x0e\x4e\x48\x4b\x0f";
   struct Expected {
     unsigned short id;
-    unsigned char type, companyDef, schedule, presentFollowing;
+    unsigned char type, companyDef, schedule;
     std::string name;
-    unsigned char logoType;
-    unsigned short logoId, logoVersion, downloadId;
+    std::vector<int> logo;  // type, id, version, download data id
     std::string logoCharacters;
   } expected[] = {
-      {0x4800, 0x01, 4, 1, 1, nhk + "\x41\x6d\x39\x67\x0e\x31\xfe\x0f\x3d\x29\x45\x44", 1, 0, 1, 0x4800, ""},
-      {0x4801, 0x01, 4, 1, 1, nhk + "\x41\x6d\x39\x67\x0e\x32\xfe\x0f\x3d\x29\x45\x44", 2, 0, 0, 0, ""},
-      {0x4980, 0xC0, 1, 0, 1, nhk + "\x37\x48\x42\x53\x0e\x47\xfe\x0f\x3d\x29\x45\x44", 3, 0, 0, 0,
+      {0x4800, 0x01, 4, 1, nhk + "\x41\x6d\x39\x67\x0e\x31\xfe\x0f\x3d\x29\x45\x44", {1, 0, 1, 0x4800}, ""},
+      {0x4801, 0x01, 4, 1, nhk + "\x41\x6d\x39\x67\x0e\x32\xfe\x0f\x3d\x29\x45\x44", {2, 0, 0, 0}, ""},
+      {0x4980, 0xC0, 1, 0, nhk + "\x37\x48\x42\x53\x0e\x47\xfe\x0f\x3d\x29\x45\x44", {3, 0, 0, 0},
        nhk + "\x21\x5d\x0e\x47"},
   };
   ASSERT_EQ(3, sdt.GetServiceCount());
   for (int i = 0; i < 3; ++i) {
     SCOPED_TRACE(i);
     RavelCServiceDescription* service = sdt.GetServiceDescription(i);
-    EXPECT_EQ(expected[i].id, service->GetServiceId());
-    EXPECT_EQ(expected[i].companyDef, service->GetEITCompanyDefFlag());
-    EXPECT_EQ(expected[i].schedule, service->GetEITScheduleFlag());
-    EXPECT_EQ(expected[i].presentFollowing, service->GetEITPresentFollowingFlag());
-    EXPECT_EQ(0, service->GetRunningStatus());
-    EXPECT_EQ(0, service->GetFreeCAMode());
+    EXPECT_EQ((std::vector<int>{expected[i].id, expected[i].companyDef, expected[i].schedule, 1, 0, 0}),
+              (std::vector<int>{service->GetServiceId(), service->GetEITCompanyDefFlag(), service->GetEITScheduleFlag(),
+                                service->GetEITPresentFollowingFlag(), service->GetRunningStatus(), service->GetFreeCAMode()}));
     ASSERT_NE(nullptr, service->GetService());
     EXPECT_EQ(expected[i].type, service->GetService()->GetServiceType());
     EXPECT_EQ(nullptr, service->GetService()->GetServiceProviderName());
-    ASSERT_NE(nullptr, service->GetService()->GetServiceName());
-    EXPECT_EQ(expected[i].name, std::string(service->GetService()->GetServiceName()));
-    ASSERT_NE(nullptr, service->GetLogoTransmission());
+    EXPECT_EQ(expected[i].name, NameOf(service));
     RavelCLogoTransmissionDescriptor* logo = service->GetLogoTransmission();
-    EXPECT_EQ(expected[i].logoType, logo->GetLogoTransmissionType());
-    EXPECT_EQ(expected[i].logoId, logo->GetLogoId());
-    EXPECT_EQ(expected[i].logoVersion, logo->GetLogoVersion());
-    EXPECT_EQ(expected[i].downloadId, logo->GetDownloadDataId());
-    if (expected[i].logoCharacters.empty()) {
-      EXPECT_EQ(nullptr, logo->GetLogoCharacters());
-    } else {
-      ASSERT_NE(nullptr, logo->GetLogoCharacters());
-      EXPECT_EQ(expected[i].logoCharacters,
-                std::string(logo->GetLogoCharacters(), static_cast<size_t>(logo->GetLogoCharactersLength())));
-    }
+    ASSERT_NE(nullptr, logo);
+    EXPECT_EQ(expected[i].logo, (std::vector<int>{logo->GetLogoTransmissionType(), logo->GetLogoId(), logo->GetLogoVersion(),
+                                                   logo->GetDownloadDataId()}));
+    EXPECT_EQ(expected[i].logoCharacters,
+              logo->GetLogoCharacters() ? std::string(logo->GetLogoCharacters(), logo->GetLogoCharactersLength()) : "");
     EXPECT_EQ(nullptr, service->GetCountryAvailability());
   }
 }
