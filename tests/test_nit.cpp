@@ -456,42 +456,28 @@ TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialRecepti
 
   ASSERT_EQ(1, nit.GetTSInfoCount());
   RavelCTSInfo* ts = nit.GetTSInfo(0);
-  EXPECT_EQ(0x7ED0, ts->GetTransportStreamId());
-  EXPECT_EQ(0x7ED0, ts->GetOriginalNetworkId());
-  EXPECT_EQ(104, ts->iTransportDescriptorsLength);
 
-  ASSERT_NE(nullptr, ts->pServiceList);
-  std::vector<std::pair<unsigned short, unsigned short>> services;
+  EXPECT_EQ("tsid=0x7ed0 onid=0x7ed0 len=104 services=4 tsname=" + std::string(ts->pTSInformation->GetTsName()) +
+                " freqs=25 partial=1",
+            Summary(*ts));
+  std::vector<unsigned short> services;
   for (int i = 0; i < ts->pServiceList->GetServiceCount(); ++i) {
     unsigned short id = 0, type = 0;
     ts->pServiceList->GetServiceInfo(i, id, type);
-    services.push_back({id, type});
+    services.insert(services.end(), {id, type});
   }
-  EXPECT_EQ((std::vector<std::pair<unsigned short, unsigned short>>{
-                {0x4800, 0x01}, {0x4801, 0x01}, {0x4980, 0xC0}, {0xFFF0, 0xA4}}),
-            services);
-
-  ASSERT_NE(nullptr, ts->pTerrDeliverySystem);
-  EXPECT_EQ(0xAC6, ts->pTerrDeliverySystem->GetAreaCode());
-  EXPECT_EQ(2, ts->pTerrDeliverySystem->GetGuardInterval());
-  EXPECT_EQ(2, ts->pTerrDeliverySystem->GetTransmissionMode());
-  ASSERT_EQ(25, ts->pTerrDeliverySystem->GetFrequencyCount());
-  EXPECT_EQ(0x0D1A, ts->pTerrDeliverySystem->GetFrequency(0));
-  EXPECT_EQ(0x1356, ts->pTerrDeliverySystem->GetFrequency(24));
-
-  ASSERT_NE(nullptr, ts->pPartialReception);
-  ASSERT_EQ(1, ts->pPartialReception->GetServiceIdCount());
+  EXPECT_EQ((std::vector<unsigned short>{0x4800, 0x01, 0x4801, 0x01, 0x4980, 0xC0, 0xFFF0, 0xA4}), services);
+  RavelCTerrDeliverySystemDescriptor* delivery = ts->pTerrDeliverySystem;
+  EXPECT_EQ((std::vector<int>{0xAC6, 2, 2, 0x0D1A, 0x1356}),
+            (std::vector<int>{delivery->GetAreaCode(), delivery->GetGuardInterval(), delivery->GetTransmissionMode(),
+                              delivery->GetFrequency(0), delivery->GetFrequency(24)}));
   EXPECT_EQ(0x49, ts->pPartialReception->GetServiceId(0));  // high byte of service 0x4980
-
-  ASSERT_NE(nullptr, ts->pTSInformation);
   RavelCTSInformationDescriptor* info = ts->pTSInformation;
   EXPECT_EQ(0x01, info->GetRemoteControlKeyId());
   EXPECT_EQ(16u, std::string(info->GetTsName()).size());
   ASSERT_EQ(2, info->GetTransmissionTypeCount());
-  EXPECT_EQ(0x0F, info->GetTxType(0)->GetTransmissionTypeInfo());
-  ASSERT_EQ(3, info->GetTxType(0)->GetNumOfService());
-  EXPECT_EQ(0xFFF0, info->GetTxType(0)->GetServiceId(2));
-  EXPECT_EQ(0xAF, info->GetTxType(1)->GetTransmissionTypeInfo());
-  ASSERT_EQ(1, info->GetTxType(1)->GetNumOfService());
-  EXPECT_EQ(0x4980, info->GetTxType(1)->GetServiceId(0));
+  EXPECT_EQ((std::vector<int>{0x0F, 3, 0xFFF0, 0xAF, 1, 0x4980}),
+            (std::vector<int>{info->GetTxType(0)->GetTransmissionTypeInfo(), info->GetTxType(0)->GetNumOfService(),
+                              info->GetTxType(0)->GetServiceId(2), info->GetTxType(1)->GetTransmissionTypeInfo(),
+                              info->GetTxType(1)->GetNumOfService(), info->GetTxType(1)->GetServiceId(0)}));
 }
