@@ -137,12 +137,9 @@ TEST(DsmccHeader, ReadsEveryMessageAndReportsUnknownIdsByTheirDsmccType) {
     if (!c.trace.empty()) {
       EXPECT_EQ("SectionParser/source/Ravel_CDsmccMsgBase", recorder.Records()[0].file);
     }
-    EXPECT_EQ(0x11, header.GetProtocolDiscriminator());
-    EXPECT_EQ(c.dsmccType, header.GetDsmccType());
-    EXPECT_EQ(c.messageId, header.GetMessageId());
-    EXPECT_EQ(0xFEDCBA98u, header.GetTransactionId());
-    EXPECT_EQ(2, header.GetAdaptationLength());
-    EXPECT_EQ(0x1234, header.GetMessageLength());
+    EXPECT_EQ((std::vector<unsigned int>{0x11, c.dsmccType, c.messageId, 0xFEDCBA98u, 2, 0x1234}),
+              (std::vector<unsigned int>{header.GetProtocolDiscriminator(), header.GetDsmccType(), header.GetMessageId(),
+                                         header.GetTransactionId(), header.GetAdaptationLength(), header.GetMessageLength()}));
     recorder.Clear();
     EXPECT_EQ(kRavelOk, header.ParseRawData(message.data()));
     EXPECT_EQ(c.trace, recorder.Lines());
@@ -194,13 +191,9 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
     EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records()[0].file);
     EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records().back().file);
     RavelCNASP& nasp = dsi.GetNASP();
-    EXPECT_EQ(0x00, nasp.GetAFI());
-    EXPECT_EQ(0x01, nasp.GetType());
-    EXPECT_EQ(0x0000ABCDu, nasp.GetCarouselId());
-    EXPECT_EQ(0x00010203u, nasp.GetSpecifier());
-    EXPECT_EQ(0x0421, nasp.GetTransportStreamId());
-    EXPECT_EQ(0x0422, nasp.GetOriginalNetworkId());
-    EXPECT_EQ(0xE760, nasp.GetServiceId());
+    EXPECT_EQ((std::vector<unsigned int>{0x00, 0x01, 0x0000ABCD, 0x00010203, 0x0421, 0x0422, 0xE760}),
+              (std::vector<unsigned int>{nasp.GetAFI(), nasp.GetType(), nasp.GetCarouselId(), nasp.GetSpecifier(),
+                                         nasp.GetTransportStreamId(), nasp.GetOriginalNetworkId(), nasp.GetServiceId()}));
     EXPECT_EQ(static_cast<int>(c.privateData.size()), dsi.GetPrivateDataLength());
     // Points into the message itself, after serverId, compatibility descriptor and length.
     EXPECT_EQ(message.data() + 12 + c.adaptationLength + 24, dsi.GetPrivateData());
@@ -304,11 +297,7 @@ TEST(DsmccDDB, ParsesAgainCopiesDeeplyAndClearsOnNull) {
 
   EXPECT_EQ(kRavelErrInvalidArgument, ddb.ParseRawData(nullptr));
   EXPECT_EQ(nullptr, ddb.GetBlockData());
-  EXPECT_EQ(0, ddb.GetModuleId());
-  EXPECT_EQ(0, ddb.GetModuleVersion());
-  EXPECT_EQ(0, ddb.GetBlockNumber());
-  EXPECT_EQ(0, ddb.GetBlockDataLen());
-  EXPECT_EQ(0, ddb.GetMessageId());
+  EXPECT_EQ(0, ddb.GetModuleId() + ddb.GetModuleVersion() + ddb.GetBlockNumber() + ddb.GetBlockDataLen() + ddb.GetMessageId());
 }
 
 TEST(DsmccDDB, OrdersBlocksOfOneModuleVersionOnly) {
@@ -389,20 +378,17 @@ TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
     EXPECT_EQ(kRavelOk, dii.ParseRawData(message.data()));
     EXPECT_EQ(c.trace, recorder.Lines());
     for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CDsmccDII", r.file);
-    EXPECT_EQ(0x80000002u, dii.GetDownloadId());
-    EXPECT_EQ(4066, dii.GetBlockSize());
-    EXPECT_EQ(3, dii.GetWindowSize());
-    EXPECT_EQ(4, dii.GetAckPeriod());
-    EXPECT_EQ(5u, dii.GetTCDownloadWindow());
-    EXPECT_EQ(0xFFFFFFFFu, dii.GetTCDownloadScenario());
+    EXPECT_EQ((std::vector<unsigned int>{0x80000002u, 4066, 3, 4, 5, 0xFFFFFFFFu}),
+              (std::vector<unsigned int>{dii.GetDownloadId(), dii.GetBlockSize(), dii.GetWindowSize(), dii.GetAckPeriod(),
+                                         dii.GetTCDownloadWindow(), dii.GetTCDownloadScenario()}));
     ASSERT_EQ(static_cast<int>(c.modules.size()), dii.GetNumberOfModules());
     for (size_t i = 0; i < c.modules.size(); ++i) {
       RavelCModuleInfo* m = dii.GetModuleInfo(static_cast<int>(i));
       ASSERT_NE(nullptr, m);
-      EXPECT_EQ(c.modules[i].id, m->GetModuleId());
-      EXPECT_EQ(c.modules[i].size, m->GetModuleSize());
-      EXPECT_EQ(c.modules[i].version, m->GetModuleVersion());
-      EXPECT_EQ(c.modules[i].info.size(), m->GetModuleInfoLength());
+      EXPECT_EQ((std::vector<unsigned int>{c.modules[i].id, c.modules[i].size, c.modules[i].version,
+                                           static_cast<unsigned int>(c.modules[i].info.size())}),
+                (std::vector<unsigned int>{m->GetModuleId(), m->GetModuleSize(), m->GetModuleVersion(),
+                                           m->GetModuleInfoLength()}));
       EXPECT_EQ(m, dii.GetModuleInfoByID(c.modules[i].id));
     }
   }
