@@ -513,38 +513,6 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
   }
 }
 
-TEST(EITParse, EventLoopRunsFromByte14ToTheFirstCrcByte) {
-  struct Case {
-    const char* label;
-    Bytes events;
-    std::vector<int> ids;
-    std::vector<int> loopLengths;
-    std::vector<std::string> warnings;
-  } cases[] = {
-      {"no events: section_length 15", Bytes(), {}, {}, {}}, {"events without descriptors",
-       sb::Cat({EventBytes(Ev(1, At(2020, 1, 2, 0, 0))), EventBytes(Ev(2, At(2020, 1, 2, 1, 0)))}),
-       {1, 2}, {0, 0}, {}},
-      {"each event steps by 12 + its loop length",
-       sb::Cat({EventBytes(Ev(3, At(2020, 1, 2, 0, 0), {ShortEvent("a"), AudioComponent(1)})),
-                EventBytes(Ev(4, At(2020, 1, 2, 1, 0))), EventBytes(Ev(5, At(2020, 1, 2, 2, 0), {Content(1)}))}),
-       {3, 4, 5}, {19, 0, 4}, {"raw genre = 0x1!\n"}},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    Bytes section = EitSection(EitOptions(), c.events);
-    TraceRecorder recorder;
-    RavelCEIT eit(section.data());
-    EXPECT_EQ(c.warnings, recorder.TextsAt(kWarning));
-    EXPECT_EQ(c.warnings.size(), recorder.Lines().size());
-    EXPECT_EQ(section.size() - 3, eit.iSectionLength);
-    EXPECT_EQ(c.ids, EventIds(eit));
-    std::vector<int> lengths;
-    for (int i = 0; i < eit.GetEventCount(); ++i) lengths.push_back(eit.GetEventInfo(i)->iDescriptorsLoopLength);
-    EXPECT_EQ(c.loopLengths, lengths);
-  }
-  EXPECT_EQ(15u, EitSection(EitOptions(), Bytes()).size() - 3);
-}
-
 // ---------------------------------------------------------------------------
 // Merge
 

@@ -178,17 +178,6 @@ TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
   }
 }
 
-TEST(NITParse, ReparseReplacesEverything) {
-  Bytes first = NitSection(NitBody({NetworkName("Rede"), Linkage(1, 2, 3, 4)}, {kStreamA, kStreamB}));
-  Bytes second = NitSection(NitBody({SystemManagement(0x02, 0x00)}, {kStreamEmpty}), 0x41, 4);
-  RavelCNIT nit(first.data());
-  EXPECT_EQ(kRavelOk, nit.ParseRawData(second.data()));
-  EXPECT_EQ("name - linkage - sm=2", NetworkSummary(nit));
-  EXPECT_EQ((std::vector<std::string>{kSummaryEmpty}), Streams(nit));
-  EXPECT_EQ(4, nit.iVersionNumber);
-  EXPECT_STREQ("NIT Other", nit.sTableName.GetString());
-}
-
 TEST(NITNetworkLoop, OnlyTagZeroFailsAndTheLastOfATagWins) {
   struct Case {
     const char* label;

@@ -458,16 +458,13 @@ TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
 
 TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   // Each section has a good CRC; one declared length points past its parent.
-  sb::SectionOptions pmt;
-  pmt.tableId = 0x02;
-  sb::SectionOptions sdt;
-  sdt.tableId = 0x42;
-  sb::SectionOptions eit;
-  eit.tableId = 0x4E;
-  sb::SectionOptions ait;
-  ait.tableId = 0x74;
-  sb::SectionOptions dii;
-  dii.tableId = 0x3B;
+  auto options = [](uint8_t tableId) {
+    sb::SectionOptions o;
+    o.tableId = tableId;
+    return o;
+  };
+  const sb::SectionOptions pmt = options(0x02), sdt = options(0x42), eit = options(0x4E), ait = options(0x74),
+                           dii = options(0x3B);
   Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(1), sb::U8(0), sb::U8(3), sb::Text("abc")}));
   service[1] = 40;  // the descriptor claims more than its loop holds
   Bytes diiBody = sb::Cat({sb::U32(1), sb::U16(512), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0), sb::U16(0),

@@ -156,19 +156,6 @@ TEST(SDTParse, NamesActualAndOtherAndRefusesEverythingElse) {
   }
 }
 
-TEST(SDTParse, KeepsOnlyTheUpperByteOfTheOriginalNetworkId) {
-  struct Case {
-    uint16_t onSection;
-    unsigned short stored;
-  } cases[] = {{0x7ED0, 0x007E}, {0x00FF, 0x0000}, {0xFF00, 0x00FF}};
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.onSection);
-    Bytes section = SdtSection({Service(1)}, 0x42, 2, c.onSection);
-    RavelCSDT sdt(section.data());
-    EXPECT_EQ(c.stored, sdt.GetOriginalNetworkId());
-  }
-}
-
 TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAMalformedOne) {
   struct Case {
     const char* label;
