@@ -497,19 +497,10 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
     for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableEIT", r.file);
     EXPECT_EQ(0, eit.GetEventCount());
     EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
-    if (c.headerParsed) {
-      // Header and name of the refused section stay.
-      EXPECT_EQ(0x4F, eit.iTableId);
-      EXPECT_EQ(9, eit.iVersionNumber);
-      EXPECT_EQ(0x0101, eit.iTableIdExtension);
-      EXPECT_STREQ("EIT Other", eit.sTableName.GetString());
-      EXPECT_EQ(0x4F, eit.iEITTableId);
-    } else {
-      EXPECT_EQ(0x4E, eit.iTableId);
-      EXPECT_EQ(4, eit.iVersionNumber);
-      EXPECT_EQ(0x4800, eit.iTableIdExtension);
-      EXPECT_STREQ("EIT Actual", eit.sTableName.GetString());
-    }
+    // Header and name of a section whose header was parsed stay; the others keep the earlier ones.
+    EXPECT_EQ((c.headerParsed ? std::vector<int>{0x4F, 9, 0x0101, 0x4F} : std::vector<int>{0x4E, 4, 0x4800, 0x4E}),
+              (std::vector<int>{eit.iTableId, eit.iVersionNumber, eit.iTableIdExtension, eit.iEITTableId}));
+    EXPECT_STREQ(c.headerParsed ? "EIT Other" : "EIT Actual", eit.sTableName.GetString());
   }
 }
 
