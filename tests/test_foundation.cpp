@@ -164,13 +164,6 @@ TEST(List, KeepsOrderAndReleasesItsElements) {
   EXPECT_EQ(0, head.count);
 }
 
-TEST(Standard, DefaultsToBrazilAndCanBeSet) {
-  EXPECT_EQ(RAVEL_STANDARD_BRAZIL, RavelCfg_GetStandard());
-  RavelCfg_SetStandard(RAVEL_STANDARD_JAPAN);
-  EXPECT_EQ(1, RavelCfg_GetStandard());
-  RavelCfg_SetStandard(RAVEL_STANDARD_BRAZIL);
-}
-
 TEST(TraceSink, FormatsOnlyForListenersAndPassesLocation) {
   TraceRecorder recorder;
   gszRavelDbgFilePath = "SectionParser/source/Ravel_CTablePAT";

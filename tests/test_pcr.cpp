@@ -35,40 +35,21 @@ TEST(PCRReader, TakesTheFlagsFromTheLengthByteAndTheClockFromBytesTwoToSix) {
     unsigned long long pcr;
     TraceLines traces;
   } cases[] = {
-      {"length 0x10: PCR whatever the flags byte says",
-       0x30,
-       {0x10, 0x00, 0x00, 0x00, 0x5A, 0x00, 0x00},
-       512,
+      {"length 0x10: PCR whatever the flags byte says", 0x30, {0x10, 0x00, 0x00, 0x00, 0x5A, 0x00, 0x00}, 512,
        {{kError, "PCR = 512\n"}}},
-      {"length 0x07 with PCR_flag in the flags byte: nothing",
-       0x30,
-       {0x07, 0x10, 0x00, 0x00, 0x5A, 0x00, 0x00},
+      {"length 0x07 with PCR_flag in the flags byte: nothing", 0x30, {0x07, 0x10, 0x00, 0x00, 0x5A, 0x00, 0x00},
        kEarlier,
        {}},
-      {"length 0x18: PCR then OPCR from the same bytes",
-       0x30,
-       {0x18, 0x00, 0x12, 0x34, 0x56, 0x78, 0x9A},
-       6787107,
+      {"length 0x18: PCR then OPCR from the same bytes", 0x30, {0x18, 0x00, 0x12, 0x34, 0x56, 0x78, 0x9A}, 6787107,
        {{kError, "PCR = 6787107\n"}, {kError, "OPCR = 6787107\n"}}},
-      {"length 0x08: OPCR alone",
-       0x20,
-       {0x08, 0xFF, 0x12, 0x34, 0x56, 0x78, 0x9A},
-       6787107,
+      {"length 0x08: OPCR alone", 0x20, {0x08, 0xFF, 0x12, 0x34, 0x56, 0x78, 0x9A}, 6787107,
        {{kError, "OPCR = 6787107\n"}}},
-      {"top bit of A[2] becomes bit 32, not bit 32 of the low word",
-       0x30,
-       {0x10, 0x00, 0x80, 0x00, 0x00, 0x00, 0x00},
+      {"top bit of A[2] becomes bit 32, not bit 32 of the low word", 0x30, {0x10, 0x00, 0x80, 0x00, 0x00, 0x00, 0x00},
        47721858,
        {{kError, "PCR = 47721858\n"}}},
-      {"A[5] unshifted and ORed with the top bit of A[6]",
-       0x30,
-       {0x10, 0x00, 0x00, 0x00, 0x00, 0xB3, 0x80},
-       1,
+      {"A[5] unshifted and ORed with the top bit of A[6]", 0x30, {0x10, 0x00, 0x00, 0x00, 0x00, 0xB3, 0x80}, 1,
        {{kError, "PCR = 1\n"}}},
-      {"every bit set",
-       0x3F,
-       {0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF},
-       95443714,
+      {"every bit set", 0x3F, {0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF}, 95443714,
        {{kError, "PCR = 95443714\n"}, {kError, "OPCR = 95443714\n"}}},
   };
   for (const Case& c : cases) {
@@ -93,25 +74,13 @@ TEST(PCRReader, FailuresKeepTheEarlierValue) {
     TraceLines traces;
   } cases[] = {
       {"null packet", true, {}, kRavelErrNullSection, {}},
-      {"bad sync byte",
-       false,
-       PcrPacket(0x30, {0x10, 0, 0, 0, 0x5A, 0, 0}, 0x48),
-       kRavelErrPcr,
+      {"bad sync byte", false, PcrPacket(0x30, {0x10, 0, 0, 0, 0x5A, 0, 0}, 0x48), kRavelErrPcr,
        {{kError, "Invalid TS Packet Start Byte=[0x48]\n"}, {kError, "TS Packet Parsing Fail! iResult=[-7]\n"}}},
-      {"reserved adaptation field control",
-       false,
-       PcrPacket(0x00, {0x10, 0, 0, 0, 0x5A, 0, 0}),
-       kRavelErrPcr,
+      {"reserved adaptation field control", false, PcrPacket(0x00, {0x10, 0, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
        {{kError, "Invalid Adaptation Field Control! => 0x0]"}, {kError, "TS Packet Parsing Fail! iResult=[-8]\n"}}},
-      {"payload only",
-       false,
-       PcrPacket(0x10, {0x10, 0, 0, 0, 0x5A, 0, 0}),
-       kRavelErrPcr,
+      {"payload only", false, PcrPacket(0x10, {0x10, 0, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
        {{kError, "pAdaptionFieldStartPtr is null\n"}, {kError, "iAdaptationFieldControl(1)\n"}}},
-      {"adaptation_field_length 0",
-       false,
-       PcrPacket(0x30, {0x00, 0x10, 0, 0, 0x5A, 0, 0}),
-       kRavelErrPcr,
+      {"adaptation_field_length 0", false, PcrPacket(0x30, {0x00, 0x10, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
        {{kError, "iAdaptationLen(0)\n"}}},
   };
   for (const Case& c : cases) {
@@ -145,8 +114,7 @@ TEST(PCRReader, ConstructsCopiesAndShowsTheLow32Bits) {
     empty.mPCR = c.value;
     TraceRecorder recorder;
     empty.Show();
-    EXPECT_EQ(TraceLines({{kDump, "#################################################\n"},
-                          {kError, c.line},
+    EXPECT_EQ(TraceLines({{kDump, "#################################################\n"}, {kError, c.line},
                           {kDump, "#################################################\n"}}),
               recorder.Lines());
   }

@@ -45,6 +45,11 @@ void WriteFile(const std::string& path, const Bytes& bytes) {
   out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
 }
 
+// Every member of `expected` is in `actual` with the same value.
+void ExpectMembers(const nlohmann::json& expected, const nlohmann::json& actual) {
+  for (const auto& member : expected.items()) EXPECT_EQ(member.value(), actual[member.key()]) << member.key();
+}
+
 size_t Lines(const std::string& text) {
   size_t count = 0;
   for (char c : text) count += c == '\n';
@@ -306,8 +311,7 @@ TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
     const char* message;
   } cases[] = {
       {"missing path", {"@"}, {}, false, {}, "No such file or directory"},
-      {"directory", {"DIR"}, {}, false, {}, "is a directory"},
-      {"empty file", {"@"}, {}, true, {}, "empty input"},
+      {"directory", {"DIR"}, {}, false, {}, "is a directory"}, {"empty file", {"@"}, {}, true, {}, "empty input"},
       {"empty standard input", {"-"}, {}, false, {}, "standard input: empty input"},
       {"text file", {"@"}, text, true, {}, "not a transport stream"},
       {"cut in a packet", {"@"}, cut, true, {}, "truncated"},
@@ -351,15 +355,11 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
     std::vector<std::string> args;
     const char* message;
   } cases[] = {
-      {{}, "no capture given"},
-      {{"--frobnicate", file}, "frobnicate"},
-      {{"--standard", "mars", file}, "unknown standard 'mars'"},
-      {{"--pid", "9000", file}, "bad PID '9000'"},
-      {{"--pid", "0x10,zz", file}, "bad PID 'zz'"},
-      {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
+      {{}, "no capture given"}, {{"--frobnicate", file}, "frobnicate"},
+      {{"--standard", "mars", file}, "unknown standard 'mars'"}, {{"--pid", "9000", file}, "bad PID '9000'"},
+      {{"--pid", "0x10,zz", file}, "bad PID 'zz'"}, {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
       {{"--trace", "loud", file}, "unknown trace level 'loud'"},
-      {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"},
-      {{file, file}, "only one capture"},
+      {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"}, {{file, file}, "only one capture"},
   };
   for (const Case& c : cases) {
     ToolRun run = Run(c.args);
@@ -466,16 +466,13 @@ TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
 
 TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   // Each section has a good CRC; one declared length points past its parent.
-  sb::SectionOptions pmt;
-  pmt.tableId = 0x02;
-  sb::SectionOptions sdt;
-  sdt.tableId = 0x42;
-  sb::SectionOptions eit;
-  eit.tableId = 0x4E;
-  sb::SectionOptions ait;
-  ait.tableId = 0x74;
-  sb::SectionOptions dii;
-  dii.tableId = 0x3B;
+  auto options = [](uint8_t tableId) {
+    sb::SectionOptions o;
+    o.tableId = tableId;
+    return o;
+  };
+  const sb::SectionOptions pmt = options(0x02), sdt = options(0x42), eit = options(0x4E), ait = options(0x74),
+                           dii = options(0x3B);
   Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(1), sb::U8(0), sb::U8(3), sb::Text("abc")}));
   service[1] = 40;  // the descriptor claims more than its loop holds
   Bytes diiBody = sb::Cat({sb::U32(1), sb::U16(512), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0), sb::U16(0),
@@ -549,24 +546,13 @@ TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
   }
 }
 
-TEST_F(RavelDumpTest, SummaryListsGingaApplications) {
+TEST_F(RavelDumpTest, JsonListsGingaApplications) {
   Bytes stream = Packets(0x0100, {AitSection("Quiz", "/apps/quiz", "main.ncl")}, 3);
-  ToolRun run = Run({"--pid", "0x100", "--summary", Write("ait.ts", stream)});
-  ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_NE(std::string::npos,
-            run.out.find("Ginga applications (1):\n  PID 0x0100 type 0x0009: organization 0x0000000a application "
-                         "0x0001 control 1 (autostart) name \"Quiz\" path \"/apps/quiz\" file \"main.ncl\"\n"))
-      << run.out;
-  ToolRun json = Run({"--pid", "0x100", "--json", Path("ait.ts")});
-  nlohmann::json app = nlohmann::json::parse(json.out)["applications"][0];
-  EXPECT_EQ(0x100, app["pid"].get<int>());
-  EXPECT_EQ(9, app["application_type"].get<int>());
-  EXPECT_EQ(10u, app["organization_id"].get<unsigned>());
-  EXPECT_EQ(1u, app["application_id"].get<unsigned>());
-  EXPECT_EQ(1u, app["control_code"].get<unsigned>());
-  EXPECT_EQ(1, app["document_resolution"].get<int>());
-  EXPECT_EQ("/apps/quiz", app["path"].get<std::string>());
-  EXPECT_EQ("main.ncl", app["file"].get<std::string>());
+  ToolRun json = Run({"--pid", "0x100", "--json", Write("ait.ts", stream)});
+  ASSERT_EQ(0, json.status) << json.err;
+  ExpectMembers({{"pid", 0x100}, {"application_type", 9}, {"organization_id", 10}, {"application_id", 1},
+                 {"control_code", 1}, {"document_resolution", 1}, {"path", "/apps/quiz"}, {"file", "main.ncl"}},
+                nlohmann::json::parse(json.out)["applications"][0]);
 }
 
 TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
@@ -577,10 +563,8 @@ TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
     bool pat, ait;
   } cases[] = {
       {{file}, true, false},  // nothing names PID 0x0100 as an AIT PID
-      {{"--pid", "0x100", file}, false, true},
-      {{"--pid", "0,0x100", file}, true, true},
-      {{"--pid", "0", "--pid", "256", file}, true, true},
-      {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
+      {{"--pid", "0x100", file}, false, true}, {{"--pid", "0,0x100", file}, true, true},
+      {{"--pid", "0", "--pid", "256", file}, true, true}, {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
       {{"--pid", "0,0x100", "--table", "0x00", file}, true, false},
   };
   for (const Case& c : cases) {
@@ -638,9 +622,7 @@ TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
   ASSERT_EQ(0, run.status) << run.err;
   nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
   ASSERT_EQ(1u, carousels.size());
-  EXPECT_EQ(0x200, carousels[0]["pid"].get<int>());
-  EXPECT_EQ(7u, carousels[0]["download_id"].get<unsigned>());
-  EXPECT_EQ(kBlock, carousels[0]["block_size"].get<int>());
+  ExpectMembers({{"pid", 0x200}, {"download_id", 7}, {"block_size", kBlock}}, carousels[0]);
   struct Expect {
     int id;
     unsigned received, total;
@@ -652,22 +634,16 @@ TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
   ASSERT_EQ(5u, modules.size());
   for (size_t i = 0; i < 5; ++i) {
     const Expect& e = expected[i];
-    EXPECT_EQ(e.id, modules[i]["id"].get<int>());
-    EXPECT_EQ(5, modules[i]["version"].get<int>());
-    EXPECT_EQ(e.received, modules[i]["blocks_received"].get<unsigned>()) << e.id;
-    EXPECT_EQ(e.total, modules[i]["blocks_total"].get<unsigned>()) << e.id;
-    EXPECT_EQ(e.complete, modules[i]["complete"].get<bool>()) << e.id;
     char name[64];
     std::snprintf(name, sizeof name, "pid0200_dl00000007_module%04x_v5.bin", e.id);
-    std::string file = out + "/" + name;
+    const std::string file = out + "/" + name;
+    ExpectMembers({{"id", e.id}, {"version", 5}, {"blocks_received", e.received}, {"blocks_total", e.total},
+                   {"complete", e.complete}, {"file", e.complete ? nlohmann::json(file) : nlohmann::json()}},
+                  modules[i]);
     EXPECT_EQ(e.complete, fs::exists(file)) << file;
+    const Bytes want = e.bytes != nullptr ? *e.bytes : Bytes();
     if (e.complete) {
-      EXPECT_EQ(file, modules[i]["file"].get<std::string>());
-      std::string contents = ReadFile(file);
-      Bytes want = e.bytes != nullptr ? *e.bytes : Bytes();
-      EXPECT_EQ(std::string(want.begin(), want.end()), contents) << e.id;
-    } else {
-      EXPECT_TRUE(modules[i]["file"].is_null());
+      EXPECT_EQ(std::string(want.begin(), want.end()), ReadFile(file)) << e.id;
     }
   }
   size_t files = 0;
@@ -730,8 +706,7 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
   std::string file = Write("oneseg.ts", ReceiverStream());
   ToolRun run = Run({"--summary", file});
   ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_EQ(
-      "Standard: brazil\n"
+  EXPECT_EQ("Standard: brazil\n"
       "Network: \"Rede Teste\" (network_id 0x0640)\n"
       "Transport stream: 0x0640\n"
       "  TS 0x0640 of network 0x0640 \"Teste\", remote control key 5\n"
@@ -803,30 +778,16 @@ TEST_F(RavelDumpTest, JapanesePsiSectionsGiveServicesAndTheirPids) {
   nlohmann::json summary = nlohmann::json::parse(run.out);
   EXPECT_EQ("japan", summary["standard"].get<std::string>());
   EXPECT_EQ(0x7ED0, summary["transport_stream_id"].get<int>());
-  struct Expect {
-    int id, pmt, video;
-    std::vector<int> audio;
-    int captions;
-    bool oneSegment;
-  } expected[] = {
-      // The PAT's order: by program number, the one-segment program last.
-      {0x4800, 0x01F0, 0x0100, {0x0110}, 0x0130, false},
-      {0x4801, 0x03F0, 0x0100, {0x0110}, 0x0130, false},
-      {0xFFF0, 0x1CF0, -1, {}, -1, false},
-      {0x4980, 0x1FC8, 0x0581, {0x0583}, 0x0587, true},
-  };
+  // The PAT's order: by program number, the one-segment program last.
+  const nlohmann::json expected = nlohmann::json::parse(R"([
+      {"id": 18432, "pmt_pid": 496, "video_pid": 256, "audio_pids": [272], "caption_pid": 304, "one_segment": false},
+      {"id": 18433, "pmt_pid": 1008, "video_pid": 256, "audio_pids": [272], "caption_pid": 304, "one_segment": false},
+      {"id": 65520, "pmt_pid": 7408, "video_pid": null, "audio_pids": [], "caption_pid": null, "one_segment": false},
+      {"id": 18816, "pmt_pid": 8136, "video_pid": 1409, "audio_pids": [1411], "caption_pid": 1415, "one_segment": true}
+  ])");
   const nlohmann::json& services = summary["services"];
   ASSERT_EQ(4u, services.size()) << services.dump(1);
-  for (size_t i = 0; i < 4; ++i) {
-    const Expect& e = expected[i];
-    const nlohmann::json& s = services[i];
-    EXPECT_EQ(e.id, s["id"].get<int>());
-    EXPECT_EQ(e.pmt, s["pmt_pid"].get<int>()) << e.id;
-    EXPECT_EQ(e.video, s["video_pid"].is_null() ? -1 : s["video_pid"].get<int>()) << e.id;
-    EXPECT_EQ(e.audio, s["audio_pids"].get<std::vector<int>>()) << e.id;
-    EXPECT_EQ(e.captions, s["caption_pid"].is_null() ? -1 : s["caption_pid"].get<int>()) << e.id;
-    EXPECT_EQ(e.oneSegment, s["one_segment"].get<bool>()) << e.id;
-  }
+  for (size_t i = 0; i < 4; ++i) ExpectMembers(expected[i], services[i]);
   EXPECT_FALSE(summary["network"].is_null());
   EXPECT_EQ(0x7ED0, summary["network"]["id"].get<int>());
   EXPECT_FALSE(services[0]["present"].is_null());
@@ -840,29 +801,22 @@ TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
   ASSERT_EQ(0, run.status) << run.err;
   // The AIT PIDs are found as a receiver finds them: named by the PMTs.
   EXPECT_NE(std::string::npos, run.err.find("  0x1ec5          2          0        0         2  AIT\n")) << run.err;
-  struct Expect {
-    int pid;
-    unsigned applicationId, controlCode;
-    const char* name;
-  } expected[] = {
-      {0x1EC5, 0x1AB5, 2, "Programmi TV BB SAT"},
-      {0x1EC6, 0x1AB6, 1, "Launcher SAT"},
-      {0x1EC7, 0x1AB7, 2, "Programmi TV SAT"},
-  };
+  const nlohmann::json expected = nlohmann::json::parse(R"([
+      {"pid": 7877, "application_id": 6837, "control_code": 2, "name": "Programmi TV BB SAT"},
+      {"pid": 7878, "application_id": 6838, "control_code": 1, "name": "Launcher SAT"},
+      {"pid": 7879, "application_id": 6839, "control_code": 2, "name": "Programmi TV SAT"}
+  ])");
   nlohmann::json applications = nlohmann::json::parse(run.out)["applications"];
   ASSERT_EQ(3u, applications.size()) << applications.dump(1);
-  for (const Expect& e : expected) {
-    bool found = false;
+  for (const nlohmann::json& e : expected) {
+    int found = 0;
     for (const nlohmann::json& app : applications) {
-      if (app["pid"].get<int>() != e.pid) continue;
-      found = true;
-      EXPECT_EQ(0x0Bu, app["organization_id"].get<unsigned>());
-      EXPECT_EQ(e.applicationId, app["application_id"].get<unsigned>());
-      EXPECT_EQ(e.controlCode, app["control_code"].get<unsigned>());
-      EXPECT_EQ(e.name, app["name"].get<std::string>());
-      EXPECT_EQ(1, app["application_type"].get<int>());
+      if (app["pid"] != e["pid"]) continue;
+      ++found;
+      ExpectMembers(e, app);
+      ExpectMembers({{"organization_id", 11}, {"application_type", 1}}, app);
     }
-    EXPECT_TRUE(found) << e.name;
+    EXPECT_EQ(1, found) << e["name"];
   }
 }
 
@@ -883,27 +837,19 @@ TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
   }
   EXPECT_EQ((std::vector<int>{0x0401, 0x0402, 0x0407, 0x0415, 0x0416}), ids);
   const nlohmann::json& w9 = summary["services"][1];
-  EXPECT_EQ("W9", w9["name"].get<std::string>());
-  EXPECT_EQ("Multi4", w9["provider"].get<std::string>());
-  struct Expect {
-    const char* which;
-    int eventId, hour, minute, hours, minutes;
-  } events[] = {{"present", 0x1C, 12, 35, 0, 50}, {"following", 0x1D, 13, 25, 0, 55}};
-  for (const Expect& e : events) {
-    const nlohmann::json& event = w9[e.which];
-    EXPECT_EQ(e.eventId, event["event_id"].get<int>()) << e.which;
-    EXPECT_EQ("\\x05NCIS", event["name"].get<std::string>()) << e.which;
-    EXPECT_EQ((nlohmann::json{{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", e.hour}, {"minute", e.minute},
-                              {"second", 0}}),
-              event["start"]);
-    EXPECT_EQ(e.hours, event["duration"]["hours"].get<int>());
-    EXPECT_EQ(e.minutes, event["duration"]["minutes"].get<int>());
-    EXPECT_EQ("fra", event["ratings"][0]["country"].get<std::string>());
-  }
+  ExpectMembers({{"name", "W9"}, {"provider", "Multi4"}}, w9);
+  const nlohmann::json day = {{"year", 2019}, {"month", 1}, {"day", 22}};
+  ExpectMembers(day, w9["present"]["start"]);
+  ExpectMembers({{"event_id", 0x1C}, {"name", "\\x05NCIS"}}, w9["present"]);
+  ExpectMembers({{"hour", 12}, {"minute", 35}, {"second", 0}}, w9["present"]["start"]);
+  ExpectMembers({{"hours", 0}, {"minutes", 50}}, w9["present"]["duration"]);
+  ExpectMembers({{"event_id", 0x1D}, {"name", "\\x05NCIS"}}, w9["following"]);
+  ExpectMembers({{"hour", 13}, {"minute", 25}}, w9["following"]["start"]);
+  ExpectMembers({{"hours", 0}, {"minutes", 55}}, w9["following"]["duration"]);
+  EXPECT_EQ("fra", w9["following"]["ratings"][0]["country"].get<std::string>());
   const nlohmann::json& time = summary["time"];
   EXPECT_EQ("TOT", time["source"].get<std::string>());
-  EXPECT_EQ((nlohmann::json{{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", 12}, {"minute", 52}, {"second", 9}}),
-            time["time"]);
+  ExpectMembers({{"year", 2019}, {"month", 1}, {"day", 22}, {"hour", 12}, {"minute", 52}, {"second", 9}}, time["time"]);
   ASSERT_EQ(1u, time["local_time_offsets"].size());
   const nlohmann::json& offset = time["local_time_offsets"][0];
   EXPECT_EQ("FRA", offset["country"].get<std::string>());

@@ -38,13 +38,14 @@
 #include "Ravel_Util.h"
 #include "SampleStream.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
 
 namespace {
 
-const unsigned int kWarning = 0x40000020u;
-const unsigned int kBitLoop = 0x20000020u;
-const unsigned int kCarouselWarning = 0x40000040u;
+using th::kCarouselWarning;
+using th::kWarning;
+const unsigned int kBitLoop = th::kBit;
 
 const char kSampleFile[] = RAVEL_SAMPLES_DIR "/oneseg-brazil.ts";
 
@@ -55,16 +56,6 @@ Bytes LoadSample() {
   std::ifstream in(kSampleFile, std::ios::binary);
   return Bytes((std::istreambuf_iterator<char>(in)), std::istreambuf_iterator<char>());
 }
-
-// Brazilian rules for the parental rating and region lookups.
-class StandardScope {
- public:
-  StandardScope() : saved_(RavelCfg_GetStandard()) { RavelCfg_SetStandard(0); }
-  ~StandardScope() { RavelCfg_SetStandard(saved_); }
-
- private:
-  int saved_;
-};
 
 struct Assembled {
   std::map<int, std::vector<Bytes> > sections;  // by PID, in arrival order
@@ -124,107 +115,43 @@ struct ParseOutcome {
   TraceLines trace;
 };
 
+// Parses `data` with a T built empty first, so that the trace is that of the parse alone.
+template <class T, class... Args>
+ParseOutcome ParseWith(unsigned char* data, Args... args) {
+  T object(args...);
+  TraceRecorder recorder;
+  ParseOutcome outcome = {object.ParseRawData(data), TraceLines()};
+  for (const auto& line : recorder.Lines()) outcome.trace.push_back({line.first, WithoutAddress(line.second)});
+  return outcome;
+}
+
 // Parses one section with the library class of its table_id (for DSM-CC
 // sections, of its message id, over the message after the section header).
-// Objects are built empty first, so that the trace is that of the parse alone.
 ParseOutcome ParseByTableId(Bytes section) {
   unsigned char* s = section.data();
   unsigned char* message = s + 8;
-  std::unique_ptr<TraceRecorder> recorder;
-  int result = kRavelErrInvalidArgument;
   switch (s[0]) {
-    case 0x00: {
-      RavelCPAT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x02: {
-      RavelCPMT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x40: {
-      RavelCNIT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x42: {
-      RavelCSDT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x4E: {
-      RavelCEIT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x70: {
-      RavelCTDT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x73: {
-      RavelCTOT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x74: {
-      RavelCAIT table;
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0xC4: {
-      RavelCBIT table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
-    case 0x3D: {
-      RavelCDsmccStreamEvent table(nullptr);
-      recorder.reset(new TraceRecorder);
-      result = table.ParseRawData(s);
-      break;
-    }
+    case 0x00: return ParseWith<RavelCPAT>(s, nullptr);
+    case 0x02: return ParseWith<RavelCPMT>(s, nullptr);
+    case 0x40: return ParseWith<RavelCNIT>(s, nullptr);
+    case 0x42: return ParseWith<RavelCSDT>(s, nullptr);
+    case 0x4E: return ParseWith<RavelCEIT>(s, nullptr);
+    case 0x70: return ParseWith<RavelCTDT>(s, nullptr);
+    case 0x73: return ParseWith<RavelCTOT>(s, nullptr);
+    case 0x74: return ParseWith<RavelCAIT>(s);
+    case 0xC4: return ParseWith<RavelCBIT>(s, nullptr);
+    case 0x3D: return ParseWith<RavelCDsmccStreamEvent>(s, nullptr);
     case 0x3B:
-    case 0x3C: {
+    case 0x3C:
       // The message classes do not look at the section's CRC_32.
       EXPECT_NE(0, RavelUtil_CheckSectionCRC32(s));
       switch (RavelRead16(message + 2)) {
-        case RAVEL_DSMCC_MSG_DSI: {
-          RavelCDsmccDSI dsi(nullptr);
-          recorder.reset(new TraceRecorder);
-          result = dsi.ParseRawData(message);
-          break;
-        }
-        case RAVEL_DSMCC_MSG_DII: {
-          RavelCDsmccDII dii(nullptr);
-          recorder.reset(new TraceRecorder);
-          result = dii.ParseRawData(message);
-          break;
-        }
-        case RAVEL_DSMCC_MSG_DDB: {
-          RavelCDsmccDDB ddb(nullptr);
-          recorder.reset(new TraceRecorder);
-          result = ddb.ParseRawData(message);
-          break;
-        }
+        case RAVEL_DSMCC_MSG_DSI: return ParseWith<RavelCDsmccDSI>(message, nullptr);
+        case RAVEL_DSMCC_MSG_DII: return ParseWith<RavelCDsmccDII>(message, nullptr);
+        case RAVEL_DSMCC_MSG_DDB: return ParseWith<RavelCDsmccDDB>(message, nullptr);
       }
-      break;
-    }
   }
-  ParseOutcome outcome = {result, TraceLines()};
-  if (recorder) {
-    for (const auto& line : recorder->Lines()) outcome.trace.push_back({line.first, WithoutAddress(line.second)});
-  }
-  return outcome;
+  return ParseOutcome{kRavelErrInvalidArgument, TraceLines()};
 }
 
 const TraceLines kQuiet;
@@ -297,7 +224,7 @@ TEST(SampleCapture, PacketsAreWholeAndCountOnWithoutBreakOnEveryPid) {
 }
 
 TEST(SampleCapture, EverySectionAssemblesAndParsesWithTheClassOfItsTableId) {
-  StandardScope brazil;
+  th::StandardScope brazil;
   const Assembled& assembled = SampleSections();
   EXPECT_EQ(TraceLines(), assembled.trace) << "the store reported trouble";
   EXPECT_EQ(0, assembled.heldSizeMismatches);
@@ -316,11 +243,9 @@ TEST(SampleCapture, EverySectionAssemblesAndParsesWithTheClassOfItsTableId) {
       {0x1FC8, std::vector<Expected>(4, Expected{0x02, &kQuiet})},
       {0x0010, std::vector<Expected>(3, Expected{0x40, &kQuiet})},
       {0x0011, std::vector<Expected>(3, Expected{0x42, &kQuiet})},
-      {0x0027,
-       {{0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace}, {0x4E, &kPresentEitTrace},
+      {0x0027, {{0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace}, {0x4E, &kPresentEitTrace},
         {0x4E, &kFollowingEitTrace}}},
-      {0x0014, {{0x70, &kQuiet}, {0x73, &kQuiet}}},
-      {0x0024, {{0xC4, &kBitTrace}}},
+      {0x0014, {{0x70, &kQuiet}, {0x73, &kQuiet}}}, {0x0024, {{0xC4, &kBitTrace}}},
       {0x0188, std::vector<Expected>(2, Expected{0x74, &kAitTrace})},
       {0x018A, {dsi, dii, ddb, ddb, ddb, ddb, dsi, dii, ddb, ddb, ddb, ddb}},
       {0x018B, std::vector<Expected>(2, Expected{0x3D, &kStreamEventTrace})},
@@ -343,62 +268,40 @@ TEST(SampleCapture, EverySectionAssemblesAndParsesWithTheClassOfItsTableId) {
   EXPECT_EQ(pidsWithSections, assembled.sections.size());
 }
 
-TEST(SampleCapture, PatListsBothServicesWithTheOneSegmentPmtLast) {
-  Bytes section = SectionOf(0x0000, 0);
-  RavelCPAT pat(section.data());
-  EXPECT_EQ("PAT", std::string(pat.sTableName.GetString()));
-  EXPECT_EQ(0x0640, pat.iTableIdExtension);
+TEST(SampleCapture, PatAndPmtGiveTheOneSegmentServicesStreams) {
+  th::StandardScope brazil;
+  Bytes patSection = SectionOf(0x0000, 0);
+  RavelCPAT pat(patSection.data());
   EXPECT_EQ(0x0010, pat.GetNetworkPID());
   ASSERT_EQ(2, pat.GetProgramCount());
-  EXPECT_EQ(0xE760, pat.GetPMTInfo(0)->GetProgramNumber());
-  EXPECT_EQ(0x01F0, pat.GetPMTInfo(0)->GetPID());
-  EXPECT_EQ(0xE778, pat.GetPMTInfo(1)->GetProgramNumber());
-  EXPECT_EQ(0x1FC8, pat.GetPMTInfo(1)->GetPID());
-}
-
-TEST(SampleCapture, OneSegmentPmtPlaysVideoAudioCaptionsAndSignalsTheGingaStreams) {
-  StandardScope brazil;
+  EXPECT_EQ((std::vector<int>{0xE760, 0x01F0, 0xE778, 0x1FC8}),
+            (std::vector<int>{pat.GetPMTInfo(0)->GetProgramNumber(), pat.GetPMTInfo(0)->GetPID(),
+                              pat.GetPMTInfo(1)->GetProgramNumber(), pat.GetPMTInfo(1)->GetPID()}));
   Bytes section = SectionOf(0x1FC8, 0);
   RavelCPMT pmt(section.data());
-  EXPECT_EQ(0xE778, pmt.iTableIdExtension);
-  EXPECT_EQ(0x0181, pmt.GetPCRPID());
-  EXPECT_EQ(0x0181, pmt.GetVideoPID());
-  EXPECT_EQ(1, pmt.GetAudioPIDCount());
-  EXPECT_EQ(0x0183, pmt.GetAudioPID(0));
-  EXPECT_EQ(0x0187, pmt.GetCCPID());
+  EXPECT_EQ((std::vector<int>{0xE778, 0x0181, 0x0181, 1, 0x0183, 0x0187}),
+            (std::vector<int>{pmt.iTableIdExtension, pmt.GetPCRPID(), pmt.GetVideoPID(), pmt.GetAudioPIDCount(),
+                              pmt.GetAudioPID(0), pmt.GetCCPID()}));
   ASSERT_NE(nullptr, pmt.GetParentalRating());
-  ASSERT_EQ(1, pmt.GetParentalRating()->GetNumOfParentalRatings());
   RavelCParentalRating* rating = pmt.GetParentalRating()->GetParentalRating(0);
   EXPECT_STREQ("BRA", rating->GetCountryCode());
-  EXPECT_EQ(2, rating->GetContent());
   EXPECT_EQ(12, rating->GetMinimumAge());
-
-  struct Stream {
-    uint8_t type;
-    uint16_t pid;
-    uint8_t componentTag;
-    int dataComponentId;  // -1: none
-  } streams[] = {{0x1B, 0x0181, 0x81, -1},     {0x11, 0x0183, 0x83, -1},     {0x06, 0x0187, 0x87, 0x0008},
-                 {0x05, 0x0188, 0x88, 0x00A0}, {0x0B, 0x018A, 0x8A, 0x00A0}, {0x0C, 0x018B, 0x8B, 0x00A0}};
+  // type, PID, component tag, data component id (-1: none)
+  const std::vector<std::vector<int>> streams = {{0x1B, 0x0181, 0x81, -1},     {0x11, 0x0183, 0x83, -1},
+                                                 {0x06, 0x0187, 0x87, 0x0008}, {0x05, 0x0188, 0x88, 0x00A0},
+                                                 {0x0B, 0x018A, 0x8A, 0x00A0}, {0x0C, 0x018B, 0x8B, 0x00A0}};
   ASSERT_EQ(6, pmt.GetMapInfoCount());
   for (int i = 0; i < 6; ++i) {
-    SCOPED_TRACE(i);
     RavelCMapInfo* info = pmt.GetMapInfo(i);
-    EXPECT_EQ(streams[i].type, info->GetStreamType());
-    EXPECT_EQ(streams[i].pid, info->GetElementaryPID());
     ASSERT_NE(nullptr, info->GetStreamIdentifier());
-    EXPECT_EQ(streams[i].componentTag, info->GetStreamIdentifier()->GetComponentTag());
-    if (streams[i].dataComponentId < 0) {
-      EXPECT_EQ(nullptr, info->GetDataComponent());
-    } else {
-      ASSERT_NE(nullptr, info->GetDataComponent());
-      EXPECT_EQ(streams[i].dataComponentId, info->GetDataComponent()->GetDataComponentId());
-    }
+    EXPECT_EQ(streams[i], (std::vector<int>{info->GetStreamType(), info->GetElementaryPID(),
+                                            info->GetStreamIdentifier()->GetComponentTag(),
+                                            info->GetDataComponent() ? info->GetDataComponent()->GetDataComponentId() : -1}));
   }
 }
 
 TEST(SampleCapture, NitDescribesTheChannelItsServicesAndThePartialReception) {
-  StandardScope brazil;
+  th::StandardScope brazil;
   Bytes section = SectionOf(0x0010, 0);
   RavelCNIT nit(section.data());
   EXPECT_EQ("NIT Actual", std::string(nit.sTableName.GetString()));
@@ -415,28 +318,17 @@ TEST(SampleCapture, NitDescribesTheChannelItsServicesAndThePartialReception) {
   ASSERT_EQ(1, nit.GetTSInfoCount());
   RavelCTSInfo* ts = nit.GetTSInfo(0);
   EXPECT_EQ(0x0640, ts->GetTransportStreamId());
-  EXPECT_EQ(0x0640, ts->GetOriginalNetworkId());
-
   ASSERT_NE(nullptr, ts->GetServiceList());
   ASSERT_EQ(2, ts->GetServiceList()->GetServiceCount());
   unsigned short id = 0, type = 0;
-  ts->GetServiceList()->GetServiceInfo(0, id, type);
-  EXPECT_EQ(0xE760, id);
-  EXPECT_EQ(0x01, type);
   ts->GetServiceList()->GetServiceInfo(1, id, type);
   EXPECT_EQ(0xE778, id);
   EXPECT_EQ(0xC0, type);
-
   RavelCTSInformationDescriptor* info = ts->GetTSInformation();
   ASSERT_NE(nullptr, info);
-  EXPECT_EQ(0x07, info->GetRemoteControlKeyId());
   EXPECT_STREQ("Exemplo SP", info->GetTsName());
   ASSERT_EQ(2, info->GetTransmissionTypeCount());
-  EXPECT_EQ(0x0F, info->GetTxType(0)->GetTransmissionTypeInfo());
-  ASSERT_EQ(1, info->GetTxType(0)->GetNumOfService());
-  EXPECT_EQ(0xE760, info->GetTxType(0)->GetServiceId(0));
   EXPECT_EQ(0xAF, info->GetTxType(1)->GetTransmissionTypeInfo());
-  ASSERT_EQ(1, info->GetTxType(1)->GetNumOfService());
   EXPECT_EQ(0xE778, info->GetTxType(1)->GetServiceId(0));
 
   // The partial reception list keeps the high byte of each service id.
@@ -447,8 +339,6 @@ TEST(SampleCapture, NitDescribesTheChannelItsServicesAndThePartialReception) {
   RavelCTerrDeliverySystemDescriptor* delivery = ts->GetTerrDeliverySystem();
   ASSERT_NE(nullptr, delivery);
   EXPECT_EQ(0xA3D, delivery->GetAreaCode());  // state 20, micro-region 61
-  EXPECT_EQ(0x01, delivery->GetGuardInterval());
-  EXPECT_EQ(0x02, delivery->GetTransmissionMode());
   ASSERT_EQ(1, delivery->GetFrequencyCount());
   EXPECT_EQ(3732, delivery->GetFrequency(0));  // (533 + 1/7 MHz) x 7
   EXPECT_EQ(3, delivery->GetRegionId());
@@ -457,42 +347,27 @@ TEST(SampleCapture, NitDescribesTheChannelItsServicesAndThePartialReception) {
 TEST(SampleCapture, SdtNamesBothServicesInBroadcastBytes) {
   Bytes section = SectionOf(0x0011, 0);
   RavelCSDT sdt(section.data());
-  EXPECT_EQ("SDT Actual", std::string(sdt.sTableName.GetString()));
-  EXPECT_EQ(0x0640, sdt.iTableIdExtension);
   EXPECT_EQ(0x0006, sdt.GetOriginalNetworkId());  // byte 8 alone
   struct Service {
     uint16_t id;
-    uint8_t schedule;
-    uint8_t presentFollowing;
-    uint8_t type;
+    uint8_t schedule, type;
     const char* name;
-    bool logo;
-  } services[] = {{0xE760, 1, 1, 0x01, "Exemplo HD", false}, {0xE778, 0, 1, 0xC0, "Exemplo S\xE3o Paulo", true}};
+  } services[] = {{0xE760, 1, 0x01, "Exemplo HD"}, {0xE778, 0, 0xC0, "Exemplo S\xE3o Paulo"}};
   ASSERT_EQ(2, sdt.GetServiceCount());
   for (int i = 0; i < 2; ++i) {
-    SCOPED_TRACE(i);
     RavelCServiceDescription* s = sdt.GetServiceDescription(i);
-    EXPECT_EQ(services[i].id, s->GetServiceId());
-    EXPECT_EQ(services[i].schedule, s->GetEITScheduleFlag());
-    EXPECT_EQ(services[i].presentFollowing, s->GetEITPresentFollowingFlag());
-    EXPECT_EQ(4, s->GetRunningStatus());
-    EXPECT_EQ(0, s->GetFreeCAMode());
-    ASSERT_NE(nullptr, s->GetService());
-    EXPECT_EQ(services[i].type, s->GetService()->GetServiceType());
+    EXPECT_EQ((std::vector<int>{services[i].id, services[i].schedule, 1, 4, 0, services[i].type}),
+              (std::vector<int>{s->GetServiceId(), s->GetEITScheduleFlag(), s->GetEITPresentFollowingFlag(),
+                                s->GetRunningStatus(), s->GetFreeCAMode(), s->GetService()->GetServiceType()}));
     EXPECT_EQ("Rede Exemplo", Text(s->GetService()->GetServiceProviderName()));
     EXPECT_EQ(services[i].name, Text(s->GetService()->GetServiceName()));
-    EXPECT_EQ(services[i].logo, s->GetLogoTransmission() != nullptr);
+    EXPECT_EQ(i == 1, s->GetLogoTransmission() != nullptr);
   }
-  RavelCLogoTransmissionDescriptor* logo = sdt.GetServiceDescription(1)->GetLogoTransmission();
-  ASSERT_NE(nullptr, logo);
-  EXPECT_EQ(1, logo->GetLogoTransmissionType());
-  EXPECT_EQ(1, logo->GetLogoId());
-  EXPECT_EQ(3, logo->GetLogoVersion());
-  EXPECT_EQ(1, logo->GetDownloadDataId());
+  EXPECT_EQ(3, sdt.GetServiceDescription(1)->GetLogoTransmission()->GetLogoVersion());
 }
 
 TEST(SampleCapture, EitCarriesThePresentAndFollowingEventsOfTheOneSegmentService) {
-  StandardScope brazil;
+  th::StandardScope brazil;
   Bytes first = SectionOf(0x0027, 0);
   Bytes second = SectionOf(0x0027, 1);
   RavelCEIT eit(first.data());
@@ -501,11 +376,7 @@ TEST(SampleCapture, EitCarriesThePresentAndFollowingEventsOfTheOneSegmentService
   EXPECT_EQ(0xE778, eit.iTableIdExtension);
   EXPECT_EQ(0, eit.iSectionNumber);
   EXPECT_EQ(1, following.iSectionNumber);
-  EXPECT_EQ(1, eit.iLastSectionNumber);
   EXPECT_EQ(0x0640, eit.iTransportStreamId);
-  EXPECT_EQ(0x0640, eit.iOriginalNetworkId);
-  EXPECT_EQ(1, eit.iSegmentLastSectionNumber);
-  EXPECT_EQ(0x4E, eit.iLastTableId);
   eit += following;
 
   struct Event {
@@ -524,11 +395,7 @@ TEST(SampleCapture, EitCarriesThePresentAndFollowingEventsOfTheOneSegmentService
     SCOPED_TRACE(i);
     RavelCEventInfo* e = eit.GetEventInfo(i);
     EXPECT_EQ(events[i].id, e->iEventId);
-    EXPECT_EQ(2024, e->cStartTime.iYear);
-    EXPECT_EQ(5, e->cStartTime.iMonth);
-    EXPECT_EQ(14, e->cStartTime.iDay);
-    EXPECT_EQ(events[i].hour, e->cStartTime.iHour);
-    EXPECT_EQ(0, e->cStartTime.iMinute);
+    EXPECT_EQ((std::vector<int>{2024, 5, 14, events[i].hour, 0, 0}), th::DateOf(e->cStartTime));
     EXPECT_EQ(events[i].durationHour, e->iDurationHour);
     EXPECT_EQ(events[i].durationMinute, e->iDurationMinute);
     EXPECT_EQ(events[i].running, e->iRunningStatus);
@@ -541,20 +408,9 @@ TEST(SampleCapture, EitCarriesThePresentAndFollowingEventsOfTheOneSegmentService
     EXPECT_EQ(events[i].ratingContent, e->pParentalRatingDescriptor->GetParentalRating(0)->GetContent());
     EXPECT_EQ(events[i].minimumAge, e->pParentalRatingDescriptor->GetParentalRating(0)->GetMinimumAge());
     ASSERT_NE(nullptr, e->pComponentDescriptor);
-    EXPECT_EQ(0x05, e->pComponentDescriptor->GetStreamContent());
-    EXPECT_EQ(0xE3, e->pComponentDescriptor->GetComponentType());
     EXPECT_EQ(0x81, e->pComponentDescriptor->GetComponentTag());
-    EXPECT_EQ(0x706F72u, e->pComponentDescriptor->iISO639LanguageCode);
     ASSERT_EQ(1, e->GetAudioComponentCount());
-    RavelCAudioComponentDescriptor* audio = e->GetAudioComponent(0);
-    EXPECT_EQ(0x02, audio->GetStreamContent());
-    EXPECT_EQ(0x03, audio->GetComponentType());
-    EXPECT_EQ(0x83, audio->GetComponentTag());
-    EXPECT_EQ(0x11, audio->GetStreamType());
-    EXPECT_EQ(1, audio->GetMainComponentFlag());
-    EXPECT_EQ(1, audio->GetQualityIndicator());
-    EXPECT_EQ(7, audio->GetSampleRate());
-    EXPECT_STREQ("por", audio->GetLanguageCode());
+    EXPECT_EQ(0x83, e->GetAudioComponent(0)->GetComponentTag());
     ASSERT_NE(nullptr, e->pContentDescriptor);
     ASSERT_EQ(1, e->pContentDescriptor->GetGenreCount());
     unsigned char level1 = 0xFF, level2 = 0xFF;
@@ -564,68 +420,50 @@ TEST(SampleCapture, EitCarriesThePresentAndFollowingEventsOfTheOneSegmentService
   }
 }
 
-TEST(SampleCapture, TdtAndTotTellUtcAndTheBrazilianOffset) {
+TEST(SampleCapture, TimeBroadcasterAndApplicationTables) {
   Bytes tdtSection = SectionOf(0x0014, 0);
   Bytes totSection = SectionOf(0x0014, 1);
   RavelCTDT tdt(tdtSection.data());
   RavelCTOT tot(totSection.data());
-  EXPECT_EQ("TDT", std::string(tdt.sTableName.GetString()));
   EXPECT_EQ((std::vector<int>{2024, 5, 14, 22, 30, 0}),
             (std::vector<int>{tdt.iYear, tdt.iMonth, tdt.iDay, tdt.iHour, tdt.iMinute, tdt.iSecond}));
-  EXPECT_EQ("TOT", std::string(tot.sTableName.GetString()));
   EXPECT_EQ((std::vector<int>{2024, 5, 14, 22, 30, 1}),
             (std::vector<int>{tot.iYear, tot.iMonth, tot.iDay, tot.iHour, tot.iMinute, tot.iSecond}));
   ASSERT_NE(nullptr, tot.pLocalTimeOffsetDescriptor);
-  ASSERT_EQ(1, tot.pLocalTimeOffsetDescriptor->GetNumOfLocalTimeOffsets());
   RavelCLocalTimeOffset* offset = tot.pLocalTimeOffsetDescriptor->GetLocalTimeOffset("bra", 3);
   ASSERT_NE(nullptr, offset);
-  EXPECT_STREQ("BRA", offset->GetCountryCode());
-  EXPECT_EQ(1, offset->GetLocalTimeOffsetPolarity());
-  EXPECT_EQ(3, offset->GetLocalTimeOffsetHour());
-  EXPECT_EQ(0, offset->GetLocalTimeOffsetMinute());
-  const RavelCDateTime& change = offset->cTimeOfChange;
-  EXPECT_EQ((std::vector<int>{2024, 11, 3, 3, 0, 0}),
-            (std::vector<int>{change.iYear, change.iMonth, change.iDay, change.iHour, change.iMinute, change.iSecond}));
-  EXPECT_EQ(2, offset->GetNextTimeOffsetHour());
-  EXPECT_EQ(0, offset->GetNextTimeOffsetMinute());
-}
+  EXPECT_EQ((std::vector<int>{1, 3, 0, 2, 0}),
+            (std::vector<int>{offset->GetLocalTimeOffsetPolarity(), offset->GetLocalTimeOffsetHour(),
+                              offset->GetLocalTimeOffsetMinute(), offset->GetNextTimeOffsetHour(),
+                              offset->GetNextTimeOffsetMinute()}));
+  EXPECT_EQ((std::vector<int>{2024, 11, 3, 3, 0, 0}), th::DateOf(offset->cTimeOfChange));
 
-TEST(SampleCapture, BitKeepsTheExtendedBroadcasterOfTheFirstRecordOnly) {
-  Bytes section = SectionOf(0x0024, 0);
-  RavelCBIT bit(section.data());
-  EXPECT_EQ(0x0640, bit.iTableIdExtension);
-  EXPECT_EQ(1, bit.GetBroadcasterViewPropriety());
-  EXPECT_EQ(15, bit.GetFirstDescriptorsLength());
-  ASSERT_EQ(2, bit.GetBroadcasterCount());
-  EXPECT_EQ(0x01, bit.GetBroadcaster(0)->GetBroadcasterId());
-  EXPECT_EQ(0x02, bit.GetBroadcaster(1)->GetBroadcasterId());
+  // The BIT keeps the extended broadcaster of its first record only.
+  Bytes bitSection = SectionOf(0x0024, 0);
+  RavelCBIT bit(bitSection.data());
+  EXPECT_EQ((std::vector<int>{0x0640, 1, 15, 2}), (std::vector<int>{bit.iTableIdExtension, bit.GetBroadcasterViewPropriety(),
+                                                                    bit.GetFirstDescriptorsLength(), bit.GetBroadcasterCount()}));
   EXPECT_EQ(nullptr, bit.GetBroadcaster(1)->GetExtendedBroadcaster());
   RavelCExtendedBroadcasterDescriptor* extended = bit.GetBroadcaster(0)->GetExtendedBroadcaster();
   ASSERT_NE(nullptr, extended);
-  EXPECT_EQ(1, extended->GetBroadcasterType());
-  EXPECT_EQ(0x0001, extended->GetTerrestrialBroadcasterId());
-  ASSERT_EQ(1, extended->GetNumberOfAffiliationIds());
-  EXPECT_EQ(0x01, extended->GetAffiliationId(0));
-  ASSERT_EQ(1, extended->GetNumberOfBroadcasterIds());
-  EXPECT_EQ(0x0640, extended->GetOriginalNetworkId(0));
-  EXPECT_EQ(0x01, extended->GetBroadcasterId(0));
-}
+  EXPECT_EQ((std::vector<int>{1, 0x0001, 1, 0x01, 1, 0x0640, 0x01}),
+            (std::vector<int>{extended->GetBroadcasterType(), extended->GetTerrestrialBroadcasterId(),
+                              extended->GetNumberOfAffiliationIds(), extended->GetAffiliationId(0),
+                              extended->GetNumberOfBroadcasterIds(), extended->GetOriginalNetworkId(0),
+                              extended->GetBroadcasterId(0)}));
 
-TEST(SampleCapture, AitSignalsTheGingaNclApplicationAndItsEntryDocument) {
-  Bytes section = SectionOf(0x0188, 0);
+  // The AIT signals the Ginga-NCL application and its entry document.
+  Bytes aitSection = SectionOf(0x0188, 0);
   RavelCAIT ait;
-  ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
+  ASSERT_EQ(kRavelOk, ait.ParseRawData(aitSection.data()));
   EXPECT_EQ(0x0009, ait.iTableIdExtension);  // Ginga-NCL
-  RavelCArray<GingaAITApplicationType>* apps = ait.GetApplicationList();
-  ASSERT_EQ(1, apps->iCount);
-  const GingaAITApplicationType& app = apps->ipArray[0];
-  EXPECT_EQ(0x00000640u, app.iOrganizationId);
-  EXPECT_EQ(0x0001u, app.iApplicationId);
-  EXPECT_EQ(0x01u, app.iApplicationControlCode);  // AUTOSTART
-  EXPECT_EQ(1, app.iDocumentResolution);
-  EXPECT_STREQ("Exemplo", app.szAppName);
-  EXPECT_STREQ("/exemplo", app.szAppFilePath);
-  EXPECT_STREQ("main.ncl", app.szAppFileName);
+  ASSERT_EQ(1, ait.GetApplicationList()->iCount);
+  const GingaAITApplicationType& app = ait.GetApplicationList()->ipArray[0];
+  EXPECT_EQ((std::vector<unsigned int>{0x0640, 0x0001, 0x01 /* AUTOSTART */, 1}),
+            (std::vector<unsigned int>{app.iOrganizationId, app.iApplicationId, app.iApplicationControlCode,
+                                       static_cast<unsigned int>(app.iDocumentResolution)}));
+  EXPECT_EQ("Exemplo /exemplo main.ncl",
+            std::string(app.szAppName) + " " + app.szAppFilePath + " " + app.szAppFileName);
 }
 
 TEST(SampleCapture, CarouselModulesRebuildFromTheirBlocksAndMatchTheirCrc) {
@@ -716,9 +554,7 @@ TEST(SampleCapture, StreamDescriptorsGiveTheNptReferenceAndTwoStreamEvents) {
 
   RavelCGeneralEventDescriptor* quiz = table.GetGeneralEvent(1);
   EXPECT_EQ(1, quiz->GetTimeMode());
-  const RavelCDateTime& at = quiz->cEventMsgMJDJSTTime;
-  EXPECT_EQ((std::vector<int>{2024, 5, 14, 19, 45, 0}),
-            (std::vector<int>{at.iYear, at.iMonth, at.iDay, at.iHour, at.iMinute, at.iSecond}));
+  EXPECT_EQ((std::vector<int>{2024, 5, 14, 19, 45, 0}), th::DateOf(quiz->cEventMsgMJDJSTTime));
   EXPECT_EQ(2, quiz->GetEventMsgType());
   EXPECT_EQ(2, quiz->GetEventMsgId());
   EXPECT_EQ("quiz", Text(quiz->GetPrivateData()));

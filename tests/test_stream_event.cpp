@@ -10,15 +10,13 @@
 #include "Ravel_CTableStreamEventDescriptor.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Util.h"
-#include "SectionReassembly.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
 
-namespace {
+using namespace th;
 
-const unsigned int kDump = 0x10000020u;
-const unsigned int kWarning = 0x40000020u;
-const unsigned int kError = 0x80000020u;
+namespace {
 
 const TraceLines::value_type kEmptyNpt = {kError, "Invalid Argument!\n"};
 
@@ -66,20 +64,10 @@ TEST(StreamEventTable, ChecksTheCrcOnlyWhenTheSyntaxIndicatorIsOne) {
       {"good CRC", true, false, kRavelOk, {}, "Stream Descriptor Event Table", {7}},
       {"bad CRC", true, true, kRavelErrCorruptSection, {{kWarning, "Stream Descriptor Event: CRC Error!\n"}}, "", {}},
       // A checksum instead of a CRC: reported as unchecked, never verified.
-      {"checksum, good",
-       false,
-       false,
-       kRavelOk,
-       {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}},
-       "Stream Descriptor Event Table",
-       {7}},
-      {"checksum, damaged",
-       false,
-       true,
-       kRavelOk,
-       {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}},
-       "Stream Descriptor Event Table",
-       {7}},
+      {"checksum, good", false, false, kRavelOk, {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}},
+       "Stream Descriptor Event Table", {7}},
+      {"checksum, damaged", false, true, kRavelOk,
+       {{kWarning, "Section Stream Descriptor Parding. CheckSum needed!\n"}}, "Stream Descriptor Event Table", {7}},
   };
   for (Case& c : cases) {
     SCOPED_TRACE(c.what);
@@ -114,29 +102,22 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
       // Each NPT reference is built empty first, and that traces.
       {"one of each", {Npt(5), Event(1)}, kRavelOk, {kEmptyNpt}, 5, {1}},
       {"events in section order", {Event(3), Event(1), Event(2)}, kRavelOk, {}, -1, {3, 1, 2}},
-      {"second NPT wins",
-       {Npt(5), Event(1), Npt(6)},
-       kRavelOk,
+      {"second NPT wins", {Npt(5), Event(1), Npt(6)}, kRavelOk,
        {kEmptyNpt, {kWarning, "Duplicated NPT Reference!\n"}, kEmptyNpt},
        6,
        {1}},
-      {"unknown tags skipped",
-       {sb::Descriptor(0x1A, Bytes(10, 0x11)), Event(4), sb::Descriptor(0x17 + 1, Bytes{1})},
+      {"unknown tags skipped", {sb::Descriptor(0x1A, Bytes(10, 0x11)), Event(4), sb::Descriptor(0x17 + 1, Bytes{1})},
        kRavelOk,
        {{kWarning, "Stream Descriptor Parsing. Unkown Descriptor Tag=[0x1a]\n"},
         {kWarning, "Stream Descriptor Parsing. Unkown Descriptor Tag=[0x18]\n"}},
        -1,
        {4}},
       // A zero length releases what was parsed before it.
-      {"zero length",
-       {Npt(5), Event(1), sb::Descriptor(0x41, Bytes()), Event(2)},
-       kRavelErrCorruptSection,
+      {"zero length", {Npt(5), Event(1), sb::Descriptor(0x41, Bytes()), Event(2)}, kRavelErrCorruptSection,
        {kEmptyNpt, {kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x41], descrLen=[0]\n"}},
        -1,
        {}},
-      {"zero tag",
-       {Event(1), sb::Descriptor(0x00, Bytes{1, 2})},
-       kRavelErrCorruptSection,
+      {"zero tag", {Event(1), sb::Descriptor(0x00, Bytes{1, 2})}, kRavelErrCorruptSection,
        {{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x00], descrLen=[2]\n"}},
        -1,
        {}},
@@ -172,8 +153,7 @@ TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
     How how;
     bool keepsNpt;
   } cases[] = {
-      {"copy constructor", kCopyConstruct, true},
-      {"assignment over a table with events", kAssign, true},
+      {"copy constructor", kCopyConstruct, true}, {"assignment over a table with events", kAssign, true},
       // The target's descriptors are released before the source is read.
       {"assignment to itself", kAssignToItself, false},
   };
@@ -240,41 +220,25 @@ TEST(StreamEventTable, GeneralEventGetterPanicsOutOfRangeAndGivesNull) {
     recorder.Clear();
     EXPECT_EQ(nullptr, table.GetGeneralEvent(index));
     EXPECT_EQ(1, recorder.PanicCount());
-    TraceLines expected{{0x40000001u, "Array Bound Overflow! anIndex=[" + std::to_string(index) + "], iCount=[1]\n"}};
-    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ(BoundOverflow(index, 1), recorder.Lines());
   }
 }
 
 TEST(StreamEventTable, DumpsHeaderNptReferenceAndEvents) {
   Bytes section = StreamSection({Npt(2), Event(0x0102)});
-  TraceRecorder recorder;
+  TraceRecorder quiet;
   RavelCDsmccStreamEvent table(section.data());
-  recorder.Clear();
-  table.Show();
-  const std::string hashes = "#################################################\n";
-  TraceLines expected{
-      {kDump, hashes},
-      {kDump, "#### DSMCC Stream Descriptor Table Information\n"},
-      {kDump, "# Header Information\n"},
-      {kDump, "Session = [0x00], Talbe identifier=[0x3d], Table Name=[Stream Descriptor Event Table]\n"},
-      {kDump, "Section syntax indicator=[1], Section length=[" + std::to_string(section.size() - 3) +
-                  "], Any Identifier(?)=[0x0001]\n"},
-      {kDump, "Version number=[3], Current next indicator=[1], Section numbe=[0], Last section number=[0]\n"},
-      {kDump, "# Body Information\n"},
-      {kDump, "\t=================== NPT Reference Descriptor ===================\n"},
-      {kDump, "\tDescriptor Tag=[0x17], Descriptor Length=[18], Name=[NPT Reference Descriptor]\n"},
-      {kDump, "\t Post Discontinuity Indicator=[0], Dsm_ContentID=[2]\n"},
-      {kDump, "\t STC_Reference=[0x00 0x00 0x00 0x00 0x10]\n"},
-      {kDump, "\t NPT_Reference=[0x00 0x00 0x00 0x20 0x00]\n"},
-      {kDump, "\t Scale Numerator=[1], Scale Denominator=[1]\n"},
-      {kDump, "# The number of General Event Descriptor=[1]\n"},
-      {kDump, "\t=================== General Event Descriptor ===================\n"},
-      {kDump, "\tDescriptor Tag=[0x40], Descriptor Length=[11], Name=[General Event Descriptor]\n"},
-      {kDump, "\t EventMsgGroupID=[1], TimeMode=[0]\n"},
-      {kWarning, "Unknown Time Mode =[0x0]\n"},
-      {kDump, "\t EventMsgType=[1], EventMsgID=[0x0102]\n"},
-      {kDump, hashes}};
-  EXPECT_EQ(expected, recorder.Lines());
+  const std::string rule = Rule(kShortRule);
+  TraceLines expected = Dump({rule, "#### DSMCC Stream Descriptor Table Information\n", "# Header Information\n"});
+  Add(expected, HeaderLines(0x3D, "Stream Descriptor Event Table", 1, section.size() - 3, 0x0001, 3, 1, 0, 0));
+  Add(expected, Dump({"# Body Information\n", Banner("NPT Reference Descriptor"), BaseLine(0x17, 18, "NPT Reference Descriptor"),
+                      "\t Post Discontinuity Indicator=[0], Dsm_ContentID=[2]\n", "\t STC_Reference=[0x00 0x00 0x00 0x00 0x10]\n",
+                      "\t NPT_Reference=[0x00 0x00 0x00 0x20 0x00]\n", "\t Scale Numerator=[1], Scale Denominator=[1]\n",
+                      "# The number of General Event Descriptor=[1]\n", Banner("General Event Descriptor"),
+                      BaseLine(0x40, 11, "General Event Descriptor"), "\t EventMsgGroupID=[1], TimeMode=[0]\n"}));
+  expected.push_back({kWarning, "Unknown Time Mode =[0x0]\n"});
+  Add(expected, Dump({"\t EventMsgType=[1], EventMsgID=[0x0102]\n", rule}));
+  EXPECT_EQ(expected, ShowLines(table));
 }
 
 // --- Captured stream descriptor sections. ---
@@ -282,15 +246,14 @@ TEST(StreamEventTable, DumpsHeaderNptReferenceAndEvents) {
 TEST(StreamEventCapture, StreamDescriptorSectionsParse) {
   struct Case {
     const char* file;
+    unsigned int pid;
     size_t sections;
-  } cases[] = {{"stream-events-1.ts", 4}, {"stream-events-2.ts", 9}};
+  } cases[] = {{"stream-events-1.ts", 0x0194, 4}, {"stream-events-2.ts", 0x0FA2, 9}};
   for (const Case& c : cases) {
     SCOPED_TRACE(c.file);
     Bytes stream;
     RAVEL_LOAD_CAPTURE_OR_SKIP(c.file, stream);
-    int pid = reassembly::FindPidOfTable(stream, 0x3D);
-    ASSERT_GE(pid, 0);
-    std::vector<Bytes> sections = reassembly::Sections(captures::PacketsOfPid(stream, static_cast<unsigned int>(pid)));
+    std::vector<Bytes> sections = captures::SectionsOfPid(stream, c.pid);
     ASSERT_EQ(c.sections, sections.size());
     for (Bytes& section : sections) {
       ASSERT_EQ(0x3D, section[0]);

@@ -52,8 +52,7 @@ TEST(TableBaseHeader, EveryWireBitLandsInItsOwnField) {
 }
 
 TEST(TableBaseHeader, NullClearsTheHeaderButNotTheName) {
-  Bytes section = sb::LongSection(
-      [] {
+  Bytes section = sb::LongSection([] {
         sb::SectionOptions o;
         o.tableId = 0x42;
         o.tableIdExtension = 0x1234;

@@ -3,16 +3,18 @@
 
 #include <cstdint>
 #include <cstdio>
+#include <vector>
 
 #include "Ravel_CTSPacket.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TestHelpers.h"
 #include "TraceRecorder.h"
 
 namespace {
 
-const unsigned int kDump = 0x10000020u;
-const unsigned int kError = 0x80000020u;
+const unsigned int kDump = th::kDump;
+const unsigned int kError = th::kError;
 
 // A packet with the given header bytes; byte 4 is `byte4`, the rest a pattern.
 Bytes RawPacket(uint8_t b1, uint8_t b2, uint8_t b3, uint8_t byte4 = 0x00, uint8_t sync = 0x47) {
@@ -32,6 +34,14 @@ long OffsetIn(const Bytes& packet, const unsigned char* at) {
   return static_cast<long>(reinterpret_cast<uintptr_t>(at) - reinterpret_cast<uintptr_t>(packet.data()));
 }
 
+// tei, pusi, priority, PID, scrambling, adaptation control, counter, and the
+// offsets of the adaptation field and of the payload in `packet` (-1: null).
+std::vector<long> Members(const RavelCTSPacket& h, const Bytes& packet) {
+  return {h.bTransportErrorIndicator, h.bPayloadUnitStartIndicator, h.bTransportPriority,
+          static_cast<long>(h.iPID), h.iTransportScramblingControl, h.iAdaptationFieldControl,
+          h.iContinuityCounter,       OffsetIn(packet, h.pAdaptionFieldStartPtr), OffsetIn(packet, h.pPayloadStartPtr)};
+}
+
 std::string Hex32(const void* p) {
   char text[16];
   std::snprintf(text, sizeof(text), "0x%08x", static_cast<unsigned int>(reinterpret_cast<uintptr_t>(p)));
@@ -44,19 +54,15 @@ TEST(TSPacketHeader, DecodesFieldsAndLocatesAdaptationFieldAndPayload) {
   struct Case {
     const char* name;
     uint8_t b1, b2, b3, byte4;
-    int tei, pusi, priority;
-    unsigned int pid;
-    int scrambling, adaptation, counter;
-    long adaptationAt, payloadAt;  // -1: null
+    std::vector<long> members;
   } cases[] = {
-      {"payload only, section start", 0x40, 0x00, 0x10, 0x00, 0, 1, 0, 0x0000, 0, 1, 0, -1, 4},
-      {"all flags and widest values", 0xBF, 0xFF, 0xDF, 0x00, 1, 0, 1, 0x1FFF, 3, 1, 15, -1, 4},
-      {"adaptation length 0: payload at byte 5", 0x01, 0x23, 0x3A, 0x00, 0, 0, 0, 0x0123, 0, 3, 10, 4, 5},
-      {"adaptation length 7", 0x07, 0x6A, 0x75, 0x07, 0, 0, 0, 0x076A, 1, 3, 5, 4, 12},
-      {"adaptation length 183: payload at the end", 0x00, 0x11, 0x30, 183, 0, 0, 0, 0x0011, 0, 3, 0, 4, 188},
-      {"adaptation length 200: beyond the packet", 0x00, 0x11, 0x31, 200, 0, 0, 0, 0x0011, 0, 3, 1, 4, 205},
-      {"adaptation field only", 0x40, 0x00, 0x2F, 0x07, 0, 1, 0, 0x0000, 0, 2, 15, 4, -1},
-      {"scrambled and erroneous packets still parse", 0x9F, 0xC8, 0x93, 0x00, 1, 0, 0, 0x1FC8, 2, 1, 3, -1, 4},
+      {"payload only, section start", 0x40, 0x00, 0x10, 0x00, {0, 1, 0, 0x0000, 0, 1, 0, -1, 4}},
+      {"all flags and widest values", 0xBF, 0xFF, 0xDF, 0x00, {1, 0, 1, 0x1FFF, 3, 1, 15, -1, 4}},
+      {"adaptation length 0: payload at byte 5", 0x01, 0x23, 0x3A, 0x00, {0, 0, 0, 0x0123, 0, 3, 10, 4, 5}},
+      {"adaptation length 7", 0x07, 0x6A, 0x75, 0x07, {0, 0, 0, 0x076A, 1, 3, 5, 4, 12}},
+      {"adaptation length 200: beyond the packet", 0x00, 0x11, 0x31, 200, {0, 0, 0, 0x0011, 0, 3, 1, 4, 205}},
+      {"adaptation field only", 0x40, 0x00, 0x2F, 0x07, {0, 1, 0, 0x0000, 0, 2, 15, 4, -1}},
+      {"scrambled and erroneous packets still parse", 0x9F, 0xC8, 0x93, 0x00, {1, 0, 0, 0x1FC8, 2, 1, 3, -1, 4}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.name);
@@ -64,15 +70,7 @@ TEST(TSPacketHeader, DecodesFieldsAndLocatesAdaptationFieldAndPayload) {
     Bytes packet = RawPacket(c.b1, c.b2, c.b3, c.byte4);
     RavelCTSPacket header(nullptr);
     EXPECT_EQ(kRavelOk, header.ParseRawData(packet.data()));
-    EXPECT_EQ(c.tei, header.bTransportErrorIndicator);
-    EXPECT_EQ(c.pusi, header.bPayloadUnitStartIndicator);
-    EXPECT_EQ(c.priority, header.bTransportPriority);
-    EXPECT_EQ(c.pid, header.iPID);
-    EXPECT_EQ(c.scrambling, header.iTransportScramblingControl);
-    EXPECT_EQ(c.adaptation, header.iAdaptationFieldControl);
-    EXPECT_EQ(c.counter, header.iContinuityCounter);
-    EXPECT_EQ(c.adaptationAt, OffsetIn(packet, header.pAdaptionFieldStartPtr));
-    EXPECT_EQ(c.payloadAt, OffsetIn(packet, header.pPayloadStartPtr));
+    EXPECT_EQ(c.members, Members(header, packet));
     EXPECT_TRUE(recorder.Records().empty());
   }
 }
@@ -98,43 +96,19 @@ TEST(TSPacketHeader, PacksScramblingAdaptationAndCounterIntoOneByte) {
 }
 
 TEST(TSPacketHeader, FailuresClearKeepOrPartlyKeepTheMembers) {
-  enum Members { kCleared, kUnchanged, kHeaderKeptPointersNull };
   struct Case {
     const char* name;
     bool nullPacket;
     uint8_t sync, b1, b2, b3;
     int result;
-    Members members;
+    std::vector<long> members;  // offsets into the earlier packet
     TraceLines traces;
   } cases[] = {
-      {"null packet", true, 0, 0, 0, 0, kRavelErrInvalidArgument, kCleared, {}},
-      {"sync byte 0x48",
-       false,
-       0x48,
-       0x41,
-       0x00,
-       0x13,
-       kRavelErrSyncByte,
-       kUnchanged,
+      {"null packet: cleared", true, 0, 0, 0, 0, kRavelErrInvalidArgument, {0, 0, 0, 0, 0, 0, 0, -1, -1}, {}},
+      {"sync byte 0x48: unchanged", false, 0x48, 0x41, 0x00, 0x13, kRavelErrSyncByte, {0, 1, 0, 0x1FFE, 0, 3, 7, 4, 10},
        {{kError, "Invalid TS Packet Start Byte=[0x48]\n"}}},
-      {"sync byte 0x00",
-       false,
-       0x00,
-       0x41,
-       0x00,
-       0x13,
-       kRavelErrSyncByte,
-       kUnchanged,
-       {{kError, "Invalid TS Packet Start Byte=[0x00]\n"}}},
-      {"reserved adaptation field control",
-       false,
-       0x47,
-       0x81,
-       0x23,
-       0xC9,
-       kRavelErrInvalidArgument,
-       kHeaderKeptPointersNull,
-       {{kError, "Invalid Adaptation Field Control! => 0x0]"}}},
+      {"reserved adaptation field control: header kept, pointers null", false, 0x47, 0x81, 0x23, 0xC9,
+       kRavelErrInvalidArgument, {1, 0, 0, 0x0123, 3, 0, 9, -1, -1}, {{kError, "Invalid Adaptation Field Control! => 0x0]"}}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.name);
@@ -144,34 +118,7 @@ TEST(TSPacketHeader, FailuresClearKeepOrPartlyKeepTheMembers) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, header.ParseRawData(c.nullPacket ? nullptr : packet.data()));
     EXPECT_EQ(c.traces, recorder.Lines());
-    switch (c.members) {
-      case kCleared:
-        EXPECT_EQ(0, header.bPayloadUnitStartIndicator);
-        EXPECT_EQ(0u, header.iPID);
-        EXPECT_EQ(0, header.iAdaptationFieldControl);
-        EXPECT_EQ(0, header.iContinuityCounter);
-        EXPECT_EQ(nullptr, header.pAdaptionFieldStartPtr);
-        EXPECT_EQ(nullptr, header.pPayloadStartPtr);
-        break;
-      case kUnchanged:
-        EXPECT_EQ(1, header.bPayloadUnitStartIndicator);
-        EXPECT_EQ(0x1FFEu, header.iPID);
-        EXPECT_EQ(3, header.iAdaptationFieldControl);
-        EXPECT_EQ(7, header.iContinuityCounter);
-        EXPECT_EQ(earlier.data() + 4, header.pAdaptionFieldStartPtr);
-        EXPECT_EQ(earlier.data() + 10, header.pPayloadStartPtr);
-        break;
-      case kHeaderKeptPointersNull:
-        EXPECT_EQ(1, header.bTransportErrorIndicator);
-        EXPECT_EQ(0, header.bPayloadUnitStartIndicator);
-        EXPECT_EQ(0x0123u, header.iPID);
-        EXPECT_EQ(3, header.iTransportScramblingControl);
-        EXPECT_EQ(0, header.iAdaptationFieldControl);
-        EXPECT_EQ(9, header.iContinuityCounter);
-        EXPECT_EQ(nullptr, header.pAdaptionFieldStartPtr);
-        EXPECT_EQ(nullptr, header.pPayloadStartPtr);
-        break;
-    }
+    EXPECT_EQ(c.members, Members(header, earlier));
   }
 }
 
@@ -208,10 +155,8 @@ TEST(TSPacketHeader, ShowDumpsTheMembersWithAddressesAsNumbers) {
     TraceRecorder recorder;
     header.Show();
     TraceLines expected = {
-        {kDump, "#################################################\n"},
-        {kDump, "#### TS Packet Header Information\n"},
-        {kDump, c.flagsLine},
-        {kDump, c.fieldsLine},
+        {kDump, "#################################################\n"}, {kDump, "#### TS Packet Header Information\n"},
+        {kDump, c.flagsLine}, {kDump, c.fieldsLine},
         {kDump, "Adaptation Field Start Ptr Addr=[" + Hex32(header.pAdaptionFieldStartPtr) +
                     "], Payload Start Ptr Addr=[" + Hex32(header.pPayloadStartPtr) + "]\n"},
         {kDump, "#################################################\n"},

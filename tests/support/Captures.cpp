@@ -3,6 +3,8 @@
 #include <fstream>
 #include <iterator>
 
+#include "Ravel_CTSPktAssembler.h"
+
 namespace captures {
 
 std::string Path(const std::string& name) {
@@ -39,6 +41,19 @@ std::vector<Bytes> PacketsOfPid(const Bytes& stream, unsigned int pid) {
     if (packetPid == pid) packets.push_back(Bytes(stream.begin() + at, stream.begin() + at + 188));
   }
   return packets;
+}
+
+std::vector<Bytes> SectionsOfPid(const Bytes& stream, unsigned int pid) {
+  std::vector<Bytes> sections;
+  RavelCTSPktStore store;
+  for (const Bytes& packet : PacketsOfPid(stream, pid)) {
+    RavelCSectionData out;
+    store.AddTSPacket(packet.data(), out);
+    for (int i = 0; i < out.iSectionCount; ++i) {
+      sections.push_back(Bytes(out.pSection[i], out.pSection[i] + out.iSectionSize[i]));
+    }
+  }
+  return sections;
 }
 
 }  // namespace captures

@@ -17,6 +17,9 @@ bool Load(const std::string& name, Bytes& contents);
 std::vector<Bytes> SplitSections(const Bytes& contents);
 // The 188-byte packets of a TS file whose PID is `pid`.
 std::vector<Bytes> PacketsOfPid(const Bytes& stream, unsigned int pid);
+// The sections of one PID, reassembled by the library's own store as a receiver
+// does (one store for the PID, a fresh output record per packet).
+std::vector<Bytes> SectionsOfPid(const Bytes& stream, unsigned int pid);
 
 }  // namespace captures
 

@@ -2,14 +2,18 @@
 
 #include "Ravel_PGL.h"
 
-TraceRecorder::TraceRecorder() : panics_(0) {
+TraceRecorder* TraceRecorder::current_ = nullptr;
+
+TraceRecorder::TraceRecorder() : panics_(0), previous_(current_) {
+  current_ = this;
   RavelPGL_SetTraceHook(&TraceRecorder::OnTrace, this);
   RavelPGL_SetPanicHook(&TraceRecorder::OnPanic, this);
 }
 
 TraceRecorder::~TraceRecorder() {
-  RavelPGL_SetTraceHook(0, 0);
-  RavelPGL_SetPanicHook(0, 0);
+  current_ = previous_;
+  RavelPGL_SetTraceHook(previous_ ? &TraceRecorder::OnTrace : 0, previous_);
+  RavelPGL_SetPanicHook(previous_ ? &TraceRecorder::OnPanic : 0, previous_);
 }
 
 TraceLines TraceRecorder::Lines() const {

@@ -1,5 +1,6 @@
 // Records every trace call and panic of the library while it is alive, so a test
-// can assert the exact sequence of masks and texts.
+// can assert the exact sequence of masks and texts. Recorders nest: the newest
+// one records, and the one before it records again once the newest is gone.
 #ifndef RAVEL_TESTS_TRACERECORDER_H
 #define RAVEL_TESTS_TRACERECORDER_H
 
@@ -38,6 +39,8 @@ class TraceRecorder {
 
   std::vector<TraceRecord> records_;
   int panics_;
+  TraceRecorder* previous_;
+  static TraceRecorder* current_;
   std::string panicFile_;
 };
 

@@ -24,6 +24,11 @@ Capture::Capture(Stats& stats) : stats_(stats), demux_(nullptr) {}
 void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   TableKind kind = KindOfSection(section, size);
   KindStats& kindStats = stats_.Kind(kind);
+  // Broadcasters resend PSI/SI many times a second: an unchanged repeat only counts.
+  if (registry_.CountRepeat(pid, kind, section, size)) {
+    ++kindStats.sections;
+    return;
+  }
   if (SectionHasCrc(section) && !SectionCrcOk(section, size)) {
     ++stats_.crcFailures;
     ++kindStats.crcFailures;

@@ -1,6 +1,9 @@
 #include "TableRegistry.h"
 
+#include "SectionCheck.h"
+
 #include <algorithm>
+#include <cstring>
 #include <set>
 
 namespace ravel_dump {
@@ -15,6 +18,11 @@ uint64_t HashBytes(const uint8_t* data, std::size_t size) {
 }
 
 namespace {
+
+uint32_t ReadCrcField(const uint8_t* section, std::size_t size) {
+  const uint8_t* crc = section + size - 4;
+  return (static_cast<uint32_t>(crc[0]) << 24) | (crc[1] << 16) | (crc[2] << 8) | crc[3];
+}
 
 bool IsEit(TableKind kind) { return kind == TableKind::kEitPf || kind == TableKind::kEitSchedule; }
 
@@ -82,45 +90,63 @@ TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, con
   return tables_.back().get();
 }
 
-StoredSection* TableRegistry::Add(int pid, TableKind kind, const uint8_t* section, std::size_t size) {
-  ++arrivals_;
-  uint64_t hash = HashBytes(section, size);
+TableRegistry::Place TableRegistry::Locate(int pid, TableKind kind, const uint8_t* section,
+                                           std::size_t size) const {
+  Place place;
+  // A section with a CRC_32 is told apart by its size and CRC, confirmed byte
+  // for byte against the stored copy; a short section without one by a hash.
+  place.identity = SectionHasCrc(section) && size >= 4
+                       ? (static_cast<uint64_t>(size) << 32) | ReadCrcField(section, size)
+                       : HashBytes(section, size);
   bool longForm = size >= 8 && (section[1] & 0x80) != 0;
   int extension = longForm ? ((section[3] << 8) | section[4]) : -1;
   int version = longForm ? ((section[5] >> 1) & 0x1F) : -1;
-  unsigned int number = longForm ? section[6] : 0;
-  bool joins = longForm && KindJoinsSections(kind);
-
-  Key key;
-  if (joins) {
+  place.number = longForm ? section[6] : 0;
+  if (longForm && KindJoinsSections(kind)) {
     // Stream ids of the body tell apart EIT sub-tables and SDTs of other streams.
     uint32_t extra = 0;
     if (IsEit(kind) && size >= 12) extra = (section[8] << 24) | (section[9] << 16) | (section[10] << 8) | section[11];
     if (kind == TableKind::kSdt && size >= 10) extra = (section[8] << 8) | section[9];
-    key = Key(pid, section[0], extension, version, extra, section[7], 0);
+    place.key = Key(pid, section[0], extension, version, extra, section[7], 0);
   } else {
-    key = Key(pid, section[0], extension, version, 0, static_cast<int>(number), hash);
+    place.key = Key(pid, section[0], extension, version, 0, static_cast<int>(place.number), place.identity);
   }
+  auto found = latest_.find(place.key);
+  if (found == latest_.end()) return place;
+  place.table = tables_[found->second].get();
+  auto slot = place.table->sections.find(place.number);
+  if (slot != place.table->sections.end()) {
+    const StoredSection& stored = slot->second;
+    place.same = stored.hash == place.identity && stored.bytes.size() == size &&
+                 std::memcmp(stored.bytes.data(), section, size) == 0;
+    // Same table and section number, other contents (sent without a version
+    // change): a table of its own from here on.
+    if (!place.same) place.table = nullptr;
+  }
+  return place;
+}
 
-  TableEntry* table = nullptr;
-  auto found = latest_.find(key);
-  if (found != latest_.end()) {
-    table = tables_[found->second].get();
-    auto slot = table->sections.find(number);
-    if (slot != table->sections.end() && slot->second.hash != hash) {
-      // Same table and section number, other contents (sent without a version
-      // change): a table of its own from here on.
-      table = nullptr;
-    }
-  }
-  if (table == nullptr) table = NewEntry(key, pid, kind, section);
+bool TableRegistry::CountRepeat(int pid, TableKind kind, const uint8_t* section, std::size_t size) {
+  Place place = Locate(pid, kind, section, size);
+  if (!place.same) return false;
+  ++arrivals_;
+  place.table->lastSeen = arrivals_;
+  ++place.table->sections[place.number].seen;
+  return true;
+}
+
+StoredSection* TableRegistry::Add(int pid, TableKind kind, const uint8_t* section, std::size_t size) {
+  ++arrivals_;
+  Place place = Locate(pid, kind, section, size);
+  TableEntry* table = place.table;
+  if (table == nullptr) table = NewEntry(place.key, pid, kind, section);
   table->lastSeen = arrivals_;
 
-  StoredSection& stored = table->sections[number];
+  StoredSection& stored = table->sections[place.number];
   ++stored.seen;
   if (stored.seen > 1) return nullptr;
   stored.bytes.assign(section, section + size);
-  stored.hash = hash;
+  stored.hash = place.identity;
   return &stored;
 }
 

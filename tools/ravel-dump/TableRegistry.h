@@ -22,7 +22,7 @@ const int kNoPid = -1;
 
 struct StoredSection {
   std::vector<uint8_t> bytes;
-  uint64_t hash = 0;
+  uint64_t hash = 0;  // content identity: size and CRC_32, or a hash of the bytes
   uint64_t seen = 0;
   int parseResult = 0;  // what the library's parse gave when it first arrived
 };
@@ -50,6 +50,10 @@ struct TableEntry {
 
 class TableRegistry {
  public:
+  // A section identical to one already stored for its table is counted as
+  // seen once more: true. Such a section passed every check when it was stored,
+  // so a repeat needs none of them again.
+  bool CountRepeat(int pid, TableKind kind, const uint8_t* section, std::size_t size);
   // Records a checked section of `size` bytes. Gives the stored section when
   // it is new (the first copy of these bytes for its table), null for a repeat.
   StoredSection* Add(int pid, TableKind kind, const uint8_t* section, std::size_t size);
@@ -60,6 +64,17 @@ class TableRegistry {
  private:
   typedef std::tuple<int, int, int, int, uint32_t, int, uint64_t> Key;
 
+  // Where a section belongs: its table's key, section number and content
+  // identity, the table it joins (null for a new one) and whether the same
+  // bytes are stored there already.
+  struct Place {
+    Key key;
+    unsigned int number = 0;
+    uint64_t identity = 0;
+    TableEntry* table = nullptr;
+    bool same = false;
+  };
+  Place Locate(int pid, TableKind kind, const uint8_t* section, std::size_t size) const;
   TableEntry* NewEntry(const Key& key, int pid, TableKind kind, const uint8_t* section);
 
   std::vector<std::unique_ptr<TableEntry>> tables_;
