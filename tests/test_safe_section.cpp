@@ -21,7 +21,6 @@
 #include "Ravel_CTableTDT.h"
 #include "Ravel_CTableTOT.h"
 #include "Ravel_ResultCode.h"
-#include "SectionReassembly.h"
 #include "StreamBuilder.h"
 #include "TraceRecorder.h"
 
@@ -138,18 +137,18 @@ std::vector<Bytes> Fixtures() {
     if (!captures::Load(name, contents)) continue;
     for (const Bytes& section : captures::SplitSections(contents)) fixtures.push_back(section);
   }
-  for (const char* name : {"stream-events-1.ts", "stream-events-2.ts", "object-carousel.ts"}) {
+  // The stream descriptor and carousel PIDs of the captures.
+  struct Carried {
+    const char* file;
+    unsigned int pid;
+  } carried[] = {{"stream-events-1.ts", 0x0194}, {"stream-events-2.ts", 0x0FA2}, {"object-carousel.ts", 0x076A}};
+  for (const Carried& c : carried) {
     Bytes stream;
-    if (!captures::Load(name, stream)) continue;
-    for (unsigned char tableId : {0x3B, 0x3C, 0x3D}) {
-      int pid = reassembly::FindPidOfTable(stream, tableId);
-      if (pid < 0) continue;
-      // The first few of each table: enough to hold every kind of message.
-      int taken = 0;
-      for (const Bytes& section :
-           reassembly::Sections(captures::PacketsOfPid(stream, static_cast<unsigned int>(pid)))) {
-        if (section[0] == tableId && taken++ < 3) fixtures.push_back(section);
-      }
+    if (!captures::Load(c.file, stream)) continue;
+    // The first few of each table: enough to hold every kind of message.
+    std::map<unsigned char, int> taken;
+    for (const Bytes& section : captures::SectionsOfPid(stream, c.pid)) {
+      if (taken[section[0]]++ < 3) fixtures.push_back(section);
     }
   }
   return fixtures;
@@ -523,7 +522,7 @@ TEST(SafeSection, TakesTheWholeRealObjectCarousel) {
   TraceRecorder recorder;
   std::map<unsigned int, int> messages;  // message id -> count
   int modules = 0;
-  for (const Bytes& section : reassembly::Sections(captures::PacketsOfPid(stream, 0x076A))) {
+  for (const Bytes& section : captures::SectionsOfPid(stream, 0x076A)) {
     RavelCSafeSection safe;
     RavelSafeResult result = safe.Parse(section.data(), static_cast<int>(section.size()));
     ASSERT_EQ(kRavelSafeOk, result) << RavelCSafeSection::GetResultText(result);
