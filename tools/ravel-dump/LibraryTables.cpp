@@ -54,7 +54,7 @@ template <class T>
 class Message : public TableObject {
  public:
   Message() : object_(nullptr) {}
-  int Parse(unsigned char* section) override { return object_.ParseRawData(section + 8); }
+  int Parse(unsigned char* section) override { return object_.ParseRawData(section ? section + 8 : nullptr); }
   void Join(TableObject&) override {}
   void Show() override { object_.Show(); }
 

@@ -12,12 +12,6 @@
 
 namespace ravel_dump {
 
-// Bytes added (zeroed) after every section handed to the library. Descriptor
-// classes read fixed fields and counted texts from their own length byte
-// without looking at the enclosing loop; the largest such reach from a
-// descriptor that starts inside its loop stays well inside this margin.
-const std::size_t kParsePadding = 4096;
-
 // Whether the section carries a CRC_32 that a receiver checks: every section
 // with the syntax indicator set, and the TOT (a short section with a CRC).
 // DSM-CC sections with the indicator clear carry a checksum instead.
