@@ -17,6 +17,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_CDateCode.h"
 #include "Ravel_ByteOrder.h"
+#include "Ravel_DescriptorSlot.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_FixedText.h"
 #include "Ravel_RecordList.h"
@@ -92,6 +93,7 @@
 #include "Ravel_CDescriptorType.h"
 #include "Ravel_CDescriptors.h"
 #include "Ravel_CObjectCarouselTransmissionFormat.h"
+#include "Ravel_CSafeSection.h"
 #include "Ravel_CTxType.h"
 
 #endif

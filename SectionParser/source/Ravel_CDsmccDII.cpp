@@ -3,27 +3,9 @@
 #include "Ravel_ByteOrder.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDsmccDII");
-
-namespace {
-
-// Replaces the descriptor held in `slot` by a copy of the one in `source`.
-template <class T>
-void CopyDescriptor(T*& slot, T* source) {
-  delete slot;
-  slot = source != 0 ? new T(*source) : 0;
-}
-
-// Replaces the descriptor held in `slot` by one parsed from `raw` (a later
-// descriptor of the same kind wins).
-template <class T>
-void ReplaceDescriptor(T*& slot, unsigned char* raw) {
-  delete slot;
-  slot = new T(raw);
-}
-
-}  // namespace
 
 // ---------------------------------------------------------------------------
 // RavelCModuleInfo
@@ -64,13 +46,13 @@ RavelCModuleInfo& RavelCModuleInfo::operator=(RavelCModuleInfo& other) {
   iModuleSize = other.iModuleSize;
   iModuleVersion = other.iModuleVersion;
   iModuleInfoLength = other.iModuleInfoLength;
-  CopyDescriptor(pTypeDescriptor, other.pTypeDescriptor);
-  CopyDescriptor(pNameDescriptor, other.pNameDescriptor);
-  CopyDescriptor(pInfoDescriptor, other.pInfoDescriptor);
-  CopyDescriptor(pModuleLinkDescriptor, other.pModuleLinkDescriptor);
-  CopyDescriptor(pCRC32Descriptor, other.pCRC32Descriptor);
-  CopyDescriptor(pEstDownloadTimeDescriptor, other.pEstDownloadTimeDescriptor);
-  CopyDescriptor(pCompressionTypeDescriptor, other.pCompressionTypeDescriptor);
+  RavelDescriptorSlot_CopyFrom(pTypeDescriptor, other.pTypeDescriptor);
+  RavelDescriptorSlot_CopyFrom(pNameDescriptor, other.pNameDescriptor);
+  RavelDescriptorSlot_CopyFrom(pInfoDescriptor, other.pInfoDescriptor);
+  RavelDescriptorSlot_CopyFrom(pModuleLinkDescriptor, other.pModuleLinkDescriptor);
+  RavelDescriptorSlot_CopyFrom(pCRC32Descriptor, other.pCRC32Descriptor);
+  RavelDescriptorSlot_CopyFrom(pEstDownloadTimeDescriptor, other.pEstDownloadTimeDescriptor);
+  RavelDescriptorSlot_CopyFrom(pCompressionTypeDescriptor, other.pCompressionTypeDescriptor);
   return *this;
 }
 
@@ -116,25 +98,25 @@ int RavelCModuleInfo::ParseRawData(unsigned char* record) {
     unsigned char tag = at[0];
     switch (tag) {
       case 0x01:
-        ReplaceDescriptor(pTypeDescriptor, at);
+        RavelDescriptorSlot_Replace(pTypeDescriptor, at);
         break;
       case 0x02:
-        ReplaceDescriptor(pNameDescriptor, at);
+        RavelDescriptorSlot_Replace(pNameDescriptor, at);
         break;
       case 0x03:
-        ReplaceDescriptor(pInfoDescriptor, at);
+        RavelDescriptorSlot_Replace(pInfoDescriptor, at);
         break;
       case 0x04:
-        ReplaceDescriptor(pModuleLinkDescriptor, at);
+        RavelDescriptorSlot_Replace(pModuleLinkDescriptor, at);
         break;
       case 0x05:
-        ReplaceDescriptor(pCRC32Descriptor, at);
+        RavelDescriptorSlot_Replace(pCRC32Descriptor, at);
         break;
       case 0x07:
-        ReplaceDescriptor(pEstDownloadTimeDescriptor, at);
+        RavelDescriptorSlot_Replace(pEstDownloadTimeDescriptor, at);
         break;
       case 0xC2:
-        ReplaceDescriptor(pCompressionTypeDescriptor, at);
+        RavelDescriptorSlot_Replace(pCompressionTypeDescriptor, at);
         break;
       default:  // the location descriptor (0x06) included
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x%02x]\n", tag);

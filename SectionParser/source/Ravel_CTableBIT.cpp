@@ -4,6 +4,7 @@
 #include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableBIT");
 
@@ -40,9 +41,7 @@ RavelCBroadcasterDescriptor& RavelCBroadcasterDescriptor::operator=(RavelCBroadc
   DeleteDescriptor();
   iBroadcasterId = other.iBroadcasterId;
   iBroadcasterDescriptorsLength = other.iBroadcasterDescriptorsLength;
-  if (other.pExtendedBroadcasterDescriptor != 0) {
-    pExtendedBroadcasterDescriptor = new RavelCExtendedBroadcasterDescriptor(*other.pExtendedBroadcasterDescriptor);
-  }
+  pExtendedBroadcasterDescriptor = RavelDescriptorSlot_CopyOf(other.pExtendedBroadcasterDescriptor);
   return *this;
 }
 

@@ -12,6 +12,7 @@
 #include "Ravel_CDescriptorShortEvent.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableEIT");
 
@@ -53,19 +54,6 @@ const char* EITTableName(unsigned char tableId) {
 }
 
 void ReleaseAudioComponent(void* element) { delete static_cast<RavelCAudioComponentDescriptor*>(element); }
-
-// Replaces a single-valued descriptor: the later one of an event wins.
-template <class Descriptor>
-void Replace(Descriptor*& held, unsigned char* raw) {
-  delete held;
-  held = new Descriptor(raw);
-}
-
-// A copy of a held descriptor, or null.
-template <class Descriptor>
-Descriptor* CopyOf(Descriptor* source) {
-  return source != 0 ? new Descriptor(*source) : 0;
-}
 
 template <class Descriptor>
 void DeleteHeld(Descriptor*& held) {
@@ -121,19 +109,19 @@ RavelCEventInfo& RavelCEventInfo::operator=(RavelCEventInfo& other) {
   iRunningStatus = other.iRunningStatus;
   bFreeCAMode = other.bFreeCAMode;
   iDescriptorsLoopLength = other.iDescriptorsLoopLength;
-  pShortEventDescriptor = CopyOf(other.pShortEventDescriptor);
-  pContentDescriptor = CopyOf(other.pContentDescriptor);
-  pComponentDescriptor = CopyOf(other.pComponentDescriptor);
-  pParentalRatingDescriptor = CopyOf(other.pParentalRatingDescriptor);
+  pShortEventDescriptor = RavelDescriptorSlot_CopyOf(other.pShortEventDescriptor);
+  pContentDescriptor = RavelDescriptorSlot_CopyOf(other.pContentDescriptor);
+  pComponentDescriptor = RavelDescriptorSlot_CopyOf(other.pComponentDescriptor);
+  pParentalRatingDescriptor = RavelDescriptorSlot_CopyOf(other.pParentalRatingDescriptor);
   // As many as the list's 8-bit count tells.
   int audioCount = other.GetAudioComponentCount();
   for (int i = 0; i < audioCount; ++i) {
     RavelCAudioComponentDescriptor* audio = other.GetAudioComponent(i);
     if (audio != 0) list_insert(pAudioComponentList, new RavelCAudioComponentDescriptor(*audio));
   }
-  pCopyrightDescriptor = CopyOf(other.pCopyrightDescriptor);
-  pExtendedEventDescriptor = CopyOf(other.pExtendedEventDescriptor);
-  pSeriesDescriptor = CopyOf(other.pSeriesDescriptor);
+  pCopyrightDescriptor = RavelDescriptorSlot_CopyOf(other.pCopyrightDescriptor);
+  pExtendedEventDescriptor = RavelDescriptorSlot_CopyOf(other.pExtendedEventDescriptor);
+  pSeriesDescriptor = RavelDescriptorSlot_CopyOf(other.pSeriesDescriptor);
   iSpare = other.iSpare;
   return *this;
 }
@@ -224,22 +212,22 @@ int RavelCEventInfo::ParseRawData(unsigned char* event) {
     }
     switch (tag) {
       case kTagCopyright:
-        Replace(pCopyrightDescriptor, position);
+        RavelDescriptorSlot_Replace(pCopyrightDescriptor, position);
         break;
       case kTagShortEvent:
-        Replace(pShortEventDescriptor, position);
+        RavelDescriptorSlot_Replace(pShortEventDescriptor, position);
         break;
       case kTagExtendedEvent:
-        Replace(pExtendedEventDescriptor, position);
+        RavelDescriptorSlot_Replace(pExtendedEventDescriptor, position);
         break;
       case kTagComponent:
-        Replace(pComponentDescriptor, position);
+        RavelDescriptorSlot_Replace(pComponentDescriptor, position);
         break;
       case kTagContent:
-        Replace(pContentDescriptor, position);
+        RavelDescriptorSlot_Replace(pContentDescriptor, position);
         break;
       case kTagParentalRating:
-        Replace(pParentalRatingDescriptor, position);
+        RavelDescriptorSlot_Replace(pParentalRatingDescriptor, position);
         break;
       case kTagDigitalCopyControl:
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0x%02x]\n",
@@ -249,7 +237,7 @@ int RavelCEventInfo::ParseRawData(unsigned char* event) {
         list_insert(pAudioComponentList, new RavelCAudioComponentDescriptor(position));
         break;
       case kTagSeries:
-        Replace(pSeriesDescriptor, position);
+        RavelDescriptorSlot_Replace(pSeriesDescriptor, position);
         break;
       default:
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0x%02x]\n", tag);

@@ -5,6 +5,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableNIT");
 
@@ -26,19 +27,6 @@ const int kTSInfoFixedSize = 6;
 // Byte 8: network_descriptors_length; its descriptors start at byte 10.
 const int kNetworkDescriptorsLengthAt = 8;
 const int kNetworkDescriptorsAt = 10;
-
-// Deep copy of an owned descriptor, or null.
-template <class T>
-T* CopyOf(T* descriptor) {
-  return descriptor != 0 ? new T(*descriptor) : 0;
-}
-
-// Puts a freshly built descriptor into its member and releases the one it replaces.
-template <class T>
-void Replace(T*& member, T* descriptor) {
-  delete member;
-  member = descriptor;
-}
 
 }  // namespace
 
@@ -73,10 +61,10 @@ RavelCTSInfo& RavelCTSInfo::operator=(RavelCTSInfo& other) {
   iOriginalNetworkId = other.iOriginalNetworkId;
   iTransportDescriptorsLength = other.iTransportDescriptorsLength;
   DeleteDescriptors();
-  pServiceList = CopyOf(other.pServiceList);
-  pTerrDeliverySystem = CopyOf(other.pTerrDeliverySystem);
-  pTSInformation = CopyOf(other.pTSInformation);
-  pPartialReception = CopyOf(other.pPartialReception);
+  pServiceList = RavelDescriptorSlot_CopyOf(other.pServiceList);
+  pTerrDeliverySystem = RavelDescriptorSlot_CopyOf(other.pTerrDeliverySystem);
+  pTSInformation = RavelDescriptorSlot_CopyOf(other.pTSInformation);
+  pPartialReception = RavelDescriptorSlot_CopyOf(other.pPartialReception);
   return *this;
 }
 
@@ -127,16 +115,16 @@ int RavelCTSInfo::ParseRawData(unsigned char* entry) {
     }
     switch (tag) {
       case kTagServiceList:
-        Replace(pServiceList, new RavelCServiceListDescriptor(descriptor));
+        RavelDescriptorSlot_Replace(pServiceList, descriptor);
         break;
       case kTagTSInformation:
-        Replace(pTSInformation, new RavelCTSInformationDescriptor(descriptor));
+        RavelDescriptorSlot_Replace(pTSInformation, descriptor);
         break;
       case kTagTerrDeliverySystem:
-        Replace(pTerrDeliverySystem, new RavelCTerrDeliverySystemDescriptor(descriptor));
+        RavelDescriptorSlot_Replace(pTerrDeliverySystem, descriptor);
         break;
       case kTagPartialReception:
-        Replace(pPartialReception, new RavelCPartialReceptionDescriptor(descriptor));
+        RavelDescriptorSlot_Replace(pPartialReception, descriptor);
         break;
       default:
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "NIT TSInfo Parsing.. Unkown Descriptor Tag=[0x%02x]\n", tag);
@@ -181,9 +169,9 @@ RavelCNIT& RavelCNIT::operator=(RavelCNIT& other) {
   CopyHeader(other);
   DeleteNetworkDescriptors();
   RavelRecordList_DeleteAll(aTSInfoList);
-  pLinkage = CopyOf(other.pLinkage);
-  pNetworkName = CopyOf(other.pNetworkName);
-  pSystemManagement = CopyOf(other.pSystemManagement);
+  pLinkage = RavelDescriptorSlot_CopyOf(other.pLinkage);
+  pNetworkName = RavelDescriptorSlot_CopyOf(other.pNetworkName);
+  pSystemManagement = RavelDescriptorSlot_CopyOf(other.pSystemManagement);
   RavelRecordList_AppendCopies(aTSInfoList, other.aTSInfoList);
   return *this;
 }
@@ -235,15 +223,16 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
       // A later descriptor of the same tag takes the place of the earlier one.
       switch (tag) {
         case kTagNetworkName:
-          Replace(pNetworkName, new RavelCNetworkNameDescriptor(descriptor));
+          RavelDescriptorSlot_Replace(pNetworkName, descriptor);
           break;
         case kTagSystemManagement:
-          Replace(pSystemManagement, new RavelCSystemManagementDescriptor(descriptor));
+          RavelDescriptorSlot_Replace(pSystemManagement, descriptor);
           break;
         case kTagLinkage: {
           RavelCLinkageDescriptor* linkage = new RavelCLinkageDescriptor(0);
           linkage->ParseRawData(descriptor);
-          Replace(pLinkage, linkage);
+          delete pLinkage;
+          pLinkage = linkage;
           break;
         }
         default:
@@ -280,9 +269,9 @@ RavelCNIT& RavelCNIT::operator+=(RavelCNIT& other) {
   if (!RAVEL_TABLE_MERGE_CHECK_VERSION(*this, other, "NIT")) return *this;
   // Network descriptors may come in any section of the table: take those still
   // missing, keep those already held.
-  if (pLinkage == 0) pLinkage = CopyOf(other.pLinkage);
-  if (pNetworkName == 0) pNetworkName = CopyOf(other.pNetworkName);
-  if (pSystemManagement == 0) pSystemManagement = CopyOf(other.pSystemManagement);
+  if (pLinkage == 0) pLinkage = RavelDescriptorSlot_CopyOf(other.pLinkage);
+  if (pNetworkName == 0) pNetworkName = RavelDescriptorSlot_CopyOf(other.pNetworkName);
+  if (pSystemManagement == 0) pSystemManagement = RavelDescriptorSlot_CopyOf(other.pSystemManagement);
   RavelRecordList_AppendCopies(aTSInfoList, other.aTSInfoList);
   return *this;
 }

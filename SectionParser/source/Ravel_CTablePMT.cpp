@@ -4,6 +4,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTablePMT");
 
@@ -58,9 +59,9 @@ RavelCMapInfo& RavelCMapInfo::operator=(RavelCMapInfo& other) {
   iElementaryPID = other.iElementaryPID;
   iESInfoLength = other.iESInfoLength;
   iCAPID = other.iCAPID;
-  if (other.pStreamIdentifier != 0) pStreamIdentifier = new RavelCStreamIdentifierDescriptor(*other.pStreamIdentifier);
-  if (other.pDataComponent != 0) pDataComponent = new RavelCDataComponentDescriptor(*other.pDataComponent);
-  if (other.pTargetRegion != 0) pTargetRegion = new RavelCTargetRegionDescriptor(*other.pTargetRegion);
+  pStreamIdentifier = RavelDescriptorSlot_CopyOf(other.pStreamIdentifier);
+  pDataComponent = RavelDescriptorSlot_CopyOf(other.pDataComponent);
+  pTargetRegion = RavelDescriptorSlot_CopyOf(other.pTargetRegion);
   return *this;
 }
 
@@ -116,8 +117,7 @@ int RavelCMapInfo::ParseRawData(unsigned char* entry) {
         pStreamIdentifier->ParseRawData(descriptor);
         break;
       case kTagTargetRegion:
-        delete pTargetRegion;
-        pTargetRegion = new RavelCTargetRegionDescriptor(descriptor);
+        RavelDescriptorSlot_Replace(pTargetRegion, descriptor);
         break;
       case kTagDataComponent:
         delete pDataComponent;

@@ -4,6 +4,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableSDT");
 
@@ -47,11 +48,9 @@ RavelCServiceDescription& RavelCServiceDescription::operator=(RavelCServiceDescr
   bFreeCAMode = other.bFreeCAMode;
   iDescriptorsLoopLength = other.iDescriptorsLoopLength;
   // The service descriptor's own copy carries no names.
-  if (other.pService != 0) pService = new RavelCServiceDescriptor(*other.pService);
-  if (other.pLogoTransmission != 0) pLogoTransmission = new RavelCLogoTransmissionDescriptor(*other.pLogoTransmission);
-  if (other.pCountryAvailability != 0) {
-    pCountryAvailability = new RavelCCountryAvailabilityDescriptor(*other.pCountryAvailability);
-  }
+  pService = RavelDescriptorSlot_CopyOf(other.pService);
+  pLogoTransmission = RavelDescriptorSlot_CopyOf(other.pLogoTransmission);
+  pCountryAvailability = RavelDescriptorSlot_CopyOf(other.pCountryAvailability);
   return *this;
 }
 
@@ -108,20 +107,17 @@ int RavelCServiceDescription::ParseRawData(unsigned char* entry) {
     // of the same tag replaces the earlier one.
     switch (tag) {
       case kTagService:
-        delete pService;
-        pService = new RavelCServiceDescriptor(descriptor);
+        RavelDescriptorSlot_Replace(pService, descriptor);
         break;
       case kTagCountryAvailability:
-        delete pCountryAvailability;
-        pCountryAvailability = new RavelCCountryAvailabilityDescriptor(descriptor);
+        RavelDescriptorSlot_Replace(pCountryAvailability, descriptor);
         break;
       case kTagDigitalCopyControl:
         RAVEL_TRACE(RAVEL_PARSER_WARNING,
                     "SDT ServiceDescription Parsing.. Digital Copy Control Descriptor Tag=[0x%02x]\n", tag);
         break;
       case kTagLogoTransmission:
-        delete pLogoTransmission;
-        pLogoTransmission = new RavelCLogoTransmissionDescriptor(descriptor);
+        RavelDescriptorSlot_Replace(pLogoTransmission, descriptor);
         break;
       default:
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "SDT ServiceDescription Parsing.. Unknown Descriptor Tag=[0x%02x]\n", tag);

@@ -4,6 +4,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_Util.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableStreamEventDescriptor");
 
@@ -25,7 +26,7 @@ RavelCDsmccStreamEvent& RavelCDsmccStreamEvent::operator=(RavelCDsmccStreamEvent
   // Released before `other` is read: assigned to itself, a table is left with
   // neither its NPT reference nor its general events.
   ReleaseDescriptors();
-  if (other.pNPTReference != 0) pNPTReference = new RavelCNPTReferenceDescriptor(*other.pNPTReference);
+  pNPTReference = RavelDescriptorSlot_CopyOf(other.pNPTReference);
   // General events are never copied: the copy runs over the target's own count,
   // which is 0 here, so a copy's list is always empty; callers rely on that.
   return *this;

@@ -5,6 +5,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
+#include "Ravel_DescriptorSlot.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableTOT");
 
@@ -42,9 +43,7 @@ RavelCTOT& RavelCTOT::operator=(RavelCTOT& other) {
   iMinute = other.iMinute;
   iSecond = other.iSecond;
   iDescriptorsLoopLength = other.iDescriptorsLoopLength;
-  if (other.pLocalTimeOffsetDescriptor != 0) {
-    pLocalTimeOffsetDescriptor = new RavelCLocalTimeOffsetDescriptor(*other.pLocalTimeOffsetDescriptor);
-  }
+  pLocalTimeOffsetDescriptor = RavelDescriptorSlot_CopyOf(other.pLocalTimeOffsetDescriptor);
   return *this;
 }
 
