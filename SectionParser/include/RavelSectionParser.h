@@ -15,15 +15,6 @@
 // Foundation.
 #include "Ravel_CArray.h"
 #include "Ravel_ResultCode.h"
-#include "Ravel_CDateCode.h"
-#include "Ravel_ByteOrder.h"
-#include "Ravel_DescriptorSlot.h"
-#include "Ravel_DescriptorText.h"
-#include "Ravel_FixedText.h"
-#include "Ravel_RecordList.h"
-#include "Ravel_TableMerge.h"
-#include "Ravel_TimeTable.h"
-#include "Ravel_Trace.h"
 
 // Transport stream layer.
 #include "Ravel_CTSPacket.h"
