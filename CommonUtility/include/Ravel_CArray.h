@@ -11,12 +11,7 @@
 #include "Ravel_ResultCode.h"
 
 #define RAVEL_CARRAY_TRACE_PATH "SectionParser/../CommonUtility/include/Ravel_CArray"
-#define RAVEL_CARRAY_TRACE(...)                        \
-  do {                                                 \
-    gszRavelDbgFilePath = RAVEL_CARRAY_TRACE_PATH;     \
-    gRavelDbgLineNum = __LINE__;                       \
-    RavelPGL_TraceOut(0x40000001u, __VA_ARGS__);       \
-  } while (0)
+#define RAVEL_CARRAY_TRACE(...) RAVEL_PGL_TRACE_AT(RAVEL_CARRAY_TRACE_PATH, __LINE__, 0x40000001u, __VA_ARGS__)
 
 template <class T>
 class RavelCArray {

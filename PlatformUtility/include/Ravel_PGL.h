@@ -21,6 +21,21 @@ extern "C" {
 extern const char* gszRavelDbgFilePath;
 extern int gRavelDbgLineNum;
 
+// The one way the location globals are set: the source path and the line of the
+// call site, which a helper tracing on behalf of its caller is handed as values.
+#define RAVEL_PGL_SET_LOCATION(path, line) \
+  do {                                     \
+    gszRavelDbgFilePath = (path);          \
+    gRavelDbgLineNum = (line);             \
+  } while (0)
+
+// A trace reported at the given call site.
+#define RAVEL_PGL_TRACE_AT(path, line, mask, ...) \
+  do {                                            \
+    RAVEL_PGL_SET_LOCATION((path), (line));       \
+    RavelPGL_TraceOut((mask), __VA_ARGS__);       \
+  } while (0)
+
 int RavelPGL_TraceOut(unsigned int mask, const char* format, ...) RAVEL_PRINTF_FORMAT(2, 3);
 int RavelPGL_CheckAndInitDebug(void);
 void RavelPGL_Panic(void);

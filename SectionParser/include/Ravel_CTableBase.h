@@ -34,9 +34,9 @@ class RavelCTableBase {
  protected:
   // Steps every table shares before its own checks: the CRC over the whole
   // section (traced with `crcMessage` at warning level, from the table's own
-  // `sourcePath`; -24 on mismatch), then the header parse. Gives 0 when the
-  // table goes on with its table_id check.
-  int CheckCrcAndParseHeader(unsigned char* section, const char* sourcePath, const char* crcMessage);
+  // `sourcePath` and `sourceLine`; -24 on mismatch), then the header parse.
+  // Gives 0 when the table goes on with its table_id check.
+  int CheckCrcAndParseHeader(unsigned char* section, const char* sourcePath, int sourceLine, const char* crcMessage);
 
   // Copies the header members and the name from another table.
   void CopyHeader(const RavelCTableBase& other);

@@ -41,12 +41,7 @@ void RavelCDescriptorBase::Show() {
 }
 
 // Traces of the shared steps are reported from the descriptor class's own source.
-#define RAVEL_TRACE_KIND(kind, mask, ...)           \
-  do {                                              \
-    gszRavelDbgFilePath = (kind).szSourcePath;      \
-    gRavelDbgLineNum = __LINE__;                    \
-    RavelPGL_TraceOut((mask), __VA_ARGS__);         \
-  } while (0)
+#define RAVEL_TRACE_KIND(kind, mask, ...) RAVEL_PGL_TRACE_AT((kind).szSourcePath, __LINE__, (mask), __VA_ARGS__)
 
 int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind) {
   RavelCDescriptorBase::ParseRawData(raw);

@@ -118,7 +118,7 @@ RavelCBIT::~RavelCBIT() { RavelRecordList_DeleteAll(aBroadcasterDescriptor); }
 int RavelCBIT::ParseRawData(unsigned char* section) {
   RavelRecordList_DeleteAll(aBroadcasterDescriptor);
   if (section == 0) return kRavelErrInvalidArgument;
-  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "BIT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, __LINE__, "BIT Section: CRC Error!\n");
   if (result != kRavelOk) return result;
   if (iTableId != kBITTableId) {
     RAVEL_TRACE(RAVEL_PARSER_ERROR, "Table ID isn't for BIT! Table ID=[0x%02x]\n", iTableId);

@@ -63,12 +63,10 @@ int RavelCTableBase::SetTableName(const char* name) {
   return 1;
 }
 
-int RavelCTableBase::CheckCrcAndParseHeader(unsigned char* section, const char* sourcePath,
+int RavelCTableBase::CheckCrcAndParseHeader(unsigned char* section, const char* sourcePath, int sourceLine,
                                             const char* crcMessage) {
   if (!RavelUtil_CheckSectionCRC32(section)) {
-    gszRavelDbgFilePath = sourcePath;
-    gRavelDbgLineNum = __LINE__;
-    RavelPGL_TraceOut(RAVEL_PARSER_WARNING, "%s", crcMessage);
+    RAVEL_PGL_TRACE_AT(sourcePath, sourceLine, RAVEL_PARSER_WARNING, "%s", crcMessage);
     return kRavelErrCorruptSection;
   }
   RavelCTableBase::ParseRawData(section);

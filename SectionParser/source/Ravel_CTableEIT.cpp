@@ -349,7 +349,7 @@ int RavelCEIT::ParseRawData(unsigned char* section) {
     return kRavelErrInvalidArgument;
   }
   // On a CRC error the header is left as the previous parse set it.
-  if (CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "EIT Section: CRC Error!\n") != kRavelOk) {
+  if (CheckCrcAndParseHeader(section, kRavelTraceSourcePath, __LINE__, "EIT Section: CRC Error!\n") != kRavelOk) {
     ClearFields();
     return kRavelErrCorruptSection;
   }

@@ -194,7 +194,7 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
   DeleteNetworkDescriptors();
   RavelRecordList_DeleteAll(aTSInfoList);
   if (section == 0) return kRavelErrInvalidArgument;
-  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "NIT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, __LINE__, "NIT Section: CRC Error!\n");
   if (result != kRavelOk) return result;
   if (iTableId == kNITActualTableId) {
     SetTableName("NIT Actual");

@@ -99,7 +99,7 @@ int RavelCPAT::ParseRawData(unsigned char* section) {
   // iNetworkPID survives a re-parse: a section without program_number 0 keeps it.
   DeletePrograms();
   if (section == 0) return kRavelErrInvalidArgument;
-  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "PAT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, __LINE__, "PAT Section: CRC Error!\n");
   if (result != kRavelOk) return result;
   if (iTableId != kPATTableId) {
     // Decimal here, unlike the other tables' messages.

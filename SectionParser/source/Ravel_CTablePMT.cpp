@@ -192,7 +192,7 @@ int RavelCPMT::ParseRawData(unsigned char* section) {
     iProgramInfoLength = 0;
     return kRavelErrInvalidArgument;
   }
-  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "PMT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, __LINE__, "PMT Section: CRC Error!\n");
   if (result != kRavelOk) {
     iPCRPID = 0;
     iProgramInfoLength = 0;

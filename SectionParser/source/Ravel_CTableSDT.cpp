@@ -183,7 +183,7 @@ int RavelCSDT::ParseRawData(unsigned char* section) {
     iOriginalNetworkId = 0;
     return kRavelErrInvalidArgument;
   }
-  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "SDT Section: CRC Error!\n");
+  int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, __LINE__, "SDT Section: CRC Error!\n");
   if (result != kRavelOk) {
     iOriginalNetworkId = 0;
     return result;

@@ -40,7 +40,7 @@ int RavelCTDT::SetTableName(const char* name) {
 
 int RavelCTDT::ParseRawData(unsigned char* section) {
   // Nothing is checked against the length: the TDT carries no CRC_32.
-  return RavelTimeTable_ParseHeaderAndTime(*this, section, kTDTTableId, "TDT", kRavelTraceSourcePath);
+  return RavelTimeTable_ParseHeaderAndTime(*this, section, kTDTTableId, "TDT", kRavelTraceSourcePath, __LINE__);
 }
 
 void RavelCTDT::Show() {

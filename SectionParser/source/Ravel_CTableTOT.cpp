@@ -68,7 +68,7 @@ int RavelCTOT::ParseRawData(unsigned char* section) {
   delete pLocalTimeOffsetDescriptor;
   pLocalTimeOffsetDescriptor = 0;
   if (section == 0) iDescriptorsLoopLength = 0;
-  int result = RavelTimeTable_ParseHeaderAndTime(*this, section, kTOTTableId, "TOT", kRavelTraceSourcePath);
+  int result = RavelTimeTable_ParseHeaderAndTime(*this, section, kTOTTableId, "TOT", kRavelTraceSourcePath, __LINE__);
   if (result != kRavelOk) return result;
 
   // The CRC_32 is not verified: a corrupted TOT is taken as it stands.

@@ -24,11 +24,9 @@
 inline bool RavelTableMerge_CheckVersion(const RavelCTableBase& target, const RavelCTableBase& other,
                                          const char* shortName, const char* sourcePath, int sourceLine) {
   if (target.iVersionNumber == other.iVersionNumber) return true;
-  gszRavelDbgFilePath = sourcePath;
-  gRavelDbgLineNum = sourceLine;
-  RavelPGL_TraceOut(RAVEL_PARSER_ERROR,
-                    "Two %s Information have different information! first one=[%d], second one=[%d]\n",
-                    RavelTraceText(shortName), target.iVersionNumber, other.iVersionNumber);
+  RAVEL_PGL_TRACE_AT(sourcePath, sourceLine, RAVEL_PARSER_ERROR,
+                     "Two %s Information have different information! first one=[%d], second one=[%d]\n",
+                     RavelTraceText(shortName), target.iVersionNumber, other.iVersionNumber);
   return false;
 }
 

@@ -25,21 +25,21 @@ void RavelTimeTable_Clear(TimeTable& table) {
 }
 
 // Null clears the fields and gives -9. A foreign table_id is stored, traced
-// ("Table ID isn't for <name>! ..." at error level, from `sourcePath`) and
+// ("Table ID isn't for <name>! ..." at error level, from `sourcePath` and
+// `sourceLine`) and
 // gives -8 with the other fields as they were. Otherwise the name is set and
 // the header and time are read: 0.
 template <class TimeTable>
 int RavelTimeTable_ParseHeaderAndTime(TimeTable& table, unsigned char* section, unsigned char tableId,
-                                      const char* name, const char* sourcePath) {
+                                      const char* name, const char* sourcePath, int sourceLine) {
   if (section == 0) {
     RavelTimeTable_Clear(table);
     return kRavelErrNullSection;
   }
   table.iTableId = section[0];
   if (table.iTableId != tableId) {
-    gszRavelDbgFilePath = sourcePath;
-    gRavelDbgLineNum = __LINE__;
-    RavelPGL_TraceOut(RAVEL_PARSER_ERROR, "Table ID isn't for %s! Table ID=[0x%02x]\n", name, table.iTableId);
+    RAVEL_PGL_TRACE_AT(sourcePath, sourceLine, RAVEL_PARSER_ERROR, "Table ID isn't for %s! Table ID=[0x%02x]\n", name,
+                       table.iTableId);
     return kRavelErrInvalidArgument;
   }
   table.SetTableName(name);

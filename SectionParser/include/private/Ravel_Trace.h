@@ -28,20 +28,14 @@
 
 #define RAVEL_TRACE_SOURCE(path) static const char kRavelTraceSourcePath[] = path
 
-#define RAVEL_TRACE(mask, ...)                        \
-  do {                                                \
-    gszRavelDbgFilePath = kRavelTraceSourcePath;      \
-    gRavelDbgLineNum = __LINE__;                      \
-    RavelPGL_TraceOut((mask), __VA_ARGS__);           \
-  } while (0)
+#define RAVEL_TRACE(mask, ...) RAVEL_PGL_TRACE_AT(kRavelTraceSourcePath, __LINE__, (mask), __VA_ARGS__)
 
 // Panic with the location globals set to the call site.
-#define RAVEL_PANIC()                                 \
-  do {                                                \
-    gszRavelDbgFilePath = kRavelTraceSourcePath;      \
-    gRavelDbgLineNum = __LINE__;                      \
-    RavelPGL_CheckAndInitDebug();                     \
-    RavelPGL_Panic();                                 \
+#define RAVEL_PANIC()                                         \
+  do {                                                        \
+    RAVEL_PGL_SET_LOCATION(kRavelTraceSourcePath, __LINE__);  \
+    RavelPGL_CheckAndInitDebug();                             \
+    RavelPGL_Panic();                                         \
   } while (0)
 
 // A text handed to %s: a missing text prints as the C library prints a null.
