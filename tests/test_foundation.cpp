@@ -4,6 +4,8 @@
 #include <cstring>
 
 #include "RavelSectionParser.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CDateCode.h"
 #include "StreamBuilder.h"
 #include "TraceRecorder.h"
 
