@@ -33,12 +33,7 @@ RavelCDsmccDDB::RavelCDsmccDDB(const RavelCDsmccDDB& other)
 RavelCDsmccDDB& RavelCDsmccDDB::operator=(const RavelCDsmccDDB& other) {
   if (this == &other) return *this;
   ReleaseBlock();
-  iProtocolDiscriminator = other.iProtocolDiscriminator;
-  iDsmccType = other.iDsmccType;
-  iMessageId = other.iMessageId;
-  iTransactionId = other.iTransactionId;
-  iAdaptationLength = other.iAdaptationLength;
-  iMessageLength = other.iMessageLength;
+  RavelCDsmccBase::operator=(other);  // the message header, member for member
   iModuleId = other.iModuleId;
   iModuleVersion = other.iModuleVersion;
   iBlockNumber = other.iBlockNumber;

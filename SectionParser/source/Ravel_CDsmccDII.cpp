@@ -156,12 +156,7 @@ RavelCDsmccDII::RavelCDsmccDII(RavelCDsmccDII& other) : RavelCDsmccBase(0), cMod
 RavelCDsmccDII& RavelCDsmccDII::operator=(RavelCDsmccDII& other) {
   if (this == &other) return *this;
   cModuleInfos.RemoveAll();
-  iProtocolDiscriminator = other.iProtocolDiscriminator;
-  iDsmccType = other.iDsmccType;
-  iMessageId = other.iMessageId;
-  iTransactionId = other.iTransactionId;
-  iAdaptationLength = other.iAdaptationLength;
-  iMessageLength = other.iMessageLength;
+  RavelCDsmccBase::operator=(other);  // the message header, member for member
   iDownloadId = other.iDownloadId;
   iBlockSize = other.iBlockSize;
   iWindowSize = other.iWindowSize;
