@@ -59,20 +59,13 @@ RavelCModuleInfo& RavelCModuleInfo::operator=(RavelCModuleInfo& other) {
 RavelCModuleInfo::~RavelCModuleInfo() { DeleteDescriptors(); }
 
 void RavelCModuleInfo::DeleteDescriptors() {
-  delete pTypeDescriptor;
-  pTypeDescriptor = 0;
-  delete pNameDescriptor;
-  pNameDescriptor = 0;
-  delete pInfoDescriptor;
-  pInfoDescriptor = 0;
-  delete pModuleLinkDescriptor;
-  pModuleLinkDescriptor = 0;
-  delete pCRC32Descriptor;
-  pCRC32Descriptor = 0;
-  delete pEstDownloadTimeDescriptor;
-  pEstDownloadTimeDescriptor = 0;
-  delete pCompressionTypeDescriptor;
-  pCompressionTypeDescriptor = 0;
+  RavelDescriptorSlot_Release(pTypeDescriptor);
+  RavelDescriptorSlot_Release(pNameDescriptor);
+  RavelDescriptorSlot_Release(pInfoDescriptor);
+  RavelDescriptorSlot_Release(pModuleLinkDescriptor);
+  RavelDescriptorSlot_Release(pCRC32Descriptor);
+  RavelDescriptorSlot_Release(pEstDownloadTimeDescriptor);
+  RavelDescriptorSlot_Release(pCompressionTypeDescriptor);
 }
 
 int RavelCModuleInfo::ParseRawData(unsigned char* record) {

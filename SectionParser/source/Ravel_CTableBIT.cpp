@@ -48,8 +48,7 @@ RavelCBroadcasterDescriptor& RavelCBroadcasterDescriptor::operator=(RavelCBroadc
 RavelCBroadcasterDescriptor::~RavelCBroadcasterDescriptor() { DeleteDescriptor(); }
 
 void RavelCBroadcasterDescriptor::DeleteDescriptor() {
-  delete pExtendedBroadcasterDescriptor;
-  pExtendedBroadcasterDescriptor = 0;
+  RavelDescriptorSlot_Release(pExtendedBroadcasterDescriptor);
 }
 
 int RavelCBroadcasterDescriptor::ParseRawData(unsigned char* record) {

@@ -55,12 +55,6 @@ const char* EITTableName(unsigned char tableId) {
 
 void ReleaseAudioComponent(void* element) { delete static_cast<RavelCAudioComponentDescriptor*>(element); }
 
-template <class Descriptor>
-void DeleteHeld(Descriptor*& held) {
-  delete held;
-  held = 0;
-}
-
 }  // namespace
 
 // ---------------------------------------------------------------------------
@@ -143,13 +137,13 @@ void RavelCEventInfo::ClearFields() {
 }
 
 void RavelCEventInfo::DeleteDescriptors() {
-  DeleteHeld(pShortEventDescriptor);
-  DeleteHeld(pContentDescriptor);
-  DeleteHeld(pComponentDescriptor);
-  DeleteHeld(pParentalRatingDescriptor);
-  DeleteHeld(pCopyrightDescriptor);
-  DeleteHeld(pExtendedEventDescriptor);
-  DeleteHeld(pSeriesDescriptor);
+  RavelDescriptorSlot_Release(pShortEventDescriptor);
+  RavelDescriptorSlot_Release(pContentDescriptor);
+  RavelDescriptorSlot_Release(pComponentDescriptor);
+  RavelDescriptorSlot_Release(pParentalRatingDescriptor);
+  RavelDescriptorSlot_Release(pCopyrightDescriptor);
+  RavelDescriptorSlot_Release(pExtendedEventDescriptor);
+  RavelDescriptorSlot_Release(pSeriesDescriptor);
 }
 
 void RavelCEventInfo::ResetAudioComponentList() {

@@ -71,14 +71,10 @@ RavelCTSInfo& RavelCTSInfo::operator=(RavelCTSInfo& other) {
 RavelCTSInfo::~RavelCTSInfo() { DeleteDescriptors(); }
 
 void RavelCTSInfo::DeleteDescriptors() {
-  delete pServiceList;
-  pServiceList = 0;
-  delete pTerrDeliverySystem;
-  pTerrDeliverySystem = 0;
-  delete pTSInformation;
-  pTSInformation = 0;
-  delete pPartialReception;
-  pPartialReception = 0;
+  RavelDescriptorSlot_Release(pServiceList);
+  RavelDescriptorSlot_Release(pTerrDeliverySystem);
+  RavelDescriptorSlot_Release(pTSInformation);
+  RavelDescriptorSlot_Release(pPartialReception);
 }
 
 int RavelCTSInfo::ParseRawData(unsigned char* entry) {
@@ -182,12 +178,9 @@ RavelCNIT::~RavelCNIT() {
 }
 
 void RavelCNIT::DeleteNetworkDescriptors() {
-  delete pLinkage;
-  pLinkage = 0;
-  delete pNetworkName;
-  pNetworkName = 0;
-  delete pSystemManagement;
-  pSystemManagement = 0;
+  RavelDescriptorSlot_Release(pLinkage);
+  RavelDescriptorSlot_Release(pNetworkName);
+  RavelDescriptorSlot_Release(pSystemManagement);
 }
 
 int RavelCNIT::ParseRawData(unsigned char* section) {

@@ -4,6 +4,7 @@
 #include "Ravel_CBitInputStream.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
+#include "Ravel_RecordList.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTablePAT");
 
@@ -75,13 +76,7 @@ RavelCPAT& RavelCPAT::operator=(RavelCPAT& other) {
 
 RavelCPAT::~RavelCPAT() { DeletePrograms(); }
 
-void RavelCPAT::DeletePrograms() {
-  for (int i = 0; i < aProgramList.iCount; ++i) {
-    delete aProgramList.ipArray[i];
-    aProgramList.ipArray[i] = 0;
-  }
-  aProgramList.iCount = 0;
-}
+void RavelCPAT::DeletePrograms() { RavelRecordList_DeleteAll(aProgramList); }
 
 // Before the first program with a greater program_number, so equal numbers keep
 // their order of arrival.

@@ -5,6 +5,7 @@
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
 #include "Ravel_DescriptorSlot.h"
+#include "Ravel_RecordList.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTablePMT");
 
@@ -68,12 +69,9 @@ RavelCMapInfo& RavelCMapInfo::operator=(RavelCMapInfo& other) {
 RavelCMapInfo::~RavelCMapInfo() { DeleteDescriptors(); }
 
 void RavelCMapInfo::DeleteDescriptors() {
-  delete pStreamIdentifier;
-  pStreamIdentifier = 0;
-  delete pDataComponent;
-  pDataComponent = 0;
-  delete pTargetRegion;
-  pTargetRegion = 0;
+  RavelDescriptorSlot_Release(pStreamIdentifier);
+  RavelDescriptorSlot_Release(pDataComponent);
+  RavelDescriptorSlot_Release(pTargetRegion);
 }
 
 int RavelCMapInfo::ParseRawData(unsigned char* entry) {
@@ -171,17 +169,10 @@ RavelCPMT::~RavelCPMT() {
   DeleteParentalRating();
 }
 
-void RavelCPMT::DeleteStreams() {
-  for (int i = 0; i < aMapInfoList.iCount; ++i) {
-    delete aMapInfoList.ipArray[i];
-    aMapInfoList.ipArray[i] = 0;
-  }
-  aMapInfoList.iCount = 0;
-}
+void RavelCPMT::DeleteStreams() { RavelRecordList_DeleteAll(aMapInfoList); }
 
 void RavelCPMT::DeleteParentalRating() {
-  delete pParentalRating;
-  pParentalRating = 0;
+  RavelDescriptorSlot_Release(pParentalRating);
 }
 
 int RavelCPMT::ParseRawData(unsigned char* section) {

@@ -5,6 +5,7 @@
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
 #include "Ravel_DescriptorSlot.h"
+#include "Ravel_RecordList.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableSDT");
 
@@ -67,12 +68,9 @@ void RavelCServiceDescription::ClearScalars() {
 }
 
 void RavelCServiceDescription::DeleteDescriptors() {
-  delete pService;
-  pService = 0;
-  delete pLogoTransmission;
-  pLogoTransmission = 0;
-  delete pCountryAvailability;
-  pCountryAvailability = 0;
+  RavelDescriptorSlot_Release(pService);
+  RavelDescriptorSlot_Release(pLogoTransmission);
+  RavelDescriptorSlot_Release(pCountryAvailability);
 }
 
 int RavelCServiceDescription::ParseRawData(unsigned char* entry) {
@@ -169,13 +167,7 @@ RavelCSDT& RavelCSDT::operator+=(RavelCSDT& other) {
 
 RavelCSDT::~RavelCSDT() { DeleteServices(); }
 
-void RavelCSDT::DeleteServices() {
-  for (int i = 0; i < aServiceList.iCount; ++i) {
-    delete aServiceList.ipArray[i];
-    aServiceList.ipArray[i] = 0;
-  }
-  aServiceList.iCount = 0;
-}
+void RavelCSDT::DeleteServices() { RavelRecordList_DeleteAll(aServiceList); }
 
 int RavelCSDT::ParseRawData(unsigned char* section) {
   DeleteServices();

@@ -35,8 +35,7 @@ RavelCDsmccStreamEvent& RavelCDsmccStreamEvent::operator=(RavelCDsmccStreamEvent
 RavelCDsmccStreamEvent::~RavelCDsmccStreamEvent() { ReleaseDescriptors(); }
 
 void RavelCDsmccStreamEvent::ReleaseDescriptors() {
-  delete pNPTReference;
-  pNPTReference = 0;
+  RavelDescriptorSlot_Release(pNPTReference);
   RavelRecordList_DeleteAll(cGeneralEvents);
 }
 

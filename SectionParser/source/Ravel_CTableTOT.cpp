@@ -30,8 +30,7 @@ RavelCTOT::RavelCTOT(RavelCTOT& other) : sTableName(), pLocalTimeOffsetDescripto
 
 RavelCTOT& RavelCTOT::operator=(RavelCTOT& other) {
   // Released before `other` is read: a table assigned to itself loses its descriptor.
-  delete pLocalTimeOffsetDescriptor;
-  pLocalTimeOffsetDescriptor = 0;
+  RavelDescriptorSlot_Release(pLocalTimeOffsetDescriptor);
   sTableName = other.sTableName;
   iTableId = other.iTableId;
   bSectionSyntaxIndicator = other.bSectionSyntaxIndicator;

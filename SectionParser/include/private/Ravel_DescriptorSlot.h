@@ -10,17 +10,24 @@ T* RavelDescriptorSlot_CopyOf(T* source) {
   return source != 0 ? new T(*source) : 0;
 }
 
+// Releases the descriptor held and leaves the slot empty.
+template <class T>
+void RavelDescriptorSlot_Release(T*& slot) {
+  delete slot;
+  slot = 0;
+}
+
 // Releases the descriptor held and keeps one built from `raw` instead.
 template <class T>
 void RavelDescriptorSlot_Replace(T*& slot, unsigned char* raw) {
-  delete slot;
+  RavelDescriptorSlot_Release(slot);
   slot = new T(raw);
 }
 
 // Releases the descriptor held and keeps a copy of `source` (or none).
 template <class T>
 void RavelDescriptorSlot_CopyFrom(T*& slot, T* source) {
-  delete slot;
+  RavelDescriptorSlot_Release(slot);
   slot = RavelDescriptorSlot_CopyOf(source);
 }
 
