@@ -36,7 +36,6 @@ class RavelCTSInformationDescriptor : public RavelCDescriptorBase {
   RavelCTxType cTxTypes[kTxTypeSlots];
 
  private:
-  void Release();
   void ClearTxTypes();
 };
 

@@ -18,24 +18,9 @@ RavelCApplicationDescriptor::RavelCApplicationDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
-RavelCApplicationDescriptor::RavelCApplicationDescriptor(RavelCApplicationDescriptor& other)
-    : RavelCDescriptorBase(other) {
-  Clear();
-  *this = other;
-}
+RavelCApplicationDescriptor::RavelCApplicationDescriptor(RavelCApplicationDescriptor&) = default;
 
-RavelCApplicationDescriptor& RavelCApplicationDescriptor::operator=(RavelCApplicationDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iApplicationProfile = other.iApplicationProfile;
-  iVersionMajor = other.iVersionMajor;
-  iVersionMinor = other.iVersionMinor;
-  iVersionMicro = other.iVersionMicro;
-  bServiceBoundFlag = other.bServiceBoundFlag;
-  iVisibility = other.iVisibility;
-  iAppPriority = other.iAppPriority;
-  iAppTransportLabel = other.iAppTransportLabel;
-  return *this;
-}
+RavelCApplicationDescriptor& RavelCApplicationDescriptor::operator=(RavelCApplicationDescriptor&) = default;
 
 RavelCApplicationDescriptor::~RavelCApplicationDescriptor() {}
 

@@ -23,19 +23,9 @@ RavelCApplicationNameDescriptor::RavelCApplicationNameDescriptor(unsigned char* 
   ParseRawData(raw);
 }
 
-RavelCApplicationNameDescriptor::RavelCApplicationNameDescriptor(RavelCApplicationNameDescriptor& other)
-    : RavelCDescriptorBase(other) {
-  Clear();
-  *this = other;
-}
+RavelCApplicationNameDescriptor::RavelCApplicationNameDescriptor(RavelCApplicationNameDescriptor&) = default;
 
-RavelCApplicationNameDescriptor& RavelCApplicationNameDescriptor::operator=(
-    RavelCApplicationNameDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  std::memcpy(szISOLanguageCode, other.szISOLanguageCode, sizeof(szISOLanguageCode));
-  std::memcpy(szApplicationName, other.szApplicationName, sizeof(szApplicationName));
-  return *this;
-}
+RavelCApplicationNameDescriptor& RavelCApplicationNameDescriptor::operator=(RavelCApplicationNameDescriptor&) = default;
 
 RavelCApplicationNameDescriptor::~RavelCApplicationNameDescriptor() {}
 

@@ -30,29 +30,9 @@ RavelCAudioComponentDescriptor::RavelCAudioComponentDescriptor(unsigned char* ra
   ParseRawData(raw);
 }
 
-RavelCAudioComponentDescriptor::RavelCAudioComponentDescriptor(RavelCAudioComponentDescriptor& other)
-    : RavelCDescriptorBase(other) {
-  Clear();
-  *this = other;
-}
+RavelCAudioComponentDescriptor::RavelCAudioComponentDescriptor(RavelCAudioComponentDescriptor&) = default;
 
-RavelCAudioComponentDescriptor& RavelCAudioComponentDescriptor::operator=(RavelCAudioComponentDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iStreamContent = other.iStreamContent;
-  iComponentType = other.iComponentType;
-  iComponentTag = other.iComponentTag;
-  iStreamType = other.iStreamType;
-  iSimulcastGroupTag = other.iSimulcastGroupTag;
-  iESMultiLingualFlag = other.iESMultiLingualFlag;
-  iMainComponentFlag = other.iMainComponentFlag;
-  iQualityIndicator = other.iQualityIndicator;
-  iSampleRate = other.iSampleRate;
-  iISO639LanguageCode = other.iISO639LanguageCode;
-  std::memcpy(szLanguageCode, other.szLanguageCode, sizeof(szLanguageCode));
-  iISO639LanguageCode2 = other.iISO639LanguageCode2;
-  std::memcpy(szLanguageCode2, other.szLanguageCode2, sizeof(szLanguageCode2));
-  return *this;
-}
+RavelCAudioComponentDescriptor& RavelCAudioComponentDescriptor::operator=(RavelCAudioComponentDescriptor&) = default;
 
 RavelCAudioComponentDescriptor::~RavelCAudioComponentDescriptor() {}
 

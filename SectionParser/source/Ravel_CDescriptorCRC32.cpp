@@ -20,16 +20,9 @@ RavelCCRC32Descriptor::RavelCCRC32Descriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
-RavelCCRC32Descriptor::RavelCCRC32Descriptor(RavelCCRC32Descriptor& other) : RavelCDescriptorBase(other) {
-  std::memset(aCRC32, 0, sizeof(aCRC32));
-  *this = other;
-}
+RavelCCRC32Descriptor::RavelCCRC32Descriptor(RavelCCRC32Descriptor&) = default;
 
-RavelCCRC32Descriptor& RavelCCRC32Descriptor::operator=(RavelCCRC32Descriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  std::memmove(aCRC32, other.aCRC32, sizeof(aCRC32));
-  return *this;
-}
+RavelCCRC32Descriptor& RavelCCRC32Descriptor::operator=(RavelCCRC32Descriptor&) = default;
 
 RavelCCRC32Descriptor::~RavelCCRC32Descriptor() {}
 

@@ -15,19 +15,9 @@ RavelCComponentDescriptor::RavelCComponentDescriptor(unsigned char* raw)
   ParseRawData(raw);
 }
 
-RavelCComponentDescriptor::RavelCComponentDescriptor(RavelCComponentDescriptor& other)
-    : RavelCDescriptorBase(other), iStreamContent(0), iComponentType(0), iComponentTag(0), iISO639LanguageCode(0) {
-  *this = other;
-}
+RavelCComponentDescriptor::RavelCComponentDescriptor(RavelCComponentDescriptor&) = default;
 
-RavelCComponentDescriptor& RavelCComponentDescriptor::operator=(RavelCComponentDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iStreamContent = other.iStreamContent;
-  iComponentType = other.iComponentType;
-  iComponentTag = other.iComponentTag;
-  iISO639LanguageCode = other.iISO639LanguageCode;
-  return *this;
-}
+RavelCComponentDescriptor& RavelCComponentDescriptor::operator=(RavelCComponentDescriptor&) = default;
 
 RavelCComponentDescriptor::~RavelCComponentDescriptor() {}
 

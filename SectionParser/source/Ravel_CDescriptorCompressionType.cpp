@@ -19,17 +19,9 @@ RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(unsigned char* 
   ParseRawData(raw);
 }
 
-RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(RavelCCompressionTypeDescriptor& other)
-    : RavelCDescriptorBase(other), iCompressionType(0), iOriginalSize(0) {
-  *this = other;
-}
+RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(RavelCCompressionTypeDescriptor&) = default;
 
-RavelCCompressionTypeDescriptor& RavelCCompressionTypeDescriptor::operator=(RavelCCompressionTypeDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iCompressionType = other.iCompressionType;
-  iOriginalSize = other.iOriginalSize;
-  return *this;
-}
+RavelCCompressionTypeDescriptor& RavelCCompressionTypeDescriptor::operator=(RavelCCompressionTypeDescriptor&) = default;
 
 RavelCCompressionTypeDescriptor::~RavelCCompressionTypeDescriptor() {}
 

@@ -14,16 +14,9 @@ RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(unsigned char* raw)
   ParseRawData(raw);
 }
 
-RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(RavelCDataComponentDescriptor& other)
-    : RavelCDescriptorBase(other), iDataComponentId(0) {
-  *this = other;
-}
+RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(RavelCDataComponentDescriptor&) = default;
 
-RavelCDataComponentDescriptor& RavelCDataComponentDescriptor::operator=(RavelCDataComponentDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iDataComponentId = other.iDataComponentId;
-  return *this;
-}
+RavelCDataComponentDescriptor& RavelCDataComponentDescriptor::operator=(RavelCDataComponentDescriptor&) = default;
 
 RavelCDataComponentDescriptor::~RavelCDataComponentDescriptor() {}
 

@@ -18,16 +18,9 @@ RavelCEstDownloadTimeDescriptor::RavelCEstDownloadTimeDescriptor(unsigned char* 
   ParseRawData(raw);
 }
 
-RavelCEstDownloadTimeDescriptor::RavelCEstDownloadTimeDescriptor(RavelCEstDownloadTimeDescriptor& other)
-    : RavelCDescriptorBase(other), iEstDownloadTime(0) {
-  *this = other;
-}
+RavelCEstDownloadTimeDescriptor::RavelCEstDownloadTimeDescriptor(RavelCEstDownloadTimeDescriptor&) = default;
 
-RavelCEstDownloadTimeDescriptor& RavelCEstDownloadTimeDescriptor::operator=(RavelCEstDownloadTimeDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iEstDownloadTime = other.iEstDownloadTime;
-  return *this;
-}
+RavelCEstDownloadTimeDescriptor& RavelCEstDownloadTimeDescriptor::operator=(RavelCEstDownloadTimeDescriptor&) = default;
 
 RavelCEstDownloadTimeDescriptor::~RavelCEstDownloadTimeDescriptor() {}
 

@@ -19,24 +19,9 @@ RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(unsigne
   ParseRawData(raw);
 }
 
-RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(RavelCExtendedBroadcasterDescriptor& other)
-    : RavelCDescriptorBase(other), iBroadcasterType(0), iTerrestrialBroadcasterId(0) {
-  Release();
-  *this = other;
-}
+RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(RavelCExtendedBroadcasterDescriptor&) = default;
 
-RavelCExtendedBroadcasterDescriptor& RavelCExtendedBroadcasterDescriptor::operator=(
-    RavelCExtendedBroadcasterDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iBroadcasterType = other.iBroadcasterType;
-  iTerrestrialBroadcasterId = other.iTerrestrialBroadcasterId;
-  iNumberOfAffiliationIds = other.iNumberOfAffiliationIds;
-  iNumberOfBroadcasterIds = other.iNumberOfBroadcasterIds;
-  std::memmove(aAffiliationIds, other.aAffiliationIds, sizeof(aAffiliationIds));
-  std::memmove(aOriginalNetworkIds, other.aOriginalNetworkIds, sizeof(aOriginalNetworkIds));
-  std::memmove(aBroadcasterIds, other.aBroadcasterIds, sizeof(aBroadcasterIds));
-  return *this;
-}
+RavelCExtendedBroadcasterDescriptor& RavelCExtendedBroadcasterDescriptor::operator=(RavelCExtendedBroadcasterDescriptor&) = default;
 
 RavelCExtendedBroadcasterDescriptor::~RavelCExtendedBroadcasterDescriptor() {}
 

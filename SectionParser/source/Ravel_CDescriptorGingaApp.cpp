@@ -20,16 +20,9 @@ RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
-RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(RavelCGingaAppDescriptor& other) : RavelCDescriptorBase(other) {
-  std::memset(szParameter, 0, sizeof(szParameter));
-  *this = other;
-}
+RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(RavelCGingaAppDescriptor&) = default;
 
-RavelCGingaAppDescriptor& RavelCGingaAppDescriptor::operator=(RavelCGingaAppDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  std::memcpy(szParameter, other.szParameter, sizeof(szParameter));
-  return *this;
-}
+RavelCGingaAppDescriptor& RavelCGingaAppDescriptor::operator=(RavelCGingaAppDescriptor&) = default;
 
 RavelCGingaAppDescriptor::~RavelCGingaAppDescriptor() {}
 

@@ -21,19 +21,9 @@ RavelCGingaAppLocDescriptor::RavelCGingaAppLocDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
-RavelCGingaAppLocDescriptor::RavelCGingaAppLocDescriptor(RavelCGingaAppLocDescriptor& other)
-    : RavelCDescriptorBase(other) {
-  Clear();
-  *this = other;
-}
+RavelCGingaAppLocDescriptor::RavelCGingaAppLocDescriptor(RavelCGingaAppLocDescriptor&) = default;
 
-RavelCGingaAppLocDescriptor& RavelCGingaAppLocDescriptor::operator=(RavelCGingaAppLocDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  std::memcpy(sBaseDirectory, other.sBaseDirectory, sizeof(sBaseDirectory));
-  std::memcpy(sClassPath, other.sClassPath, sizeof(sClassPath));
-  std::memcpy(sInicialClassName, other.sInicialClassName, sizeof(sInicialClassName));
-  return *this;
-}
+RavelCGingaAppLocDescriptor& RavelCGingaAppLocDescriptor::operator=(RavelCGingaAppLocDescriptor&) = default;
 
 RavelCGingaAppLocDescriptor::~RavelCGingaAppLocDescriptor() {}
 

@@ -15,19 +15,9 @@ RavelCLinkageDescriptor::RavelCLinkageDescriptor(unsigned char* raw)
   ParseRawData(raw);
 }
 
-RavelCLinkageDescriptor::RavelCLinkageDescriptor(RavelCLinkageDescriptor& other)
-    : RavelCDescriptorBase(other), iTransportStreamId(0), iOriginalNetworkId(0), iServiceId(0), iLinkageType(0) {
-  *this = other;
-}
+RavelCLinkageDescriptor::RavelCLinkageDescriptor(RavelCLinkageDescriptor&) = default;
 
-RavelCLinkageDescriptor& RavelCLinkageDescriptor::operator=(RavelCLinkageDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iTransportStreamId = other.iTransportStreamId;
-  iOriginalNetworkId = other.iOriginalNetworkId;
-  iServiceId = other.iServiceId;
-  iLinkageType = other.iLinkageType;
-  return *this;
-}
+RavelCLinkageDescriptor& RavelCLinkageDescriptor::operator=(RavelCLinkageDescriptor&) = default;
 
 RavelCLinkageDescriptor::~RavelCLinkageDescriptor() {}
 

@@ -15,16 +15,9 @@ const RavelCDescriptorKind RavelCLocationDescriptor::kKind = {
 
 RavelCLocationDescriptor::RavelCLocationDescriptor(unsigned char* raw) : iLocationTag(0) { ParseRawData(raw); }
 
-RavelCLocationDescriptor::RavelCLocationDescriptor(RavelCLocationDescriptor& other)
-    : RavelCDescriptorBase(other), iLocationTag(0) {
-  *this = other;
-}
+RavelCLocationDescriptor::RavelCLocationDescriptor(RavelCLocationDescriptor&) = default;
 
-RavelCLocationDescriptor& RavelCLocationDescriptor::operator=(RavelCLocationDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iLocationTag = other.iLocationTag;
-  return *this;
-}
+RavelCLocationDescriptor& RavelCLocationDescriptor::operator=(RavelCLocationDescriptor&) = default;
 
 RavelCLocationDescriptor::~RavelCLocationDescriptor() {}
 

@@ -18,17 +18,9 @@ RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(unsigned char* raw) : iPo
   ParseRawData(raw);
 }
 
-RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(RavelCModuleLinkDescriptor& other)
-    : RavelCDescriptorBase(other), iPosition(0), iModuleId(0) {
-  *this = other;
-}
+RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(RavelCModuleLinkDescriptor&) = default;
 
-RavelCModuleLinkDescriptor& RavelCModuleLinkDescriptor::operator=(RavelCModuleLinkDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iPosition = other.iPosition;
-  iModuleId = other.iModuleId;
-  return *this;
-}
+RavelCModuleLinkDescriptor& RavelCModuleLinkDescriptor::operator=(RavelCModuleLinkDescriptor&) = default;
 
 RavelCModuleLinkDescriptor::~RavelCModuleLinkDescriptor() {}
 

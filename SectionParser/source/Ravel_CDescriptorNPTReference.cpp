@@ -40,22 +40,9 @@ RavelCNPTReferenceDescriptor::RavelCNPTReferenceDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
-RavelCNPTReferenceDescriptor::RavelCNPTReferenceDescriptor(RavelCNPTReferenceDescriptor& other)
-    : RavelCDescriptorBase(other) {
-  ClearFields(*this);
-  *this = other;
-}
+RavelCNPTReferenceDescriptor::RavelCNPTReferenceDescriptor(RavelCNPTReferenceDescriptor&) = default;
 
-RavelCNPTReferenceDescriptor& RavelCNPTReferenceDescriptor::operator=(RavelCNPTReferenceDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iPostDiscontinuityIndicator = other.iPostDiscontinuityIndicator;
-  iContentId = other.iContentId;
-  std::memmove(aSTCReference, other.aSTCReference, sizeof(aSTCReference));
-  std::memmove(aNPTReference, other.aNPTReference, sizeof(aNPTReference));
-  iScaleNumerator = other.iScaleNumerator;
-  iScaleDenominator = other.iScaleDenominator;
-  return *this;
-}
+RavelCNPTReferenceDescriptor& RavelCNPTReferenceDescriptor::operator=(RavelCNPTReferenceDescriptor&) = default;
 
 RavelCNPTReferenceDescriptor::~RavelCNPTReferenceDescriptor() {}
 

@@ -16,15 +16,9 @@ const RavelCDescriptorKind RavelCNameDescriptor::kKind = {
 
 RavelCNameDescriptor::RavelCNameDescriptor(unsigned char* raw) : sFileName() { ParseRawData(raw); }
 
-RavelCNameDescriptor::RavelCNameDescriptor(RavelCNameDescriptor& other) : RavelCDescriptorBase(other), sFileName() {
-  *this = other;
-}
+RavelCNameDescriptor::RavelCNameDescriptor(RavelCNameDescriptor&) = default;
 
-RavelCNameDescriptor& RavelCNameDescriptor::operator=(RavelCNameDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  sFileName = other.sFileName;
-  return *this;
-}
+RavelCNameDescriptor& RavelCNameDescriptor::operator=(RavelCNameDescriptor&) = default;
 
 RavelCNameDescriptor::~RavelCNameDescriptor() {}
 

@@ -15,16 +15,9 @@ RavelCNetworkNameDescriptor::RavelCNetworkNameDescriptor(unsigned char* raw) : s
   ParseRawData(raw);
 }
 
-RavelCNetworkNameDescriptor::RavelCNetworkNameDescriptor(RavelCNetworkNameDescriptor& other)
-    : RavelCDescriptorBase(other), sNetworkName() {
-  *this = other;
-}
+RavelCNetworkNameDescriptor::RavelCNetworkNameDescriptor(RavelCNetworkNameDescriptor&) = default;
 
-RavelCNetworkNameDescriptor& RavelCNetworkNameDescriptor::operator=(RavelCNetworkNameDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  sNetworkName = other.sNetworkName;
-  return *this;
-}
+RavelCNetworkNameDescriptor& RavelCNetworkNameDescriptor::operator=(RavelCNetworkNameDescriptor&) = default;
 
 RavelCNetworkNameDescriptor::~RavelCNetworkNameDescriptor() {}
 

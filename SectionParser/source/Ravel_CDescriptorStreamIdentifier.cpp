@@ -13,17 +13,9 @@ RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(unsigned char
   ParseRawData(raw);
 }
 
-RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(RavelCStreamIdentifierDescriptor& other)
-    : RavelCDescriptorBase(other), iComponentTag(0) {
-  *this = other;
-}
+RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(RavelCStreamIdentifierDescriptor&) = default;
 
-RavelCStreamIdentifierDescriptor& RavelCStreamIdentifierDescriptor::operator=(
-    RavelCStreamIdentifierDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iComponentTag = other.iComponentTag;
-  return *this;
-}
+RavelCStreamIdentifierDescriptor& RavelCStreamIdentifierDescriptor::operator=(RavelCStreamIdentifierDescriptor&) = default;
 
 RavelCStreamIdentifierDescriptor::~RavelCStreamIdentifierDescriptor() {}
 

@@ -15,22 +15,9 @@ RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(unsigned char
   ParseRawData(raw);
 }
 
-RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(RavelCSystemManagementDescriptor& other)
-    : RavelCDescriptorBase(other),
-      iBroadcastingFlag(0),
-      iBroadcastingIdentifier(0),
-      iAdditionalBroadcastingIdentification(0) {
-  *this = other;
-}
+RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(RavelCSystemManagementDescriptor&) = default;
 
-RavelCSystemManagementDescriptor& RavelCSystemManagementDescriptor::operator=(
-    RavelCSystemManagementDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  iBroadcastingFlag = other.iBroadcastingFlag;
-  iBroadcastingIdentifier = other.iBroadcastingIdentifier;
-  iAdditionalBroadcastingIdentification = other.iAdditionalBroadcastingIdentification;
-  return *this;
-}
+RavelCSystemManagementDescriptor& RavelCSystemManagementDescriptor::operator=(RavelCSystemManagementDescriptor&) = default;
 
 RavelCSystemManagementDescriptor::~RavelCSystemManagementDescriptor() {}
 

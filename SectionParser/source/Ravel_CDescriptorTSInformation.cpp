@@ -15,28 +15,11 @@ RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(unsigned char* raw)
   ParseRawData(raw);
 }
 
-RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(RavelCTSInformationDescriptor& other)
-    : RavelCDescriptorBase(other), iRemoteControlKeyId(0), sTsName(), iTransmissionTypeCount(0) {
-  *this = other;
-}
+RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(RavelCTSInformationDescriptor&) = default;
 
-RavelCTSInformationDescriptor& RavelCTSInformationDescriptor::operator=(RavelCTSInformationDescriptor& other) {
-  if (this == &other) return *this;
-  Release();
-  RavelCDescriptorBase::operator=(other);
-  iRemoteControlKeyId = other.iRemoteControlKeyId;
-  sTsName = other.sTsName;
-  iTransmissionTypeCount = other.iTransmissionTypeCount;
-  for (int i = 0; i < kTxTypeSlots; ++i) cTxTypes[i] = other.cTxTypes[i];
-  return *this;
-}
+RavelCTSInformationDescriptor& RavelCTSInformationDescriptor::operator=(RavelCTSInformationDescriptor&) = default;
 
 RavelCTSInformationDescriptor::~RavelCTSInformationDescriptor() {}
-
-void RavelCTSInformationDescriptor::Release() {
-  sTsName = "";
-  ClearTxTypes();
-}
 
 void RavelCTSInformationDescriptor::ClearTxTypes() {
   for (int i = 0; i < kTxTypeSlots; ++i) cTxTypes[i].ParseRawData(0);

@@ -16,15 +16,9 @@ const RavelCDescriptorKind RavelCTypeDescriptor::kKind = {
 
 RavelCTypeDescriptor::RavelCTypeDescriptor(unsigned char* raw) : sType() { ParseRawData(raw); }
 
-RavelCTypeDescriptor::RavelCTypeDescriptor(RavelCTypeDescriptor& other) : RavelCDescriptorBase(other), sType() {
-  *this = other;
-}
+RavelCTypeDescriptor::RavelCTypeDescriptor(RavelCTypeDescriptor&) = default;
 
-RavelCTypeDescriptor& RavelCTypeDescriptor::operator=(RavelCTypeDescriptor& other) {
-  RavelCDescriptorBase::operator=(other);
-  sType = other.sType;
-  return *this;
-}
+RavelCTypeDescriptor& RavelCTypeDescriptor::operator=(RavelCTypeDescriptor&) = default;
 
 RavelCTypeDescriptor::~RavelCTypeDescriptor() {}
 
