@@ -64,13 +64,7 @@ RavelCPAT& RavelCPAT::operator=(RavelCPAT& other) {
   iNetworkPID = other.iNetworkPID;
   // The target's programs go first, so assigning a table to itself empties it.
   DeletePrograms();
-  for (int i = 0; i < other.aProgramList.iCount; ++i) {
-    RavelCPMTInfo* source = other.aProgramList.ipArray[i];
-    RavelCPMTInfo* copy = new RavelCPMTInfo(0);
-    copy->iProgramNumber = source->iProgramNumber;
-    copy->iPID = source->iPID;
-    aProgramList.Append(copy);
-  }
+  RavelRecordList_AppendCopies(aProgramList, other.aProgramList);
   return *this;
 }
 
