@@ -20,6 +20,15 @@ endif()
 string(REPLACE "|" ";" emulator "${EMULATOR}")
 if(MODE STREQUAL "installed")
   run(${CMAKE_COMMAND} --install ${BINARY_DIR} --prefix ${WORK_DIR}/prefix)
+  # Only the API is installed: none of the library's private helper headers.
+  file(GLOB private_headers RELATIVE ${SOURCE_DIR}/SectionParser/include/private
+       ${SOURCE_DIR}/SectionParser/include/private/*.h)
+  foreach(header ${private_headers})
+    file(GLOB_RECURSE installed ${WORK_DIR}/prefix/${header})
+    if(installed)
+      message(FATAL_ERROR "private header installed: ${installed}")
+    endif()
+  endforeach()
   run(${CMAKE_COMMAND} -S ${consumer_source} -B ${WORK_DIR}/build -DCMAKE_PREFIX_PATH=${WORK_DIR}/prefix
       ${build_options})
 else()
