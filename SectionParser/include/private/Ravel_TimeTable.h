@@ -25,10 +25,9 @@ void RavelTimeTable_Clear(TimeTable& table) {
 }
 
 // Null clears the fields and gives -9. A foreign table_id is stored, traced
-// ("Table ID isn't for <name>! ..." at error level, from `sourcePath` and
-// `sourceLine`) and
-// gives -8 with the other fields as they were. Otherwise the name is set and
-// the header and time are read: 0.
+// ("Table ID isn't for <name>! ..." at error level, from the caller's
+// `sourcePath` and `sourceLine`) and gives -8 with the other fields as they
+// were. Otherwise the name is set and the header and time are read: 0.
 template <class TimeTable>
 int RavelTimeTable_ParseHeaderAndTime(TimeTable& table, unsigned char* section, unsigned char tableId,
                                       const char* name, const char* sourcePath, int sourceLine) {
