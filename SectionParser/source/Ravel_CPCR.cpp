@@ -24,12 +24,9 @@ unsigned long long ClockOf(const unsigned char* adaptation) {
 
 RavelCPCR::RavelCPCR(unsigned char* packet) : mPCR(0) { ParseRawData(packet); }
 
-RavelCPCR::RavelCPCR(const RavelCPCR& other) : mPCR(other.mPCR) {}
+RavelCPCR::RavelCPCR(const RavelCPCR&) = default;
 
-RavelCPCR& RavelCPCR::operator=(const RavelCPCR& other) {
-  mPCR = other.mPCR;
-  return *this;
-}
+RavelCPCR& RavelCPCR::operator=(const RavelCPCR&) = default;
 
 RavelCPCR::~RavelCPCR() {}
 
