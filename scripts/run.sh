@@ -13,7 +13,7 @@ cmake -S . -B build -DCMAKE_BUILD_TYPE=RelWithDebInfo >build/configure.log 2>&1 
   cat build/configure.log >&2
   exit 1
 }
-step "building the library and ravel-dump on $(nproc) cores (about a minute the first time; log in build/build.log)"
+step "building the library and ravel-dump on $(nproc) cores (a minute or two the first time; log in build/build.log)"
 cmake --build build -j"$(nproc)" --target ravel-dump >build/build.log 2>&1 || {
   cat build/build.log >&2
   exit 1
