@@ -402,13 +402,14 @@ TEST_F(RavelDumpTest, WithoutAFileAPipeIsReadAndATerminalRefused) {
   EXPECT_NE(std::string::npos, terminal.err.find("no capture given")) << terminal.err;
 }
 
-// Long options named at the start of a help line ("  -s, --summary ...").
+// Long options in the option column of the help ("  -s, --summary ...",
+// "      --sections ..."), not those named in descriptions.
 std::set<std::string> HelpOptions(const std::string& help) {
   std::set<std::string> options;
   std::istringstream lines(help);
   std::smatch match;
   for (std::string line; std::getline(lines, line);) {
-    if (std::regex_search(line, match, std::regex("^  (-\\w, )? *(--[a-z][a-z-]*)"))) options.insert(match[2]);
+    if (std::regex_search(line, match, std::regex("^  (-\\w, |    )(--[a-z][a-z-]*)"))) options.insert(match[2]);
   }
   return options;
 }
