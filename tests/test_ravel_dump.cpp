@@ -14,6 +14,8 @@
 #include <filesystem>
 #include <fstream>
 #include <iterator>
+#include <regex>
+#include <set>
 #include <sstream>
 #include <string>
 #include <vector>
@@ -78,11 +80,28 @@ class RavelDumpTest : public ::testing::Test {
 
   // Runs the tool with `args`; `input` becomes its standard input.
   ToolRun Run(const std::vector<std::string>& args, const Bytes& input = Bytes()) const {
-    std::string in = Path(".stdin"), out = Path(".stdout"), err = Path(".stderr");
-    WriteFile(in, input);
+    WriteFile(Path(".stdin"), input);
+    return Launch(args, Path(".stdin"));
+  }
+
+  // Runs the tool with a terminal as its standard input.
+  ToolRun RunAtTerminal(const std::vector<std::string>& args) const {
+    int terminal = posix_openpt(O_RDWR | O_NOCTTY);
+    if (terminal < 0 || grantpt(terminal) != 0 || unlockpt(terminal) != 0) {
+      ADD_FAILURE() << "no pseudo-terminal";
+      return ToolRun();
+    }
+    ToolRun run = Launch(args, ptsname(terminal));
+    close(terminal);
+    return run;
+  }
+
+  // Runs the tool with `args` and the file `in` as its standard input.
+  ToolRun Launch(const std::vector<std::string>& args, const std::string& in) const {
+    std::string out = Path(".stdout"), err = Path(".stderr");
     pid_t child = fork();
     if (child == 0) {
-      int fdIn = open(in.c_str(), O_RDONLY);
+      int fdIn = open(in.c_str(), O_RDONLY | O_NOCTTY);
       int fdOut = open(out.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
       int fdErr = open(err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
       dup2(fdIn, 0);
@@ -355,7 +374,7 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
     std::vector<std::string> args;
     const char* message;
   } cases[] = {
-      {{}, "no capture given"}, {{"--frobnicate", file}, "frobnicate"},
+      {{"--frobnicate", file}, "frobnicate"},
       {{"--standard", "mars", file}, "unknown standard 'mars'"}, {{"--pid", "9000", file}, "bad PID '9000'"},
       {{"--pid", "0x10,zz", file}, "bad PID 'zz'"}, {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
       {{"--trace", "loud", file}, "unknown trace level 'loud'"},
@@ -367,6 +386,124 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
     EXPECT_EQ("", run.out) << c.message;
     EXPECT_EQ(1u, Lines(run.err)) << run.err;
     EXPECT_NE(std::string::npos, run.err.find(c.message)) << run.err;
+  }
+}
+
+TEST_F(RavelDumpTest, WithoutAFileAPipeIsReadAndATerminalRefused) {
+  Bytes stream = SamplePatStream();
+  ToolRun named = Run({Write("pat.ts", stream)});
+  ToolRun piped = Run({}, stream);
+  EXPECT_EQ(0, piped.status) << piped.err;
+  EXPECT_EQ(named.out, piped.out);
+  EXPECT_NE(std::string::npos, piped.err.find("report: standard input"));
+  ToolRun terminal = RunAtTerminal({});
+  EXPECT_EQ(2, terminal.status);
+  EXPECT_EQ("", terminal.out);
+  EXPECT_NE(std::string::npos, terminal.err.find("no capture given")) << terminal.err;
+}
+
+// Long options in the option column of the help ("  -s, --summary ...",
+// "      --sections ..."), not those named in descriptions.
+std::set<std::string> HelpOptions(const std::string& help) {
+  std::set<std::string> options;
+  std::istringstream lines(help);
+  std::smatch match;
+  for (std::string line; std::getline(lines, line);) {
+    if (std::regex_search(line, match, std::regex("^  (-\\w, |    )(--[a-z][a-z-]*)"))) options.insert(match[2]);
+  }
+  return options;
+}
+
+// Long options in the tags of the manual page's OPTIONS entries (the line
+// after each .TP, "\-\-summary" in troff).
+std::set<std::string> ManualOptions(const std::string& manual) {
+  std::set<std::string> options;
+  std::istringstream lines(manual);
+  bool inOptions = false, tag = false;
+  for (std::string line; std::getline(lines, line);) {
+    if (line.rfind(".SH", 0) == 0) inOptions = line == ".SH OPTIONS";
+    if (inOptions && tag) {
+      std::smatch match;
+      if (std::regex_search(line, match, std::regex(R"(\\-\\-([a-z](\\-|[a-z])*))"))) {
+        options.insert("--" + std::regex_replace(match[1].str(), std::regex(R"(\\-)"), "-"));
+      }
+    }
+    tag = line == ".TP";
+  }
+  return options;
+}
+
+TEST_F(RavelDumpTest, EveryOptionIsInTheHelpAndTheManualPage) {
+  ToolRun help = Run({"--help"});
+  std::set<std::string> inHelp = HelpOptions(help.out);
+  std::set<std::string> inManual = ManualOptions(ReadFile(RAVEL_DUMP_MANUAL));
+  EXPECT_GE(inHelp.size(), 12u) << help.out;
+  for (const std::string& option : inHelp) EXPECT_EQ(1u, inManual.count(option)) << option << " missing from the manual page";
+  for (const std::string& option : inManual) EXPECT_EQ(1u, inHelp.count(option)) << option << " is not an option any more";
+}
+
+TEST_F(RavelDumpTest, BashCompletionOffersOptionsAndTheirValues) {
+#ifdef RAVEL_DUMP_EMULATOR
+  GTEST_SKIP() << "the completion runs the tool itself, which needs the emulator here";
+#endif
+  struct Case {
+    std::string words;  // the command line up to the word being completed
+    std::string offered;
+  } cases[] = {
+      {/*words=*/"--sta", /*offered=*/"--standard"},
+      {/*words=*/"--no-p", /*offered=*/"--no-progress"},
+      {/*words=*/"--standard j", /*offered=*/"japan"},
+      {/*words=*/"--table pat,e", /*offered=*/"pat,eit"},
+      {/*words=*/"--trace dump,wa", /*offered=*/"dump,warning"},
+  };
+  for (const Case& c : cases) {
+    std::string script = Path("complete.sh");
+    std::ofstream(script) << "source '" RAVEL_DUMP_COMPLETION "'\n"
+                          << "COMP_WORDS=('" RAVEL_DUMP_PATH "' " << c.words << ")\n"
+                          << "COMP_CWORD=$((${#COMP_WORDS[@]} - 1))\n"
+                          << "_ravel_dump\n"
+                          << "printf '%s\\n' \"${COMPREPLY[@]}\"\n";
+    FILE* bash = popen(("bash " + script).c_str(), "r");
+    ASSERT_NE(nullptr, bash);
+    std::string offered;
+    for (int ch; (ch = std::fgetc(bash)) != EOF;) offered += static_cast<char>(ch);
+    pclose(bash);
+    EXPECT_EQ(c.offered + "\n", offered) << c.words;
+  }
+}
+
+TEST_F(RavelDumpTest, RawSectionsAreToldFromPacketsByTheirBytes) {
+  Bytes sections = sb::Cat({Bytes(3, 0xFF), PatSection(0x1234, 3, {{1, 0x0100}}), AitSection("Quiz", "/", "a.ncl")});
+  Bytes badCrc = sections;
+  badCrc[3 + 8] ^= 0x01;
+  struct Case {
+    const char* what;
+    std::vector<std::string> args;  // "@" stands for the case's file
+    Bytes file;
+    Bytes input;
+    int status;
+    const char* inReport;
+  } cases[] = {
+      {/*what=*/"sections", /*args=*/{"@"}, /*file=*/sections, /*input=*/{}, /*status=*/0,
+       /*inReport=*/"bytes of raw sections"},
+      {/*what=*/"sections piped", /*args=*/{}, /*file=*/{}, /*input=*/sections, /*status=*/0,
+       /*inReport=*/"bytes of raw sections"},
+      {/*what=*/"packets", /*args=*/{"@"}, /*file=*/SamplePatStream(), /*input=*/{}, /*status=*/0,
+       /*inReport=*/"packets of 188 bytes"},
+      {/*what=*/"sections failing their CRC", /*args=*/{"@"}, /*file=*/badCrc, /*input=*/{}, /*status=*/1,
+       /*inReport=*/"nor a file of raw sections"},
+      {/*what=*/"sections failing their CRC, forced", /*args=*/{"--sections", "@"}, /*file=*/badCrc, /*input=*/{},
+       /*status=*/0, /*inReport=*/"1 CRC failures"},
+      {/*what=*/"sections with --pid", /*args=*/{"--pid", "0x10", "@"}, /*file=*/sections, /*input=*/{}, /*status=*/1,
+       /*inReport=*/"--pid does not apply"},
+  };
+  for (const Case& c : cases) {
+    std::string file = Write("input.bin", c.file);
+    std::vector<std::string> args;
+    for (const std::string& a : c.args) args.push_back(a == "@" ? file : a);
+    ToolRun run = Run(args, c.input);
+    EXPECT_EQ(c.status, run.status) << c.what << ": " << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.inReport)) << c.what << ": " << run.err;
   }
 }
 

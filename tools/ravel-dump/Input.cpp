@@ -1,6 +1,7 @@
 #include "Input.h"
 
 #include <cerrno>
+#include <algorithm>
 #include <cstring>
 
 #include <fcntl.h>
@@ -9,7 +10,7 @@
 
 namespace ravel_dump {
 
-InputFile::InputFile() : fd_(-1), ownsFd_(false), size_(-1) {}
+InputFile::InputFile() : fd_(-1), ownsFd_(false), size_(-1), peekedPos_(0) {}
 
 InputFile::~InputFile() {
   if (ownsFd_ && fd_ >= 0) close(fd_);
@@ -42,7 +43,37 @@ bool InputFile::Open(const std::string& path, std::string& error) {
   return true;
 }
 
+bool InputFile::Peek(std::size_t size, std::vector<uint8_t>& head, std::string& error) {
+  std::size_t held = peeked_.size() - peekedPos_;
+  if (held < size) {
+    peeked_.erase(peeked_.begin(), peeked_.begin() + static_cast<std::ptrdiff_t>(peekedPos_));
+    peekedPos_ = 0;
+    peeked_.resize(size);
+    long long n = ReadFromFile(peeked_.data() + held, size - held, error);
+    peeked_.resize(held + static_cast<std::size_t>(std::max(n, 0LL)));
+    if (n < 0) return false;
+  }
+  std::size_t length = std::min(size, peeked_.size() - peekedPos_);
+  head.assign(peeked_.begin() + static_cast<std::ptrdiff_t>(peekedPos_),
+              peeked_.begin() + static_cast<std::ptrdiff_t>(peekedPos_ + length));
+  return true;
+}
+
 long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error) {
+  std::size_t held = std::min(size, peeked_.size() - peekedPos_);
+  if (held > 0) {
+    std::memcpy(buffer, peeked_.data() + peekedPos_, held);
+    peekedPos_ += held;
+  }
+  if (peekedPos_ == peeked_.size()) {
+    peeked_.clear();
+    peekedPos_ = 0;
+  }
+  long long n = ReadFromFile(buffer + held, size - held, error);
+  return n < 0 ? n : static_cast<long long>(held) + n;
+}
+
+long long InputFile::ReadFromFile(uint8_t* buffer, std::size_t size, std::string& error) {
   std::size_t done = 0;
   while (done < size) {
     ssize_t n = read(fd_, buffer + done, size - done);

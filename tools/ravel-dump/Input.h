@@ -5,6 +5,7 @@
 #include <cstddef>
 #include <cstdint>
 #include <string>
+#include <vector>
 
 namespace ravel_dump {
 
@@ -19,6 +20,12 @@ class InputFile {
   // `error` to a one-line reason (missing, unreadable, a directory ...).
   bool Open(const std::string& path, std::string& error);
 
+  // The first `size` bytes (fewer when the input is shorter), read without
+  // consuming them, so that a pipe can be looked at before it is read: the
+  // reads that follow return these bytes first. False with `error` set on a
+  // read error.
+  bool Peek(std::size_t size, std::vector<uint8_t>& head, std::string& error);
+
   // Reads up to `size` bytes, retrying short reads until `size` bytes or the
   // end. Returns the count (0 at the end), or -1 with `error` set.
   long long Read(uint8_t* buffer, std::size_t size, std::string& error);
@@ -28,10 +35,14 @@ class InputFile {
   const std::string& Name() const { return name_; }
 
  private:
+  long long ReadFromFile(uint8_t* buffer, std::size_t size, std::string& error);
+
   int fd_;
   bool ownsFd_;
   long long size_;
   std::string name_;
+  std::vector<uint8_t> peeked_;  // bytes read by Peek and not yet returned by Read
+  std::size_t peekedPos_;
 };
 
 }  // namespace ravel_dump

@@ -6,6 +6,8 @@
 #include <cctype>
 #include <iostream>
 
+#include <unistd.h>
+
 namespace ravel_dump {
 namespace {
 
@@ -54,14 +56,14 @@ bool ParseTraceLevels(const std::string& text, unsigned int& levels, std::string
 ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& error) {
   cxxopts::Options parser("ravel-dump", kDescription);
   parser.custom_help("[options]");
-  parser.positional_help("CAPTURE|-");
+  parser.positional_help("[CAPTURE|-]");
   // clang-format off
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
       ("j,json", "Print the summary as JSON")
       ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
        cxxopts::value<std::string>(), "DIR")
-      ("sections", "The input is a file of concatenated raw sections, not a transport stream")
+      ("sections", "Read the input as concatenated raw sections (otherwise told from its first bytes)")
       ("standard", "Broadcast standard for ratings and regions: brazil or japan",
        cxxopts::value<std::string>(), "NAME")
       ("p,pid", "Read only these PIDs, each as a section PID (comma-separated, decimal or 0x hex)",
@@ -87,6 +89,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
                 << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
                 << "PMTs name), and any PID where a DSM-CC carousel or stream-event section starts;\n"
                 << "other PIDs are read with --pid.\n"
+                << "Without CAPTURE, standard input is read when it is not a terminal. Transport streams\n"
+                << "and files of raw sections are told apart from their first bytes.\n"
                 << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
                 << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
       return ParseOutcome::kExitOk;
@@ -95,15 +99,16 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       std::cout << "ravel-dump " << RAVEL_DUMP_VERSION << "\n";
       return ParseOutcome::kExitOk;
     }
-    if (!result.count("input")) {
-      error = "no capture given";
+    // A capture piped in needs no "-"; at a terminal, waiting for typed bytes helps no one.
+    if (!result.count("input") && isatty(STDIN_FILENO)) {
+      error = "no capture given (name a file, or - or a pipe for standard input)";
       return ParseOutcome::kUsageError;
     }
     if (!result.unmatched().empty()) {
       error = "only one capture can be read at a time ('" + result.unmatched().front() + "')";
       return ParseOutcome::kUsageError;
     }
-    options.input = result["input"].as<std::string>();
+    options.input = result.count("input") ? result["input"].as<std::string>() : "-";
     options.sections = result.count("sections") > 0;
     if (result.count("summary")) options.mode = OutputMode::kSummary;
     if (result.count("json")) options.mode = OutputMode::kJson;

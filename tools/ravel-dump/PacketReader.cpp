@@ -92,11 +92,13 @@ bool PacketReader::Start(std::string& error) {
   std::size_t syncAt = 0;
   int stride = 0;
   if (!FindLock(buffer_.data(), end_, syncAt, stride)) {
-    error = input_.Name() + ": not a transport stream (no run of 0x47 sync bytes 188, 192 or 204 bytes apart)";
+    error = input_.Name() +
+            ": not a transport stream (no run of 0x47 sync bytes 188, 192 or 204 bytes apart) nor a file of raw "
+            "sections (no chain of sections whose CRCs verify); --sections reads it as sections regardless";
     return false;
   }
   stride_ = stride;
-  syncOffset_ = stride == 192 ? 4 : 0;
+  syncOffset_ = SyncOffset(stride);
   pos_ = syncAt - syncOffset_;
   skipped_ = pos_;
   return true;

@@ -40,6 +40,10 @@ class PacketReader {
   // starting at `offset`; gives the size and the sync position's offset in it.
   static bool FindLock(const uint8_t* data, std::size_t size, std::size_t& syncAt, int& stride);
 
+  // Where the sync byte lies in a packet of `stride` bytes: after the 4-byte
+  // time stamp of 192-byte packets, first otherwise.
+  static std::size_t SyncOffset(int stride) { return stride == 192 ? 4 : 0; }
+
  private:
   // Makes `need` bytes from pos_ available; false when the input ends first.
   bool Fill(std::size_t need);

@@ -5,6 +5,7 @@
 #include <vector>
 
 #include "Capture.h"
+#include "CaptureKind.h"
 #include "Demux.h"
 #include "Input.h"
 #include "Options.h"
@@ -134,12 +135,18 @@ int main(int argc, char** argv) {
   InputFile input;
   if (!input.Open(options.input, error)) return Fail(error);
 
+  bool sections = options.sections;
+  if (!sections && !HoldsRawSections(input, sections, error)) return Fail(error);
+  if (sections && !options.pids.empty()) {
+    return Fail(input.Name() + ": a file of raw sections, where --pid does not apply");
+  }
+
   Capture capture(stats);
   Demux demux(stats, capture);
   InputSummary inputSummary;
   inputSummary.name = input.Name();
-  inputSummary.sections = options.sections;
-  if (options.sections) {
+  inputSummary.sections = sections;
+  if (sections) {
     if (!ReadSections(input, capture, stats, inputSummary, error)) return Fail(error);
   } else {
     capture.SetDemux(&demux);
