@@ -7,6 +7,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "StopSignal.h"
+
 namespace ravel_dump {
 
 InputFile::InputFile() : fd_(-1), ownsFd_(false), size_(-1) {}
@@ -16,6 +18,11 @@ InputFile::~InputFile() {
 }
 
 bool InputFile::Open(const std::string& path, std::string& error) {
+  if (IsUdpUrl(path)) {
+    name_ = path;
+    udp_.reset(new UdpReceiver);
+    return udp_->Open(path, error);
+  }
   if (path == "-") {
     fd_ = STDIN_FILENO;
     ownsFd_ = false;
@@ -43,11 +50,16 @@ bool InputFile::Open(const std::string& path, std::string& error) {
 }
 
 long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error) {
+  if (udp_) return udp_->Read(buffer, size, error);
+  const bool stream = size_ < 0;
   std::size_t done = 0;
-  while (done < size) {
+  while (done < size && !(stream && done > 0)) {
+    if (stream && !WaitReadable(fd_)) break;
     ssize_t n = read(fd_, buffer + done, size - done);
     if (n < 0) {
-      if (errno == EINTR) continue;
+      // A DVB device reports a ring buffer overrun once and goes on: the
+      // continuity counters show what was lost.
+      if (errno == EINTR || (stream && errno == EOVERFLOW)) continue;
       error = name_ + ": " + std::strerror(errno);
       return -1;
     }

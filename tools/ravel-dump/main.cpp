@@ -15,6 +15,7 @@
 #include "Ravel_Cfg.h"
 #include "Report.h"
 #include "Stats.h"
+#include "StopSignal.h"
 #include "TraceOutput.h"
 
 namespace {
@@ -96,7 +97,9 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   PacketReader reader(input);
   if (!reader.Start(error)) return false;
   Progress progress(options.progress, input.Size());
-  while (const uint8_t* packet = reader.Next()) {
+  while (!StopRequested()) {
+    const uint8_t* packet = reader.Next();
+    if (packet == nullptr) break;
     demux.OnPacket(packet);
     progress.Update(reader.Offset());
   }
@@ -106,7 +109,8 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   summary.skippedBytes = reader.SkippedBytes();
   summary.resyncs = reader.Resyncs();
   summary.bytes = reader.Offset();
-  if (!reader.Error().empty()) {
+  // A stop request ends the input where it is, inside a packet or not.
+  if (!reader.Error().empty() && !StopRequested()) {
     error = reader.Error();
     return false;
   }
@@ -133,6 +137,7 @@ int main(int argc, char** argv) {
   TraceOutput trace(options.traceLevels, stats);
   InputFile input;
   if (!input.Open(options.input, error)) return Fail(error);
+  InstallStopSignals();
 
   Capture capture(stats);
   Demux demux(stats, capture);
