@@ -62,6 +62,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
        cxxopts::value<std::string>(), "DIR")
       ("sections", "The input is a file of concatenated raw sections, not a transport stream")
+      ("receiver", "Reassemble sections with the receivers' own store (RavelCTSPktStore) instead of one "
+       "that delivers every section whole; the report counts what it did not deliver whole")
       ("standard", "Broadcast standard for ratings and regions: brazil or japan",
        cxxopts::value<std::string>(), "NAME")
       ("p,pid", "Read only these PIDs, each as a section PID (comma-separated, decimal or 0x hex)",
@@ -74,7 +76,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       ("no-progress", "No progress bar")
       ("h,help", "Print this help and exit")
       ("V,version", "Print the version and exit")
-      ("input", "Capture file, or - for standard input", cxxopts::value<std::string>());
+      ("input", "Capture file, - for standard input, a FIFO or device (dvr0), or udp://[@]ADDRESS:PORT",
+       cxxopts::value<std::string>());
   // clang-format on
   parser.parse_positional({"input"});
 
@@ -150,6 +153,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     if (result.count("trace") && !ParseTraceLevels(result["trace"].as<std::string>(), options.traceLevels, error)) {
       return ParseOutcome::kUsageError;
     }
+    options.receiversStore = result.count("receiver") != 0;
     options.report = result.count("quiet") == 0;
     options.progress = result.count("no-progress") == 0;
   } catch (const cxxopts::exceptions::exception& e) {

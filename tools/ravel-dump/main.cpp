@@ -104,6 +104,7 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
     progress.Update(reader.Offset());
   }
   progress.Finish();
+  demux.End();
   summary.packets = reader.Packets();
   summary.packetSize = reader.PacketSize();
   summary.skippedBytes = reader.SkippedBytes();
@@ -148,6 +149,8 @@ int main(int argc, char** argv) {
     if (!ReadSections(input, capture, stats, inputSummary, error)) return Fail(error);
   } else {
     capture.SetDemux(&demux);
+    if (options.receiversStore) demux.UseReceiversStore();
+    stats.receiversStore = options.receiversStore;
     if (options.pids.empty()) {
       demux.AddStandardPids();
     } else {
