@@ -515,6 +515,58 @@ TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   }
 }
 
+// An EIT section of `events` events, each with a short event descriptor.
+Bytes EitSection(uint8_t tableId, uint16_t serviceId, int events) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = serviceId;
+  Bytes body = sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::U8(0), sb::U8(tableId)});
+  for (int e = 0; e < events; ++e) {
+    Bytes descriptor = sb::Descriptor(0x4D, sb::Cat({sb::Text("por"), sb::U8(20), sb::Text(std::string(20, 'n')),
+                                                     sb::U8(60), sb::Text(std::string(60, 't'))}));
+    sb::Append(body, sb::Cat({sb::U16(e + 1), sb::UtcTime(2026, 11, 24, e % 24, 0, 0), sb::U24(0x010000),
+                              sb::U16(0x8000 | descriptor.size()), descriptor}));
+  }
+  return sb::LongSection(options, body);
+}
+
+// Sections of `kind` that passed the checks, from the report's table of kinds.
+unsigned long KindSections(const std::string& report, const std::string& kind) {
+  const size_t at = report.find("\n  " + kind + " ");
+  return at == std::string::npos ? 0 : std::stoul(report.substr(at + 3 + kind.size()));
+}
+
+// A short present/following section followed in the same packet by a long
+// schedule section: the receivers' store closes the second by the size of the
+// first, so it delivers none of them whole.
+TEST_F(RavelDumpTest, EitPairsInOnePacketAreAllReadUnlessThroughTheReceiversStore) {
+  const int kPairs = 200;
+  sb::PacketWriter writer(0x0012);
+  for (int i = 0; i < kPairs; ++i) writer.AddPackedSections({EitSection(0x4E, i, 1), EitSection(0x50, i, 10)});
+  const std::string capture = Write("pairs.ts", writer.Stream());
+  struct Case {
+    const char* name;
+    std::vector<std::string> options;
+    unsigned long schedule;
+    const char* storeLine;  // "": no such line
+  } cases[] = {
+      {.name = "whole sections", .options = {}, .schedule = kPairs, .storeLine = ""},
+      {.name = "receivers' store", .options = {"--receiver"}, .schedule = 0,
+       .storeLine = "the receivers' store did not deliver 200 sections whole"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    std::vector<std::string> args = c.options;
+    args.push_back(capture);
+    ToolRun run = Run(args);
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_EQ(static_cast<unsigned long>(kPairs), KindSections(run.err, "EIT p/f")) << run.err;
+    EXPECT_EQ(c.schedule, KindSections(run.err, "EIT schedule")) << run.err;
+    const std::string line = *c.storeLine ? c.storeLine : "the receivers' store";
+    EXPECT_EQ(*c.storeLine != 0, run.err.find(line) != std::string::npos) << run.err;
+  }
+}
+
 // --- Texts, summary, JSON, filters -------------------------------------------
 
 TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
