@@ -54,7 +54,7 @@ bool ParseTraceLevels(const std::string& text, unsigned int& levels, std::string
 ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& error) {
   cxxopts::Options parser("ravel-dump", kDescription);
   parser.custom_help("[options]");
-  parser.positional_help("CAPTURE|-");
+  parser.positional_help("CAPTURE|-|udp://[@]ADDRESS:PORT");
   // clang-format off
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
@@ -90,6 +90,9 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
                 << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
                 << "PMTs name), and any PID where a DSM-CC carousel or stream-event section starts;\n"
                 << "other PIDs are read with --pid.\n"
+                << "A pipe, FIFO, device (a DVB adapter's dvr0) or UDP feed (bare or RTP; a multicast group is\n"
+                << "joined) is read as it arrives, until its end or SIGINT/SIGTERM, which end the run as the end\n"
+                << "of the input does.\n"
                 << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
                 << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
       return ParseOutcome::kExitOk;
