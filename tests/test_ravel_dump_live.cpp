@@ -186,6 +186,8 @@ TEST(RavelDumpLive, UdpFeedsAreReadUntilStopped) {
        .framing = Framing::kRtp},
       {.name = "unicast, RTP with CSRCs, an extension and padding", .url = "udp://127.0.0.1:%d",
        .sendTo = "127.0.0.1", .framing = Framing::kRtpWithCsrcExtensionPadding},
+      {.name = "a sender's address, as ffmpeg reads it: every local address", .url = "udp://192.0.2.1:%d",
+       .sendTo = "127.0.0.1", .framing = Framing::kBare},
       {.name = "multicast group joined on the loopback interface", .url = "udp://239.255.42.1:%d?localaddr=127.0.0.1",
        .sendTo = "239.255.42.1", .framing = Framing::kRtp},
   };

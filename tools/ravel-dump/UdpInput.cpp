@@ -131,7 +131,14 @@ bool UdpReceiver::Open(const std::string& url, std::string& error) {
   local.sin_addr.s_addr = htonl(INADDR_ANY);
   // Bound to the group itself, the socket receives only that group's datagrams.
   if (!endpoint.address.empty()) ParseAddress(endpoint.address, local.sin_addr);
-  if (bind(fd_, reinterpret_cast<const sockaddr*>(&local), sizeof local) != 0) {
+  int bound = bind(fd_, reinterpret_cast<const sockaddr*>(&local), sizeof local);
+  if (bound != 0 && errno == EADDRNOTAVAIL && !endpoint.multicast) {
+    // Not an address of this machine: the sender's, as ffmpeg users may write
+    // it; ffmpeg then listens on the port of every local address, and so do we.
+    local.sin_addr.s_addr = htonl(INADDR_ANY);
+    bound = bind(fd_, reinterpret_cast<const sockaddr*>(&local), sizeof local);
+  }
+  if (bound != 0) {
     error = Failure(url, "bind");
     return false;
   }

@@ -3,7 +3,9 @@
 //   udp://239.1.1.1:1234      the multicast group 239.1.1.1, port 1234 (joined)
 //   udp://@239.1.1.1:1234     the same, VLC's spelling
 //   udp://@:1234              port 1234 on every local address
-//   udp://127.0.0.1:5000      port 5000 on that local address
+//   udp://127.0.0.1:5000      port 5000 on that local address (on every local
+//                             address when it is not one of this machine's: the
+//                             sender's, as ffmpeg reads it)
 //   ...?localaddr=10.0.0.2    the interface a group is joined on (ffmpeg's option)
 // Each datagram carries whole packets, bare or behind an RTP header (RFC 3550,
 // payload type 33, MP2T: RFC 2250), which is detected per datagram and skipped.
