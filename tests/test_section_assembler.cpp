@@ -31,8 +31,9 @@ Bytes WithTransportError(Bytes packet) {
   return packet;
 }
 
+// Counters a case leaves out are expected to stay zero.
 struct Counters {
-  unsigned int delivered, cut, transportError, repeated, invalid, breaks, withoutStart;
+  unsigned int delivered = 0, cut = 0, transportError = 0, repeated = 0, invalid = 0, breaks = 0, withoutStart = 0;
   bool operator==(const Counters& o) const {
     return delivered == o.delivered && cut == o.cut && transportError == o.transportError && repeated == o.repeated &&
            invalid == o.invalid && breaks == o.breaks && withoutStart == o.withoutStart;
@@ -44,8 +45,13 @@ void PrintTo(const Counters& c, std::ostream* os) {
       << c.withoutStart << "}";
 }
 Counters CountersOf(const RavelCSectionAssembler& a) {
-  return Counters{a.iSectionsDelivered, a.iSectionsCut,      a.iPacketsTransportError, a.iPacketsRepeated,
-                  a.iPacketsInvalid,    a.iContinuityBreaks, a.iBytesWithoutStart};
+  return Counters{.delivered = a.iSectionsDelivered,
+                  .cut = a.iSectionsCut,
+                  .transportError = a.iPacketsTransportError,
+                  .repeated = a.iPacketsRepeated,
+                  .invalid = a.iPacketsInvalid,
+                  .breaks = a.iContinuityBreaks,
+                  .withoutStart = a.iBytesWithoutStart};
 }
 
 // The handler a receiver would write: keeps a copy of each section.
@@ -87,7 +93,7 @@ std::vector<Bytes> Concat(std::vector<std::vector<Bytes>> parts) {
 struct Case {
   const char* name;
   std::function<std::vector<Bytes>()> packets;
-  bool endOfInput;
+  bool endOfInput = false;  // the input ends after the packets
   std::vector<Bytes> sections;
   Counters counters;
 };
@@ -95,22 +101,16 @@ struct Case {
 const Case kCases[] = {
     {.name = "several sections in one packet, each with its own size, then stuffing",
      .packets = [] { return Packed({kA, kB, kC}); },
-     .endOfInput = false,
      .sections = {kA, kB, kC},
-     .counters = {.delivered = 3, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 3}},
     {.name = "more sections in one packet than a RavelCSectionData holds",
      .packets = [] { return Packed(std::vector<Bytes>(12, kTdt)); },
-     .endOfInput = false,
      .sections = std::vector<Bytes>(12, kTdt),
-     .counters = {.delivered = 12, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 12}},
     {.name = "a section over three packets, the next starting where it ends",
      .packets = LongThenA,
-     .endOfInput = false,
      .sections = {kLong, kA},
-     .counters = {.delivered = 2, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 2}},
     {.name = "section header split over two packets",
      .packets =
          [] {
@@ -118,10 +118,8 @@ const Case kCases[] = {
            return Concat({{Pkt(0, true, sb::Cat({sb::U8(0), filler, Head(kA, 1)}))},
                           {Pkt(1, false, Tail(kA, 1))}});
          },
-     .endOfInput = false,
      .sections = {SectionOfSize(182, 5), kA},
-     .counters = {.delivered = 2, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 2}},
     {.name = "a repeated packet is dropped once",
      .packets =
          [] {
@@ -129,10 +127,8 @@ const Case kCases[] = {
            p.insert(p.begin() + 1, p[1]);
            return p;
          },
-     .endOfInput = false,
      .sections = {kLong, kA},
-     .counters = {.delivered = 2, .cut = 0, .transportError = 0, .repeated = 1, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 2, .repeated = 1}},
     {.name = "a packet sent three times breaks continuity and cuts the section",
      .packets =
          [] {
@@ -140,10 +136,8 @@ const Case kCases[] = {
            p.insert(p.begin() + 1, 2, p[1]);
            return p;
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 1, .transportError = 0, .repeated = 1, .invalid = 0, .breaks = 1,
-                  .withoutStart = 184 + 133}},
+     .counters = {.delivered = 1, .cut = 1, .repeated = 1, .breaks = 1, .withoutStart = 184 + 133}},
     {.name = "a lost packet cuts the section; the next one is whole",
      .packets =
          [] {
@@ -151,10 +145,8 @@ const Case kCases[] = {
            p.erase(p.begin() + 1);
            return p;
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 1, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 1,
-                  .withoutStart = 133}},
+     .counters = {.delivered = 1, .cut = 1, .breaks = 1, .withoutStart = 133}},
     {.name = "an announced discontinuity is no break, but the section in progress is lost",
      .packets =
          [] {
@@ -162,10 +154,8 @@ const Case kCases[] = {
            return std::vector<Bytes>{Pkt(0, true, sb::Cat({sb::U8(0), kLong})), announced,
                                      Pkt(10, true, sb::Cat({sb::U8(0), kA}))};
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 1, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 182}},
+     .counters = {.delivered = 1, .cut = 1, .withoutStart = 182}},
     {.name = "a packet with transport_error_indicator is ignored",
      .packets =
          [] {
@@ -173,10 +163,8 @@ const Case kCases[] = {
            p.insert(p.begin() + 1, WithTransportError(Pkt(7, true, Bytes{0x00, 0x42})));
            return p;
          },
-     .endOfInput = false,
      .sections = {kLong, kA},
-     .counters = {.delivered = 2, .cut = 0, .transportError = 1, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 2, .transportError = 1}},
     {.name = "adaptation-only packets neither carry bytes nor step the counter",
      .packets =
          [] {
@@ -186,10 +174,8 @@ const Case kCases[] = {
            p.insert(p.begin() + 1, Pkt(1, false, Bytes(), 2, stuffing));
            return p;
          },
-     .endOfInput = false,
      .sections = {kLong, kA},
-     .counters = {.delivered = 2, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 2}},
     {.name = "a payload after an adaptation field",
      .packets =
          [] {
@@ -197,20 +183,16 @@ const Case kCases[] = {
            writer.AddSectionWithAdaptation(kA, 20);
            return writer.Packets();
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 1}},
     {.name = "a section still short when the next one starts is cut",
      .packets =
          [] {
            return std::vector<Bytes>{Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})),
                                      Pkt(1, true, sb::Cat({sb::U8(10), Mid(kLong, 183, 10), kA}))};
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 1, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 1, .cut = 1}},
     {.name = "joining a stream in the middle of a section",
      .packets =
          [] {
@@ -218,10 +200,8 @@ const Case kCases[] = {
            p.erase(p.begin());
            return p;
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 0, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 184 + 133}},
+     .counters = {.delivered = 1, .withoutStart = 184 + 133}},
     {.name = "a pointer_field past the packet end makes it invalid",
      .packets =
          [] {
@@ -229,10 +209,8 @@ const Case kCases[] = {
            return Concat({{Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})), bad},
                           {Pkt(2, true, sb::Cat({sb::U8(0), kA}))}});
          },
-     .endOfInput = false,
      .sections = {kA},
-     .counters = {.delivered = 1, .cut = 1, .transportError = 0, .repeated = 0, .invalid = 1, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.delivered = 1, .cut = 1, .invalid = 1}},
     {.name = "a section cut by the end of the input is counted",
      .packets =
          [] {
@@ -242,8 +220,7 @@ const Case kCases[] = {
          },
      .endOfInput = true,
      .sections = {},
-     .counters = {.delivered = 0, .cut = 1, .transportError = 0, .repeated = 0, .invalid = 0, .breaks = 0,
-                  .withoutStart = 0}},
+     .counters = {.cut = 1}},
 };
 
 TEST(SectionAssembler, DeliversWholeSectionsAndCountsWhatItDrops) {
