@@ -8,6 +8,7 @@
 #include <fcntl.h>
 #include <netinet/in.h>
 #include <signal.h>
+#include <sys/ioctl.h>
 #include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
@@ -20,6 +21,7 @@
 #include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <iterator>
 #include <sstream>
 #include <string>
@@ -979,11 +981,23 @@ int FreePort() {
   return ntohs(address.sin_port);
 }
 
-// Whether a UDP socket is bound to `port` on this machine.
-bool PortBound(int port) {
-  char hex[16];
-  std::snprintf(hex, sizeof hex, ":%04X ", port);
-  return ReadFile("/proc/net/udp").find(hex) != std::string::npos;
+// The bytes waiting in the receive queue of the UDP socket bound to `port`,
+// -1 while there is none.
+long UdpQueue(int port) {
+  std::istringstream table(ReadFile("/proc/net/udp"));
+  char local[16];
+  std::snprintf(local, sizeof local, ":%04X", port);
+  std::string line;
+  std::getline(table, line);  // sl local_address rem_address st tx_queue:rx_queue ...
+  while (std::getline(table, line)) {
+    std::istringstream fields(line);
+    std::string slot, address, remote, state, queues;
+    fields >> slot >> address >> remote >> state >> queues;
+    if (address.size() > 5 && address.compare(address.size() - 5, 5, local) == 0) {
+      return std::stol(queues.substr(queues.find(':') + 1), nullptr, 16);
+    }
+  }
+  return -1;
 }
 
 enum class Framing { kBare, kRtp, kRtpWithCsrcExtensionPadding };
@@ -1031,9 +1045,10 @@ void Send(const std::string& address, int port, const std::vector<Bytes>& datagr
   close(fd);
 }
 
-bool WaitUntilBound(int port) {
+// Polls `done` for 5 s at most.
+bool WaitUntil(const std::function<bool()>& done) {
   const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(5);
-  while (!PortBound(port)) {
+  while (!done()) {
     if (std::chrono::steady_clock::now() > deadline) return false;
     std::this_thread::sleep_for(milliseconds(10));
   }
@@ -1065,11 +1080,13 @@ TEST_F(RavelDumpTest, UdpFeedsAreReadUntilStopped) {
     char url[128];
     std::snprintf(url, sizeof url, c.url, port);
     const pid_t tool = Start({"--summary", url}, -1);
-    const bool bound = WaitUntilBound(port);
+    const bool bound = WaitUntil([port] { return UdpQueue(port) >= 0; });
     if (bound) Send(c.sendTo, port, Datagrams(sample, c.framing), 3);
-    std::this_thread::sleep_for(milliseconds(200));
+    // Every datagram is read before the signal, which ends the input there.
+    const bool drained = bound && WaitUntil([port] { return UdpQueue(port) == 0; });
     ToolRun run = Finish(tool, SIGINT);
     ASSERT_TRUE(bound) << run.err;
+    EXPECT_TRUE(drained);
     EXPECT_EQ(0, run.status) << run.err;
     EXPECT_NE(std::string::npos, run.out.find(kNetworkLine)) << run.out;
     // A header left in front of the packets would show as skipped bytes.
@@ -1125,11 +1142,17 @@ TEST_F(RavelDumpTest, StopSignalEndsPipesAndFifosAsTheirEnd) {
     Bytes written = sample;
     written.insert(written.end(), sample.begin(), sample.begin() + c.cutPacketBytes);
     const bool whole = write(writer, written.data(), written.size()) == static_cast<ssize_t>(written.size());
-    std::this_thread::sleep_for(milliseconds(300));
+    // Once the tool has read everything, its handlers are in place and the
+    // signal ends the input there.
+    const bool drained = WaitUntil([writer] {
+      int waiting = -1;
+      return ioctl(writer, FIONREAD, &waiting) == 0 && waiting == 0;
+    });
     ToolRun run = Finish(tool, c.signal);
     close(writer);
     if (c.fifo) unlink(fifo.c_str());
     ASSERT_TRUE(whole);
+    EXPECT_TRUE(drained);
     EXPECT_EQ(0, run.status) << run.err;
     EXPECT_NE(std::string::npos, run.out.find(kNetworkLine)) << run.out;
     EXPECT_NE(std::string::npos, run.err.find("input: 143 packets of 188 bytes")) << run.err;

@@ -50,6 +50,8 @@ bool InputFile::Open(const std::string& path, std::string& error) {
 }
 
 long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error) {
+  // A stop request is the end of the input: what was read before it is used.
+  if (StopRequested()) return 0;
   if (udp_) return udp_->Read(buffer, size, error);
   const bool stream = size_ < 0;
   std::size_t done = 0;

@@ -97,9 +97,7 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   PacketReader reader(input);
   if (!reader.Start(error)) return false;
   Progress progress(options.progress, input.Size());
-  while (!StopRequested()) {
-    const uint8_t* packet = reader.Next();
-    if (packet == nullptr) break;
+  while (const uint8_t* packet = reader.Next()) {
     demux.OnPacket(packet);
     progress.Update(reader.Offset());
   }
