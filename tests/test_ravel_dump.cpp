@@ -1081,7 +1081,9 @@ TEST_F(RavelDumpTest, UdpFeedsAreReadUntilStopped) {
     std::snprintf(url, sizeof url, c.url, port);
     const pid_t tool = Start({"--summary", url}, -1);
     const bool bound = WaitUntil([port] { return UdpQueue(port) >= 0; });
-    if (bound) Send(c.sendTo, port, Datagrams(sample, c.framing), 3);
+    std::vector<Bytes> datagrams = Datagrams(sample, c.framing);
+    datagrams.insert(datagrams.begin(), Bytes(100, 0x00));  // neither packets nor RTP: reported, not read
+    if (bound) Send(c.sendTo, port, datagrams, 3);
     // Every datagram is read before the signal, which ends the input there.
     const bool drained = bound && WaitUntil([port] { return UdpQueue(port) == 0; });
     ToolRun run = Finish(tool, SIGINT);
@@ -1092,6 +1094,7 @@ TEST_F(RavelDumpTest, UdpFeedsAreReadUntilStopped) {
     // A header left in front of the packets would show as skipped bytes.
     EXPECT_NE(std::string::npos, run.err.find("input: 429 packets of 188 bytes, 0 bytes skipped, 0 resyncs"))
         << run.err;
+    EXPECT_NE(std::string::npos, run.err.find("3 of 66 UDP datagrams held neither")) << run.err;
   }
 }
 

@@ -33,6 +33,8 @@ class InputFile {
   // Size of a regular file, -1 for a stream (pipe, FIFO, device, UDP).
   long long Size() const { return size_; }
   const std::string& Name() const { return name_; }
+  // The UDP feed being read, or null.
+  const UdpReceiver* Udp() const { return udp_.get(); }
 
  private:
   int fd_;

@@ -105,8 +105,7 @@ bool TsBytesOfDatagram(const uint8_t* datagram, std::size_t size, std::size_t& o
 }
 
 UdpReceiver::UdpReceiver()
-    : fd_(-1), datagram_(kMaxDatagram), pendingAt_(0), pendingCount_(0), datagrams_(0), rtpDatagrams_(0),
-      ignoredDatagrams_(0) {}
+    : fd_(-1), datagram_(kMaxDatagram), pendingAt_(0), pendingCount_(0), datagrams_(0), ignoredDatagrams_(0) {}
 
 UdpReceiver::~UdpReceiver() {
   if (fd_ >= 0) close(fd_);
@@ -168,9 +167,7 @@ long long UdpReceiver::Read(uint8_t* buffer, std::size_t size, std::string& erro
     ++datagrams_;
     if (!TsBytesOfDatagram(datagram_.data(), static_cast<std::size_t>(received), pendingAt_, pendingCount_)) {
       ++ignoredDatagrams_;
-      continue;
     }
-    if (pendingAt_ > 0) ++rtpDatagrams_;
   }
   const std::size_t given = std::min(size, pendingCount_);
   std::memcpy(buffer, datagram_.data() + pendingAt_, given);

@@ -50,7 +50,7 @@ class UdpReceiver {
   long long Read(uint8_t* buffer, std::size_t size, std::string& error);
 
   uint64_t Datagrams() const { return datagrams_; }
-  uint64_t RtpDatagrams() const { return rtpDatagrams_; }
+  // Datagrams that held neither packets nor RTP carrying them.
   uint64_t IgnoredDatagrams() const { return ignoredDatagrams_; }
 
  private:
@@ -59,7 +59,6 @@ class UdpReceiver {
   std::size_t pendingAt_;     // TS bytes of the last datagram not handed out yet
   std::size_t pendingCount_;
   uint64_t datagrams_;
-  uint64_t rtpDatagrams_;
   uint64_t ignoredDatagrams_;
 };
 

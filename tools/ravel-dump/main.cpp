@@ -155,6 +155,11 @@ int main(int argc, char** argv) {
       demux.RestrictTo(options.pids);
     }
     if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (input.Udp() != nullptr && input.Udp()->IgnoredDatagrams() > 0) {
+      stats.Problem(std::to_string(input.Udp()->IgnoredDatagrams()) + " of " +
+                    std::to_string(input.Udp()->Datagrams()) +
+                    " UDP datagrams held neither transport stream packets nor RTP carrying them");
+    }
     if (options.pids.empty() && stats.pids[0].sections == 0) {
       stats.Problem("no PAT read: only the PIDs every receiver reads and DSM-CC PIDs were read; name others with --pid");
     }
