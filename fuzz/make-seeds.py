@@ -206,9 +206,10 @@ def main():
             sections += split_sections(contents)
         elif name.endswith(".ts"):
             for pid, packets in sorted(packets_by_pid(contents).items()):
-                # Runs of 16 packets, a few per PID, for the packet target.
+                # Runs of 16 packets, a few per PID, for the packet targets.
                 for run in range(0, min(len(packets), 16 * 4), 16):
-                    corpus.add("fuzz_packets", b"".join(packets[run:run + 16]))
+                    for target in ("fuzz_packets", "fuzz_section_assembler"):
+                        corpus.add(target, b"".join(packets[run:run + 16]))
                 sections += sections_of(packets)
 
     kinds = {}

@@ -1,23 +1,33 @@
 // ravel-dump run as a process, the way its users run it: bad input, packet
 // formats and resynchronisation, repeated tables, escaping of broadcast texts,
-// the summary and its JSON, filters, and the real captures when present.
+// the summary and its JSON, filters, live inputs and signals, and the real
+// captures when present.
 #include <gtest/gtest.h>
 
+#include <arpa/inet.h>
 #include <fcntl.h>
+#include <netinet/in.h>
+#include <signal.h>
+#include <sys/ioctl.h>
+#include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
+#include <chrono>
+#include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <filesystem>
 #include <fstream>
+#include <functional>
 #include <iterator>
 #include <regex>
 #include <set>
 #include <sstream>
 #include <string>
+#include <thread>
 #include <vector>
 
 #include <nlohmann/json.hpp>
@@ -80,8 +90,12 @@ class RavelDumpTest : public ::testing::Test {
 
   // Runs the tool with `args`; `input` becomes its standard input.
   ToolRun Run(const std::vector<std::string>& args, const Bytes& input = Bytes()) const {
-    WriteFile(Path(".stdin"), input);
-    return Launch(args, Path(".stdin"));
+    const std::string in = Path(".stdin");
+    WriteFile(in, input);
+    const int fd = open(in.c_str(), O_RDONLY);
+    const pid_t child = Start(args, fd);
+    close(fd);
+    return Finish(child, 0);
   }
 
   // Runs the tool with a terminal as its standard input.
@@ -91,20 +105,23 @@ class RavelDumpTest : public ::testing::Test {
       ADD_FAILURE() << "no pseudo-terminal";
       return ToolRun();
     }
-    ToolRun run = Launch(args, ptsname(terminal));
+    const int fd = open(ptsname(terminal), O_RDONLY | O_NOCTTY);
+    const pid_t child = Start(args, fd);
+    if (fd >= 0) close(fd);
+    ToolRun run = Finish(child, 0);
     close(terminal);
     return run;
   }
 
-  // Runs the tool with `args` and the file `in` as its standard input.
-  ToolRun Launch(const std::vector<std::string>& args, const std::string& in) const {
-    std::string out = Path(".stdout"), err = Path(".stderr");
+  // Starts the tool with `args`; `input` (a descriptor, -1 for none) becomes its
+  // standard input. Its outputs go to files that Finish reads.
+  pid_t Start(const std::vector<std::string>& args, int input) const {
+    const std::string out = Path(".stdout"), err = Path(".stderr");
     pid_t child = fork();
     if (child == 0) {
-      int fdIn = open(in.c_str(), O_RDONLY | O_NOCTTY);
       int fdOut = open(out.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
       int fdErr = open(err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-      dup2(fdIn, 0);
+      if (input >= 0) dup2(input, 0);
       dup2(fdOut, 1);
       dup2(fdErr, 2);
       // A cross build's tool runs through its emulator, named first.
@@ -121,11 +138,28 @@ class RavelDumpTest : public ::testing::Test {
       execvp(argv[0], argv.data());
       _exit(127);
     }
+    return child;
+  }
+
+  // Sends `signal` (0: none) and waits for the tool's exit; past the time limit
+  // it is killed and counts as not exited normally.
+  ToolRun Finish(pid_t child, int signal) const {
+    if (signal != 0) kill(child, signal);
     ToolRun run;
     int status = 0;
-    if (child > 0 && waitpid(child, &status, 0) == child && WIFEXITED(status)) run.status = WEXITSTATUS(status);
-    run.out = ReadFile(out);
-    run.err = ReadFile(err);
+    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(300);
+    pid_t done = 0;
+    while (child > 0 && (done = waitpid(child, &status, WNOHANG)) == 0) {
+      if (std::chrono::steady_clock::now() > deadline) {
+        kill(child, SIGKILL);
+        waitpid(child, &status, 0);
+        break;
+      }
+      std::this_thread::sleep_for(std::chrono::milliseconds(5));
+    }
+    if (done == child && WIFEXITED(status)) run.status = WEXITSTATUS(status);
+    run.out = ReadFile(Path(".stdout"));
+    run.err = ReadFile(Path(".stderr"));
     return run;
   }
 
@@ -652,6 +686,58 @@ TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   }
 }
 
+// An EIT section of `events` events, each with a short event descriptor.
+Bytes EitSection(uint8_t tableId, uint16_t serviceId, int events) {
+  sb::SectionOptions options;
+  options.tableId = tableId;
+  options.tableIdExtension = serviceId;
+  Bytes body = sb::Cat({sb::U16(0x0640), sb::U16(0x0640), sb::U8(0), sb::U8(tableId)});
+  for (int e = 0; e < events; ++e) {
+    Bytes descriptor = sb::Descriptor(0x4D, sb::Cat({sb::Text("por"), sb::U8(20), sb::Text(std::string(20, 'n')),
+                                                     sb::U8(60), sb::Text(std::string(60, 't'))}));
+    sb::Append(body, sb::Cat({sb::U16(e + 1), sb::UtcTime(2026, 11, 24, e % 24, 0, 0), sb::U24(0x010000),
+                              sb::U16(0x8000 | descriptor.size()), descriptor}));
+  }
+  return sb::LongSection(options, body);
+}
+
+// Sections of `kind` that passed the checks, from the report's table of kinds.
+unsigned long KindSections(const std::string& report, const std::string& kind) {
+  const size_t at = report.find("\n  " + kind + " ");
+  return at == std::string::npos ? 0 : std::stoul(report.substr(at + 3 + kind.size()));
+}
+
+// A short present/following section followed in the same packet by a long
+// schedule section: the receivers' store closes the second by the size of the
+// first, so it delivers none of them whole.
+TEST_F(RavelDumpTest, EitPairsInOnePacketAreAllReadUnlessThroughTheReceiversStore) {
+  const int kPairs = 200;
+  sb::PacketWriter writer(0x0012);
+  for (int i = 0; i < kPairs; ++i) writer.AddPackedSections({EitSection(0x4E, i, 1), EitSection(0x50, i, 10)});
+  const std::string capture = Write("pairs.ts", writer.Stream());
+  struct Case {
+    const char* name;
+    std::vector<std::string> options;
+    unsigned long schedule;
+    const char* storeLine;  // "": no such line
+  } cases[] = {
+      {.name = "whole sections", .options = {}, .schedule = kPairs, .storeLine = ""},
+      {.name = "receivers' store", .options = {"--receiver"}, .schedule = 0,
+       .storeLine = "the receivers' store did not deliver 200 sections whole"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    std::vector<std::string> args = c.options;
+    args.push_back(capture);
+    ToolRun run = Run(args);
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_EQ(static_cast<unsigned long>(kPairs), KindSections(run.err, "EIT p/f")) << run.err;
+    EXPECT_EQ(c.schedule, KindSections(run.err, "EIT schedule")) << run.err;
+    const std::string line = *c.storeLine ? c.storeLine : "the receivers' store";
+    EXPECT_EQ(*c.storeLine != 0, run.err.find(line) != std::string::npos) << run.err;
+  }
+}
+
 // --- Texts, summary, JSON, filters -------------------------------------------
 
 TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
@@ -1000,6 +1086,217 @@ TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
   EXPECT_NE(std::string::npos, dump.out.find("###################### EIT Table Information ######################\n"));
   EXPECT_EQ(std::string::npos, dump.out.find("== SDT"));
 }
+
+// --- Live inputs: UDP over the loopback interface, pipes, FIFOs, signals ------
+// (not through a cross build's emulator)
+
+#ifndef RAVEL_DUMP_EMULATOR
+
+using std::chrono::milliseconds;
+
+const size_t kPacketsPerDatagram = 7;  // 1316 bytes, as IPTV sends them
+const uint8_t kRtpMp2t = 33;
+const char kNetworkLine[] = "Network: \"Rede Exemplo\"";
+
+Bytes Sample() {
+  const std::string text = ReadFile(RAVEL_SAMPLES_DIR "/oneseg-brazil.ts");
+  return Bytes(text.begin(), text.end());
+}
+
+// A UDP port of 127.0.0.1 that was free a moment ago.
+int FreePort() {
+  int fd = socket(AF_INET, SOCK_DGRAM, 0);
+  sockaddr_in address{};
+  address.sin_family = AF_INET;
+  address.sin_addr.s_addr = htonl(INADDR_LOOPBACK);
+  bind(fd, reinterpret_cast<sockaddr*>(&address), sizeof address);
+  socklen_t size = sizeof address;
+  getsockname(fd, reinterpret_cast<sockaddr*>(&address), &size);
+  close(fd);
+  return ntohs(address.sin_port);
+}
+
+// The bytes waiting in the receive queue of the UDP socket bound to `port`,
+// -1 while there is none.
+long UdpQueue(int port) {
+  std::istringstream table(ReadFile("/proc/net/udp"));
+  char local[16];
+  std::snprintf(local, sizeof local, ":%04X", port);
+  std::string line;
+  std::getline(table, line);  // sl local_address rem_address st tx_queue:rx_queue ...
+  while (std::getline(table, line)) {
+    std::istringstream fields(line);
+    std::string slot, address, remote, state, queues;
+    fields >> slot >> address >> remote >> state >> queues;
+    if (address.size() > 5 && address.compare(address.size() - 5, 5, local) == 0) {
+      return std::stol(queues.substr(queues.find(':') + 1), nullptr, 16);
+    }
+  }
+  return -1;
+}
+
+enum class Framing { kBare, kRtp, kRtpWithCsrcExtensionPadding };
+
+// The datagrams of `stream`: 7 packets each, behind an RTP header when asked.
+std::vector<Bytes> Datagrams(const Bytes& stream, Framing framing) {
+  std::vector<Bytes> datagrams;
+  uint16_t sequence = 0;
+  for (size_t at = 0; at < stream.size(); at += kPacketsPerDatagram * 188) {
+    size_t end = std::min(stream.size(), at + kPacketsPerDatagram * 188);
+    Bytes payload(stream.begin() + at, stream.begin() + end);
+    Bytes datagram;
+    if (framing == Framing::kRtp) {
+      datagram = sb::Cat({sb::U8(0x80), sb::U8(kRtpMp2t), sb::U16(sequence++), sb::U32(0), sb::U32(0x1234)});
+    } else if (framing == Framing::kRtpWithCsrcExtensionPadding) {
+      // Two CSRCs, an extension of one word, three bytes of padding.
+      datagram = sb::Cat({sb::U8(0xB2), sb::U8(kRtpMp2t), sb::U16(sequence++), sb::U32(0), sb::U32(0x1234),
+                          sb::U32(1), sb::U32(2), sb::U16(0xABAC), sb::U16(1), sb::U32(0)});
+      payload = sb::Cat({payload, Bytes{0, 0, 3}});
+    }
+    sb::Append(datagram, payload);
+    datagrams.push_back(datagram);
+  }
+  return datagrams;
+}
+
+void Send(const std::string& address, int port, const std::vector<Bytes>& datagrams, int rounds) {
+  int fd = socket(AF_INET, SOCK_DGRAM, 0);
+  in_addr loopback;
+  inet_pton(AF_INET, "127.0.0.1", &loopback);
+  // Multicast stays on the loopback interface and on this machine.
+  setsockopt(fd, IPPROTO_IP, IP_MULTICAST_IF, &loopback, sizeof loopback);
+  const unsigned char ttl = 0;
+  setsockopt(fd, IPPROTO_IP, IP_MULTICAST_TTL, &ttl, sizeof ttl);
+  sockaddr_in target{};
+  target.sin_family = AF_INET;
+  target.sin_port = htons(port);
+  inet_pton(AF_INET, address.c_str(), &target.sin_addr);
+  for (int r = 0; r < rounds; ++r) {
+    for (const Bytes& d : datagrams) {
+      sendto(fd, d.data(), d.size(), 0, reinterpret_cast<sockaddr*>(&target), sizeof target);
+    }
+    std::this_thread::sleep_for(milliseconds(10));
+  }
+  close(fd);
+}
+
+// Polls `done` for 5 s at most.
+bool WaitUntil(const std::function<bool()>& done) {
+  const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(5);
+  while (!done()) {
+    if (std::chrono::steady_clock::now() > deadline) return false;
+    std::this_thread::sleep_for(milliseconds(10));
+  }
+  return true;
+}
+
+TEST_F(RavelDumpTest, UdpFeedsAreReadUntilStopped) {
+  struct Case {
+    const char* name;
+    const char* url;         // %d: the port
+    const char* sendTo;
+    Framing framing;
+  } cases[] = {
+      {.name = "unicast, bare packets", .url = "udp://127.0.0.1:%d", .sendTo = "127.0.0.1",
+       .framing = Framing::kBare},
+      {.name = "every local address (VLC), RTP", .url = "udp://@:%d", .sendTo = "127.0.0.1",
+       .framing = Framing::kRtp},
+      {.name = "unicast, RTP with CSRCs, an extension and padding", .url = "udp://127.0.0.1:%d",
+       .sendTo = "127.0.0.1", .framing = Framing::kRtpWithCsrcExtensionPadding},
+      {.name = "a sender's address, as ffmpeg reads it: every local address", .url = "udp://192.0.2.1:%d",
+       .sendTo = "127.0.0.1", .framing = Framing::kBare},
+      {.name = "multicast group joined on the loopback interface", .url = "udp://239.255.42.1:%d?localaddr=127.0.0.1",
+       .sendTo = "239.255.42.1", .framing = Framing::kRtp},
+  };
+  const Bytes sample = Sample();
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    const int port = FreePort();
+    char url[128];
+    std::snprintf(url, sizeof url, c.url, port);
+    const pid_t tool = Start({"--summary", url}, -1);
+    const bool bound = WaitUntil([port] { return UdpQueue(port) >= 0; });
+    std::vector<Bytes> datagrams = Datagrams(sample, c.framing);
+    datagrams.insert(datagrams.begin(), Bytes(100, 0x00));  // neither packets nor RTP: reported, not read
+    if (bound) Send(c.sendTo, port, datagrams, 3);
+    // Every datagram is read before the signal, which ends the input there.
+    const bool drained = bound && WaitUntil([port] { return UdpQueue(port) == 0; });
+    ToolRun run = Finish(tool, SIGINT);
+    ASSERT_TRUE(bound) << run.err;
+    EXPECT_TRUE(drained);
+    EXPECT_EQ(0, run.status) << run.err;
+    EXPECT_NE(std::string::npos, run.out.find(kNetworkLine)) << run.out;
+    // A header left in front of the packets would show as skipped bytes.
+    EXPECT_NE(std::string::npos, run.err.find("input: 429 packets of 188 bytes, 0 bytes skipped, 0 resyncs"))
+        << run.err;
+    EXPECT_NE(std::string::npos, run.err.find("3 of 66 UDP datagrams held neither")) << run.err;
+  }
+}
+
+TEST_F(RavelDumpTest, BadUdpAddressesFailWithOneLine) {
+  struct Case {
+    const char* url;
+    const char* message;
+  } cases[] = {
+      {.url = "udp://239.1.1.1", .message = "udp://239.1.1.1: no port"},
+      {.url = "udp://@:99999", .message = "bad port '99999'"},
+      {.url = "udp://tuner:1234", .message = "'tuner' is not an IPv4 address"},
+  };
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.url);
+    ToolRun run = Run({c.url});
+    EXPECT_EQ(1, run.status);
+    EXPECT_NE(std::string::npos, run.err.find(c.message)) << run.err;
+    EXPECT_EQ("", run.out);
+  }
+}
+
+// The writer keeps its end open, as a tuner or a growing recording does: only
+// the signal ends the run.
+TEST_F(RavelDumpTest, StopSignalEndsPipesAndFifosAsTheirEnd) {
+  struct Case {
+    const char* name;
+    int signal;
+    bool fifo;               // a named FIFO given as the capture, else standard input
+    size_t cutPacketBytes;   // bytes of one more packet written before the signal
+  } cases[] = {
+      {.name = "SIGINT on standard input", .signal = SIGINT, .fifo = false, .cutPacketBytes = 0},
+      {.name = "SIGTERM on a FIFO", .signal = SIGTERM, .fifo = true, .cutPacketBytes = 0},
+      {.name = "SIGINT inside a packet", .signal = SIGINT, .fifo = false, .cutPacketBytes = 100},
+  };
+  const Bytes sample = Sample();
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    const std::string fifo = Path("dvr0");
+    int ends[2] = {-1, -1};
+    if (c.fifo) {
+      ASSERT_EQ(0, mkfifo(fifo.c_str(), 0600));
+    } else {
+      ASSERT_EQ(0, pipe(ends));
+    }
+    const pid_t tool = Start({"--summary", c.fifo ? fifo : "-"}, ends[0]);
+    if (ends[0] >= 0) close(ends[0]);
+    const int writer = c.fifo ? open(fifo.c_str(), O_WRONLY) : ends[1];
+    Bytes written = sample;
+    written.insert(written.end(), sample.begin(), sample.begin() + c.cutPacketBytes);
+    const bool whole = write(writer, written.data(), written.size()) == static_cast<ssize_t>(written.size());
+    // Once the tool has read everything, its handlers are in place and the
+    // signal ends the input there.
+    const bool drained = WaitUntil([writer] {
+      int waiting = -1;
+      return ioctl(writer, FIONREAD, &waiting) == 0 && waiting == 0;
+    });
+    ToolRun run = Finish(tool, c.signal);
+    close(writer);
+    if (c.fifo) unlink(fifo.c_str());
+    ASSERT_TRUE(whole);
+    EXPECT_TRUE(drained);
+    EXPECT_EQ(0, run.status) << run.err;
+    EXPECT_NE(std::string::npos, run.out.find(kNetworkLine)) << run.out;
+    EXPECT_NE(std::string::npos, run.err.find("input: 143 packets of 188 bytes")) << run.err;
+  }
+}
+#endif  // RAVEL_DUMP_EMULATOR
 
 }  // namespace
 

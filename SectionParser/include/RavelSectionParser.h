@@ -19,6 +19,7 @@
 // Transport stream layer.
 #include "Ravel_CTSPacket.h"
 #include "Ravel_CTSPktAssembler.h"
+#include "Ravel_CSectionAssembler.h"
 #include "Ravel_CPCR.h"
 
 // Tables.

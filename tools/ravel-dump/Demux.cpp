@@ -2,16 +2,15 @@
 
 #include <cstring>
 
-#include "Ravel_ByteOrder.h"
-#include "Ravel_CTSPktAssembler.h"
+#include "PidAssembler.h"
 
 namespace ravel_dump {
 
 Demux::Demux(Stats& stats, SectionSink& sink)
-    : stats_(stats), sink_(sink), restricted_(false), allowed_(kPidCount, true), roles_(kPidCount, PidRole::kNone) {
+    : stats_(stats), sink_(sink), restricted_(false), receiversStore_(false), allowed_(kPidCount, true),
+      roles_(kPidCount, PidRole::kNone) {
   std::memset(slot_, 0xFF, sizeof slot_);
   std::memset(lastCounter_, 0xFF, sizeof lastCounter_);
-  std::memset(scratch_, 0, sizeof scratch_);
 }
 
 Demux::~Demux() {}
@@ -41,7 +40,7 @@ void Demux::AddSectionPid(int pid, PidRole role) {
   if (roles_[pid] == PidRole::kNone || roles_[pid] == PidRole::kRequested) roles_[pid] = role;
   if (slot_[pid] >= 0) return;
   slot_[pid] = static_cast<int16_t>(stores_.size());
-  stores_.emplace_back(new RavelCTSPktStore);
+  stores_.emplace_back(new PidAssembler(pid, receiversStore_, stats_, sink_));
 }
 
 void Demux::OnPacket(const uint8_t* packet) {
@@ -77,7 +76,11 @@ void Demux::OnPacket(const uint8_t* packet) {
     return;
   }
   if (control == 0x02) return;
-  Assemble(pid, *stores_[slot], packet);
+  stores_[slot]->Add(packet);
+}
+
+void Demux::End() {
+  for (auto& store : stores_) store->End();
 }
 
 bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int control) {
@@ -97,32 +100,6 @@ bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int c
   if (role == PidRole::kNone || !longForm) return false;
   AddSectionPid(pid, role);
   return true;
-}
-
-void Demux::Assemble(int pid, RavelCTSPktStore& store, const uint8_t* packet) {
-  std::memcpy(scratch_, packet, 188);
-  // A fresh record for every call: the store appends at most two sections to it.
-  RavelCSectionData out;
-  store.AddTSPacket(scratch_, out);
-  for (int i = 0; i < out.iSectionCount && i < RAVEL_MAX_ASSEMBLED_SECTIONS; ++i) {
-    const uint8_t* section = out.pSection[i];
-    const int held = out.iSectionSize[i];
-    if (section == nullptr || held < 3) {
-      ++stats_.lengthMismatches;
-      continue;
-    }
-    if (section[0] == 0xFF) continue;  // stuffing
-    ++stats_.sectionsAssembled;
-    const int size = RavelSectionSize(section);
-    if (size > held) {
-      // The assembler can close a section by the size of the one before it;
-      // what it holds then is not the whole section.
-      ++stats_.lengthMismatches;
-      continue;
-    }
-    ++stats_.pids[pid].sections;
-    sink_.OnSection(pid, section, static_cast<std::size_t>(size));
-  }
 }
 
 }  // namespace ravel_dump

@@ -13,9 +13,9 @@
 
 #include "Stats.h"
 
-class RavelCTSPktStore;
-
 namespace ravel_dump {
+
+class PidAssembler;
 
 class SectionSink {
  public:
@@ -31,6 +31,9 @@ class Demux {
   Demux(const Demux&) = delete;
   Demux& operator=(const Demux&) = delete;
 
+  // Sections are read through the receivers' RavelCTSPktStore (--receiver)
+  // instead of an assembler that hands out every section whole. Before any PID is added.
+  void UseReceiversStore() { receiversStore_ = true; }
   // The PIDs every receiver reads (PAT, NIT, SDT, EIT, TDT/TOT, BIT).
   void AddStandardPids();
   // Only these PIDs are read from now on, each as a section PID.
@@ -42,6 +45,8 @@ class Demux {
 
   // One 188-byte packet starting with its sync byte.
   void OnPacket(const uint8_t* packet);
+  // The input has ended: sections still in progress are counted as cut.
+  void End();
 
   const std::vector<PidRole>& Roles() const { return roles_; }
 
@@ -50,19 +55,16 @@ class Demux {
   // it: the start of a DSM-CC section on an unread PID makes it a section PID
   // from that packet on. (An AIT waits for its PMT, as in a receiver.)
   bool AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int control);
-  void Assemble(int pid, RavelCTSPktStore& store, const uint8_t* packet);
 
   Stats& stats_;
   SectionSink& sink_;
   int16_t slot_[kPidCount];   // index into stores_, -1 for a PID not read
   uint8_t lastCounter_[kPidCount];  // 0xFF before the first packet with payload
   bool restricted_;
+  bool receiversStore_;
   std::vector<bool> allowed_;
   std::vector<PidRole> roles_;
-  std::vector<std::unique_ptr<RavelCTSPktStore>> stores_;
-  // The packet handed to an assembler, with a zeroed margin behind it: the
-  // assembler may look a few bytes past a short payload.
-  alignas(16) uint8_t scratch_[188 + 64];
+  std::vector<std::unique_ptr<PidAssembler>> stores_;
 };
 
 }  // namespace ravel_dump

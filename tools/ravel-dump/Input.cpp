@@ -8,6 +8,8 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include "StopSignal.h"
+
 namespace ravel_dump {
 
 InputFile::InputFile() : fd_(-1), ownsFd_(false), size_(-1), peekedPos_(0) {}
@@ -17,6 +19,11 @@ InputFile::~InputFile() {
 }
 
 bool InputFile::Open(const std::string& path, std::string& error) {
+  if (IsUdpUrl(path)) {
+    name_ = path;
+    udp_.reset(new UdpReceiver);
+    return udp_->Open(path, error);
+  }
   if (path == "-") {
     fd_ = STDIN_FILENO;
     ownsFd_ = false;
@@ -60,6 +67,8 @@ bool InputFile::Peek(std::size_t size, std::vector<uint8_t>& head, std::string& 
 }
 
 long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error) {
+  // A stop request is the end of the input: what was read before it is used.
+  if (StopRequested()) return 0;
   std::size_t held = std::min(size, peeked_.size() - peekedPos_);
   if (held > 0) {
     std::memcpy(buffer, peeked_.data() + peekedPos_, held);
@@ -69,16 +78,23 @@ long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error)
     peeked_.clear();
     peekedPos_ = 0;
   }
+  // A stream hands out what has arrived: the peeked bytes are enough for now.
+  if (held > 0 && size_ < 0) return static_cast<long long>(held);
   long long n = ReadFromFile(buffer + held, size - held, error);
   return n < 0 ? n : static_cast<long long>(held) + n;
 }
 
 long long InputFile::ReadFromFile(uint8_t* buffer, std::size_t size, std::string& error) {
+  if (udp_) return udp_->Read(buffer, size, error);
+  const bool stream = size_ < 0;
   std::size_t done = 0;
-  while (done < size) {
+  while (done < size && !(stream && done > 0)) {
+    if (stream && !WaitReadable(fd_)) break;
     ssize_t n = read(fd_, buffer + done, size - done);
     if (n < 0) {
-      if (errno == EINTR) continue;
+      // A DVB device reports a ring buffer overrun once and goes on: the
+      // continuity counters show what was lost.
+      if (errno == EINTR || (stream && errno == EOVERFLOW)) continue;
       error = name_ + ": " + std::strerror(errno);
       return -1;
     }

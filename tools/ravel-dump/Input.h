@@ -1,11 +1,16 @@
-// The capture to read: a file or standard input ("-"), read in large chunks.
+// The capture to read: a file or standard input ("-"), read in large chunks;
+// a pipe, FIFO or device (a DVB adapter's dvr0) read as a stream, handed on as
+// it arrives; or a UDP feed (udp://...).
 #ifndef RAVEL_DUMP_INPUT_H
 #define RAVEL_DUMP_INPUT_H
 
 #include <cstddef>
 #include <cstdint>
+#include <memory>
 #include <string>
 #include <vector>
+
+#include "UdpInput.h"
 
 namespace ravel_dump {
 
@@ -26,13 +31,17 @@ class InputFile {
   // read error.
   bool Peek(std::size_t size, std::vector<uint8_t>& head, std::string& error);
 
-  // Reads up to `size` bytes, retrying short reads until `size` bytes or the
-  // end. Returns the count (0 at the end), or -1 with `error` set.
+  // Reads up to `size` bytes: from a file, retrying short reads until `size`
+  // bytes or the end; from a stream, what has arrived once something has.
+  // Returns the count (0 at the end or once a stop is requested), or -1 with
+  // `error` set.
   long long Read(uint8_t* buffer, std::size_t size, std::string& error);
 
-  // Size of a regular file, -1 for a pipe or a terminal.
+  // Size of a regular file, -1 for a stream (pipe, FIFO, device, UDP).
   long long Size() const { return size_; }
   const std::string& Name() const { return name_; }
+  // The UDP feed being read, or null.
+  const UdpReceiver* Udp() const { return udp_.get(); }
 
  private:
   long long ReadFromFile(uint8_t* buffer, std::size_t size, std::string& error);
@@ -43,6 +52,7 @@ class InputFile {
   std::string name_;
   std::vector<uint8_t> peeked_;  // bytes read by Peek and not yet returned by Read
   std::size_t peekedPos_;
+  std::unique_ptr<UdpReceiver> udp_;
 };
 
 }  // namespace ravel_dump

@@ -56,7 +56,7 @@ bool ParseTraceLevels(const std::string& text, unsigned int& levels, std::string
 ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& error) {
   cxxopts::Options parser("ravel-dump", kDescription);
   parser.custom_help("[options]");
-  parser.positional_help("[CAPTURE|-]");
+  parser.positional_help("[CAPTURE|-|udp://[@]ADDRESS:PORT]");
   // clang-format off
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
@@ -64,6 +64,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
        cxxopts::value<std::string>(), "DIR")
       ("sections", "Read the input as concatenated raw sections (otherwise told from its first bytes)")
+      ("receiver", "Reassemble sections with the receivers' own store (RavelCTSPktStore) instead of one "
+       "that delivers every section whole; the report counts what it did not deliver whole")
       ("standard", "Broadcast standard for ratings and regions: brazil or japan",
        cxxopts::value<std::string>(), "NAME")
       ("p,pid", "Read only these PIDs, each as a section PID (comma-separated, decimal or 0x hex)",
@@ -76,7 +78,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       ("no-progress", "No progress bar")
       ("h,help", "Print this help and exit")
       ("V,version", "Print the version and exit")
-      ("input", "Capture file, or - for standard input", cxxopts::value<std::string>());
+      ("input", "Capture file, - for standard input, a FIFO or device (dvr0), or udp://[@]ADDRESS:PORT",
+       cxxopts::value<std::string>());
   // clang-format on
   parser.parse_positional({"input"});
 
@@ -91,6 +94,9 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
                 << "other PIDs are read with --pid.\n"
                 << "Without CAPTURE, standard input is read when it is not a terminal. Transport streams\n"
                 << "and files of raw sections are told apart from their first bytes.\n"
+                << "A pipe, FIFO, device (a DVB adapter's dvr0) or UDP feed (bare or RTP; a multicast group is\n"
+                << "joined) is read as it arrives, until its end or SIGINT/SIGTERM, which end the run as the end\n"
+                << "of the input does.\n"
                 << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
                 << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
       return ParseOutcome::kExitOk;
@@ -155,6 +161,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     if (result.count("trace") && !ParseTraceLevels(result["trace"].as<std::string>(), options.traceLevels, error)) {
       return ParseOutcome::kUsageError;
     }
+    options.receiversStore = result.count("receiver") != 0;
     options.report = result.count("quiet") == 0;
     options.progress = result.count("no-progress") == 0;
   } catch (const cxxopts::exceptions::exception& e) {

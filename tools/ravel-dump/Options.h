@@ -12,8 +12,9 @@ namespace ravel_dump {
 enum class OutputMode { kDump, kSummary, kJson, kNone };
 
 struct Options {
-  std::string input;             // path, or "-" for standard input
+  std::string input;             // path, "-" for standard input, or udp://...
   bool sections = false;         // the input is concatenated raw sections
+  bool receiversStore = false;   // --receiver: sections through RavelCTSPktStore
   OutputMode mode = OutputMode::kDump;
   std::string extractDirectory;  // --extract-modules
   int standard = -1;             // -1: the library's default

@@ -1,5 +1,6 @@
 #include "PacketReader.h"
 
+#include <algorithm>
 #include <cstring>
 
 namespace ravel_dump {
@@ -8,6 +9,8 @@ namespace {
 const std::size_t kChunk = 4u << 20;
 // How far into the input the first run of sync bytes is looked for.
 const std::size_t kDetectWindow = 1u << 20;
+// Enough for a run of sync bytes in every packet size, at any position.
+const std::size_t kFirstLook = 4096;
 const std::size_t kPacket = 188;
 const uint8_t kSync = 0x47;
 // Consecutive sync bytes that make a lock; a shorter input must be packets
@@ -80,7 +83,16 @@ bool PacketReader::FindLock(const uint8_t* data, std::size_t size, std::size_t& 
 }
 
 bool PacketReader::Start(std::string& error) {
-  Fill(kDetectWindow);
+  // A live input is locked as soon as its first packets are in; only when
+  // they show no lock is more of it waited for, up to the whole window.
+  std::size_t syncAt = 0;
+  int stride = 0;
+  bool locked = false;
+  for (std::size_t want = kFirstLook; !locked; want *= 2) {
+    const bool more = Fill(std::min(want, kDetectWindow));
+    locked = end_ >= kFirstLook && FindLock(buffer_.data(), end_, syncAt, stride);
+    if (!more || want >= kDetectWindow) break;
+  }
   if (!error_.empty()) {
     error = error_;
     return false;
@@ -89,9 +101,7 @@ bool PacketReader::Start(std::string& error) {
     error = input_.Name() + ": empty input";
     return false;
   }
-  std::size_t syncAt = 0;
-  int stride = 0;
-  if (!FindLock(buffer_.data(), end_, syncAt, stride)) {
+  if (!locked && !FindLock(buffer_.data(), end_, syncAt, stride)) {
     error = input_.Name() +
             ": not a transport stream (no run of 0x47 sync bytes 188, 192 or 204 bytes apart) nor a file of raw "
             "sections (no chain of sections whose CRCs verify); --sections reads it as sections regardless";

@@ -31,6 +31,14 @@ void PrintReport(std::FILE* out, const InputSummary& input, const Stats& stats, 
                static_cast<unsigned long long>(stats.crcFailures),
                static_cast<unsigned long long>(stats.lengthMismatches),
                static_cast<unsigned long long>(stats.malformed), static_cast<unsigned long long>(stats.panics));
+  if (stats.sectionsCut > 0) {
+    std::fprintf(out, "  sections cut (a packet lost, or the input ended inside one): %llu\n",
+                 static_cast<unsigned long long>(stats.sectionsCut));
+  }
+  if (stats.receiversStore) {
+    std::fprintf(out, "  the receivers' store did not deliver %llu sections whole\n",
+                 static_cast<unsigned long long>(stats.lengthMismatches));
+  }
 
   uint64_t tables[static_cast<int>(TableKind::kCount)] = {};
   for (const auto& table : registry.Tables()) ++tables[static_cast<int>(table->kind)];

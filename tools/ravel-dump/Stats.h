@@ -51,6 +51,8 @@ struct Stats {
 
   uint64_t sectionsAssembled = 0;   // what the assemblers (or the section file) gave
   uint64_t lengthMismatches = 0;    // section_length larger than the bytes assembled
+  uint64_t sectionsCut = 0;         // started but never whole (a packet lost, the input ended)
+  bool receiversStore = false;      // read through the receivers' store (--receiver)
   uint64_t crcFailures = 0;
   uint64_t malformed = 0;
   uint64_t panics = 0;              // array bound reports of the library

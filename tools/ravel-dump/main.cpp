@@ -16,6 +16,7 @@
 #include "Ravel_Cfg.h"
 #include "Report.h"
 #include "Stats.h"
+#include "StopSignal.h"
 #include "TraceOutput.h"
 
 namespace {
@@ -102,12 +103,14 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
     progress.Update(reader.Offset());
   }
   progress.Finish();
+  demux.End();
   summary.packets = reader.Packets();
   summary.packetSize = reader.PacketSize();
   summary.skippedBytes = reader.SkippedBytes();
   summary.resyncs = reader.Resyncs();
   summary.bytes = reader.Offset();
-  if (!reader.Error().empty()) {
+  // A stop request ends the input where it is, inside a packet or not.
+  if (!reader.Error().empty() && !StopRequested()) {
     error = reader.Error();
     return false;
   }
@@ -134,6 +137,7 @@ int main(int argc, char** argv) {
   TraceOutput trace(options.traceLevels, stats);
   InputFile input;
   if (!input.Open(options.input, error)) return Fail(error);
+  InstallStopSignals();
 
   bool sections = options.sections;
   if (!sections && !HoldsRawSections(input, sections, error)) return Fail(error);
@@ -150,12 +154,19 @@ int main(int argc, char** argv) {
     if (!ReadSections(input, capture, stats, inputSummary, error)) return Fail(error);
   } else {
     capture.SetDemux(&demux);
+    if (options.receiversStore) demux.UseReceiversStore();
+    stats.receiversStore = options.receiversStore;
     if (options.pids.empty()) {
       demux.AddStandardPids();
     } else {
       demux.RestrictTo(options.pids);
     }
     if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (input.Udp() != nullptr && input.Udp()->IgnoredDatagrams() > 0) {
+      stats.Problem(std::to_string(input.Udp()->IgnoredDatagrams()) + " of " +
+                    std::to_string(input.Udp()->Datagrams()) +
+                    " UDP datagrams held neither transport stream packets nor RTP carrying them");
+    }
     if (options.pids.empty() && stats.pids[0].sections == 0) {
       stats.Problem("no PAT read: only the PIDs every receiver reads and DSM-CC PIDs were read; name others with --pid");
     }

@@ -1,0 +1,259 @@
+// RavelCSectionAssembler: packet sequences of one PID, the sections handed
+// out whole and the counters of what was dropped and why.
+#include <gtest/gtest.h>
+
+#include <functional>
+#include <ostream>
+#include <string>
+
+#include "AssemblerStreams.h"
+#include "Ravel_ByteOrder.h"
+#include "Ravel_CSectionAssembler.h"
+#include "Ravel_CTSPktAssembler.h"
+#include "StreamBuilder.h"
+
+namespace {
+
+using streams::SectionOfSize;
+
+Bytes Head(const Bytes& b, size_t count) { return Bytes(b.begin(), b.begin() + count); }
+Bytes Tail(const Bytes& b, size_t from) { return Bytes(b.begin() + from, b.end()); }
+Bytes Mid(const Bytes& b, size_t from, size_t count) { return Bytes(b.begin() + from, b.begin() + from + count); }
+
+// One packet with the given counter; the payload is padded with 0xFF.
+Bytes Pkt(uint8_t counter, bool pusi, const Bytes& payload, uint8_t adaptationControl = 1,
+          const Bytes& adaptation = Bytes()) {
+  sb::PacketWriter writer(streams::kAssemblerPid, counter);
+  return writer.MakePacket(pusi, payload, adaptationControl, adaptation);
+}
+Bytes WithTransportError(Bytes packet) {
+  packet[1] |= 0x80;
+  return packet;
+}
+
+// Counters a case leaves out are expected to stay zero.
+struct Counters {
+  unsigned int delivered = 0, cut = 0, transportError = 0, repeated = 0, invalid = 0, breaks = 0, withoutStart = 0;
+  bool operator==(const Counters& o) const {
+    return delivered == o.delivered && cut == o.cut && transportError == o.transportError && repeated == o.repeated &&
+           invalid == o.invalid && breaks == o.breaks && withoutStart == o.withoutStart;
+  }
+};
+void PrintTo(const Counters& c, std::ostream* os) {
+  *os << "{delivered " << c.delivered << ", cut " << c.cut << ", transportError " << c.transportError
+      << ", repeated " << c.repeated << ", invalid " << c.invalid << ", breaks " << c.breaks << ", withoutStart "
+      << c.withoutStart << "}";
+}
+Counters CountersOf(const RavelCSectionAssembler& a) {
+  return Counters{.delivered = a.iSectionsDelivered,
+                  .cut = a.iSectionsCut,
+                  .transportError = a.iPacketsTransportError,
+                  .repeated = a.iPacketsRepeated,
+                  .invalid = a.iPacketsInvalid,
+                  .breaks = a.iContinuityBreaks,
+                  .withoutStart = a.iBytesWithoutStart};
+}
+
+// The handler a receiver would write: keeps a copy of each section.
+void Keep(void* context, unsigned char* section, int size) {
+  static_cast<std::vector<Bytes>*>(context)->push_back(Bytes(section, section + size));
+}
+
+struct Assembled {
+  std::vector<Bytes> sections;
+  Counters counters;
+};
+Assembled Assemble(const std::vector<Bytes>& packets, bool endOfInput) {
+  Assembled run;
+  RavelCSectionAssembler assembler(Keep, &run.sections);
+  for (const Bytes& packet : packets) assembler.AddTSPacket(packet.data());
+  if (endOfInput) assembler.ClearPacketBuffer();
+  run.counters = CountersOf(assembler);
+  return run;
+}
+
+const Bytes kA = SectionOfSize(40, 1);
+const Bytes kB = SectionOfSize(30, 2);
+const Bytes kC = SectionOfSize(20, 3);
+const Bytes kLong = SectionOfSize(500, 4);  // three packets: 183 + 184 + 133 bytes
+const Bytes kTdt = sb::ShortSection(0x70, sb::UtcTime(2026, 11, 24, 5, 0, 0), false);  // 8 bytes
+
+std::vector<Bytes> Packed(const std::vector<Bytes>& sections, uint8_t firstCounter = 0) {
+  sb::PacketWriter writer(streams::kAssemblerPid, firstCounter);
+  writer.AddPackedSections(sections);
+  return writer.Packets();
+}
+std::vector<Bytes> LongThenA() { return Packed({kLong, kA}); }
+std::vector<Bytes> Concat(std::vector<std::vector<Bytes>> parts) {
+  std::vector<Bytes> all;
+  for (const auto& p : parts) all.insert(all.end(), p.begin(), p.end());
+  return all;
+}
+
+struct Case {
+  const char* name;
+  std::function<std::vector<Bytes>()> packets;
+  bool endOfInput = false;  // the input ends after the packets
+  std::vector<Bytes> sections;
+  Counters counters;
+};
+
+const Case kCases[] = {
+    {.name = "several sections in one packet, each with its own size, then stuffing",
+     .packets = [] { return Packed({kA, kB, kC}); },
+     .sections = {kA, kB, kC},
+     .counters = {.delivered = 3}},
+    {.name = "more sections in one packet than a RavelCSectionData holds",
+     .packets = [] { return Packed(std::vector<Bytes>(12, kTdt)); },
+     .sections = std::vector<Bytes>(12, kTdt),
+     .counters = {.delivered = 12}},
+    {.name = "a section over three packets, the next starting where it ends",
+     .packets = LongThenA,
+     .sections = {kLong, kA},
+     .counters = {.delivered = 2}},
+    {.name = "section header split over two packets",
+     .packets =
+         [] {
+           Bytes filler = SectionOfSize(182, 5);  // leaves one byte of the first packet
+           return Concat({{Pkt(0, true, sb::Cat({sb::U8(0), filler, Head(kA, 1)}))},
+                          {Pkt(1, false, Tail(kA, 1))}});
+         },
+     .sections = {SectionOfSize(182, 5), kA},
+     .counters = {.delivered = 2}},
+    {.name = "a repeated packet is dropped once",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           p.insert(p.begin() + 1, p[1]);
+           return p;
+         },
+     .sections = {kLong, kA},
+     .counters = {.delivered = 2, .repeated = 1}},
+    {.name = "a packet sent three times breaks continuity and cuts the section",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           p.insert(p.begin() + 1, 2, p[1]);
+           return p;
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1, .cut = 1, .repeated = 1, .breaks = 1, .withoutStart = 184 + 133}},
+    {.name = "a lost packet cuts the section; the next one is whole",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           p.erase(p.begin() + 1);
+           return p;
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1, .cut = 1, .breaks = 1, .withoutStart = 133}},
+    {.name = "an announced discontinuity is no break, but the section in progress is lost",
+     .packets =
+         [] {
+           Bytes announced = Pkt(9, false, Mid(kLong, 183, 183), 3, Bytes{0x80});
+           return std::vector<Bytes>{Pkt(0, true, sb::Cat({sb::U8(0), kLong})), announced,
+                                     Pkt(10, true, sb::Cat({sb::U8(0), kA}))};
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1, .cut = 1, .withoutStart = 182}},
+    {.name = "a packet with transport_error_indicator is ignored",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           p.insert(p.begin() + 1, WithTransportError(Pkt(7, true, Bytes{0x00, 0x42})));
+           return p;
+         },
+     .sections = {kLong, kA},
+     .counters = {.delivered = 2, .transportError = 1}},
+    {.name = "adaptation-only packets neither carry bytes nor step the counter",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           Bytes stuffing(183, 0xFF);
+           stuffing[0] = 0x00;
+           p.insert(p.begin() + 1, Pkt(1, false, Bytes(), 2, stuffing));
+           return p;
+         },
+     .sections = {kLong, kA},
+     .counters = {.delivered = 2}},
+    {.name = "a payload after an adaptation field",
+     .packets =
+         [] {
+           sb::PacketWriter writer(streams::kAssemblerPid);
+           writer.AddSectionWithAdaptation(kA, 20);
+           return writer.Packets();
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1}},
+    {.name = "a section still short when the next one starts is cut",
+     .packets =
+         [] {
+           return std::vector<Bytes>{Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})),
+                                     Pkt(1, true, sb::Cat({sb::U8(10), Mid(kLong, 183, 10), kA}))};
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1, .cut = 1}},
+    {.name = "joining a stream in the middle of a section",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           p.erase(p.begin());
+           return p;
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1, .withoutStart = 184 + 133}},
+    {.name = "a pointer_field past the packet end makes it invalid",
+     .packets =
+         [] {
+           Bytes bad = Pkt(1, true, Bytes{0xB8});
+           return Concat({{Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})), bad},
+                          {Pkt(2, true, sb::Cat({sb::U8(0), kA}))}});
+         },
+     .sections = {kA},
+     .counters = {.delivered = 1, .cut = 1, .invalid = 1}},
+    {.name = "a section cut by the end of the input is counted",
+     .packets =
+         [] {
+           auto p = LongThenA();
+           p.resize(2);
+           return p;
+         },
+     .endOfInput = true,
+     .sections = {},
+     .counters = {.cut = 1}},
+};
+
+TEST(SectionAssembler, DeliversWholeSectionsAndCountsWhatItDrops) {
+  for (const Case& c : kCases) {
+    SCOPED_TRACE(c.name);
+    Assembled run = Assemble(c.packets(), c.endOfInput);
+    EXPECT_EQ(c.sections, run.sections);
+    EXPECT_EQ(c.counters, run.counters);
+  }
+}
+
+// A short present/following section followed in the same packet by a long
+// schedule section: the legacy store closes the second by the first one's size.
+TEST(SectionAssembler, EitPairsAreAllDeliveredWhole) {
+  const int kPairs = 5000;
+  const std::vector<Bytes> packets = streams::EitPairs(kPairs);
+  Assembled run = Assemble(packets, true);
+  int whole[2] = {0, 0};  // present/following, schedule
+  for (const Bytes& s : run.sections) {
+    if (static_cast<int>(s.size()) == RavelSectionSize(s.data())) ++whole[s[0] == 0x50];
+  }
+  EXPECT_EQ(kPairs, whole[0]);
+  EXPECT_EQ(kPairs, whole[1]);
+  EXPECT_EQ(0u, run.counters.cut);
+
+  RavelCTSPktStore store;
+  int legacyWhole = 0;
+  for (const Bytes& packet : packets) {
+    RavelCSectionData out;
+    store.AddTSPacket(packet.data(), out);
+    for (int i = 0; i < out.iSectionCount; ++i) legacyWhole += out.iSectionSize[i] == RavelSectionSize(out.pSection[i]);
+  }
+  EXPECT_LE(legacyWhole, kPairs);  // at best the present/following ones
+}
+
+}  // namespace
