@@ -26,17 +26,14 @@ inline int BytesToEnd(const unsigned char* packet, const unsigned char* at) {
   return offset < RAVEL_TS_PACKET_SIZE ? RAVEL_TS_PACKET_SIZE - static_cast<int>(offset) : 0;
 }
 
-// A section buffer of `size` bytes whose first `filled` bytes are set, grown to
-// the bytes its parse may read (RavelCReadWindow::OwnedSize) with the bytes
-// nobody supplied cleared. `capacity` is what `buffer` holds, `filled` or more.
-unsigned char* OwnedSectionBuffer(unsigned char* buffer, int capacity, int filled, int size) {
-  int owned = RavelCReadWindow::OwnedSize(buffer, size);
-  if (owned > capacity) {
-    buffer = static_cast<unsigned char*>(realloc(buffer, static_cast<size_t>(owned)));
-  } else {
-    owned = capacity;
-  }
-  if (filled < owned) memset(buffer + filled, 0, static_cast<size_t>(owned - filled));
+// A section buffer whose `capacity` bytes are all set, counted with `size`
+// bytes, grown to the bytes its parse may read (RavelCReadWindow::OwnedSize)
+// with the bytes nobody supplied cleared.
+unsigned char* OwnedSectionBuffer(unsigned char* buffer, int capacity, int size) {
+  const int owned = RavelCReadWindow::OwnedSize(buffer, size);
+  if (owned <= capacity) return buffer;
+  buffer = static_cast<unsigned char*>(realloc(buffer, static_cast<size_t>(owned)));
+  memset(buffer + capacity, 0, static_cast<size_t>(owned - capacity));
   return buffer;
 }
 
@@ -44,7 +41,7 @@ unsigned char* OwnedSectionBuffer(unsigned char* buffer, int capacity, int fille
 inline void EmitSection(const unsigned char* section, int size, RavelCSectionData& out) {
   unsigned char* buffer = static_cast<unsigned char*>(malloc(static_cast<size_t>(size)));
   memcpy(buffer, section, static_cast<size_t>(size));
-  out.Append(OwnedSectionBuffer(buffer, size, size, size), size);
+  out.Append(OwnedSectionBuffer(buffer, size, size), size);
 }
 
 }  // namespace
@@ -146,7 +143,7 @@ void RavelCSectionData::CopyFrom(const RavelCSectionData& other) {
       // put there may end with them. The rest of the window reads as zero.
       unsigned char* buffer = static_cast<unsigned char*>(malloc(static_cast<size_t>(size)));
       memcpy(buffer, other.pSection[i], static_cast<size_t>(size));
-      pSection[i] = OwnedSectionBuffer(buffer, size, size, size);
+      pSection[i] = OwnedSectionBuffer(buffer, size, size);
     }
   }
 }
@@ -355,9 +352,10 @@ void RavelCTSPktStore::GetAssembleData(RavelCSectionData& out) {
       copied = capacity;
     }
   }
+  if (copied < capacity) memset(buffer + copied, 0, static_cast<size_t>(capacity - copied));
   // A section handed out with another section's size (see AddTSPacket) may
   // declare more bytes than were collected: those read as zero.
-  out.Append(OwnedSectionBuffer(buffer, capacity, copied, iSectionLen), iSectionLen);
+  out.Append(OwnedSectionBuffer(buffer, capacity, iSectionLen), iSectionLen);
   if (copied != iCurBufSize) {
     RAVEL_TRACE(RAVEL_PARSER_ERROR, "Data size not matched! bufPos=[%d], iCurBufSize=[%d], iSectionLen=[%d]\n", copied,
                 iCurBufSize, iSectionLen);
