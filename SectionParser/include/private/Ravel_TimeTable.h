@@ -11,6 +11,8 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
+#include "Ravel_CReadWindow.h"
+
 template <class TimeTable>
 void RavelTimeTable_Clear(TimeTable& table) {
   table.iTableId = 0;
@@ -27,7 +29,8 @@ void RavelTimeTable_Clear(TimeTable& table) {
 // Null clears the fields and gives -9. A foreign table_id is stored, traced
 // ("Table ID isn't for <name>! ..." at error level, from the caller's
 // `sourcePath` and `sourceLine`) and gives -8 with the other fields as they
-// were. Otherwise the name is set and the header and time are read: 0.
+// were. Otherwise the name is set and the header and time are read: 0. They are
+// read through the section's read window: a short section reads zeros there.
 template <class TimeTable>
 int RavelTimeTable_ParseHeaderAndTime(TimeTable& table, unsigned char* section, unsigned char tableId,
                                       const char* name, const char* sourcePath, int sourceLine) {
@@ -35,19 +38,19 @@ int RavelTimeTable_ParseHeaderAndTime(TimeTable& table, unsigned char* section, 
     RavelTimeTable_Clear(table);
     return kRavelErrNullSection;
   }
-  table.iTableId = section[0];
+  table.iTableId = RavelCReadWindow::Read8(section);
   if (table.iTableId != tableId) {
     RAVEL_PGL_TRACE_AT(sourcePath, sourceLine, RAVEL_PARSER_ERROR, "Table ID isn't for %s! Table ID=[0x%02x]\n", name,
                        table.iTableId);
     return kRavelErrInvalidArgument;
   }
   table.SetTableName(name);
-  table.bSectionSyntaxIndicator = section[1] >> 7;  // x.......
-  table.iSectionLength = RavelRead12(section + 1);  // ....xxxx xxxxxxxx
-  RavelDateCode_DecodeMJD(RavelRead16(section + 3), table.iYear, table.iMonth, table.iDay);
-  table.iHour = RavelBcd(section[5]);
-  table.iMinute = RavelBcd(section[6]);
-  table.iSecond = RavelBcd(section[7]);
+  table.bSectionSyntaxIndicator = RavelCReadWindow::Read8(section + 1) >> 7;  // x.......
+  table.iSectionLength = RavelCReadWindow::Read12(section + 1);             // ....xxxx xxxxxxxx
+  RavelDateCode_DecodeMJD(RavelCReadWindow::Read16(section + 3), table.iYear, table.iMonth, table.iDay);
+  table.iHour = RavelBcd(RavelCReadWindow::Read8(section + 5));
+  table.iMinute = RavelBcd(RavelCReadWindow::Read8(section + 6));
+  table.iSecond = RavelBcd(RavelCReadWindow::Read8(section + 7));
   return kRavelOk;
 }
 
