@@ -16,7 +16,8 @@ struct Options {
   bool sections = false;         // the input is concatenated raw sections
   OutputMode mode = OutputMode::kDump;
   std::string extractDirectory;  // --extract-modules
-  int standard = -1;             // -1: the library's default
+  int standard = -1;             // -1: detected from the capture
+  bool rawText = false;          // broadcast texts as broadcast, not decoded
   std::vector<int> pids;         // --pid: read only these, all as section PIDs
   TableFilter tables;            // --table
   unsigned int traceLevels = 0;  // --trace: library trace levels shown on stderr
