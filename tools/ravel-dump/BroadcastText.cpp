@@ -1,14 +1,8 @@
 #include "BroadcastText.h"
 
-// libaribb24's headers declare C functions without saying so.
-extern "C" {
-#include <aribb24/aribb24.h>
-#include <aribb24/decoder.h>
-}
-
 #include <cstring>
-#include <vector>
 
+#include "AribText.h"
 #include "ByteText.h"
 #include "Ravel_Cfg.h"
 
@@ -57,88 +51,6 @@ std::string Latin9ToUtf8(const unsigned char* bytes, std::size_t length) {
   return out;
 }
 
-// ARIB STD-B24 control codes that libaribb24 does not act on in SI texts.
-const unsigned char kAribLineBreak = 0x0D;  // APR, the line break of SI texts
-const unsigned char kAribMiddleSize = 0x89;  // MSZ: alphanumerics shown half-width
-const unsigned char kAribNormalSize = 0x8A;  // NSZ: back to full width
-
-// In middle size the alphanumeric set is shown half-width: the full-width
-// forms libaribb24 gives (U+FF01 to U+FF5E, U+3000 for the space) become ASCII.
-void AppendHalfWidth(std::string& out, const std::string& fullWidth) {
-  for (std::size_t i = 0; i < fullWidth.size();) {
-    const unsigned char* c = reinterpret_cast<const unsigned char*>(fullWidth.data()) + i;
-    if (i + 3 <= fullWidth.size() && c[0] == 0xEF && ((c[1] == 0xBC && c[2] >= 0x81) || (c[1] == 0xBD && c[2] <= 0x9E))) {
-      unsigned int code = ((c[1] & 0x3F) << 6 | (c[2] & 0x3F)) + 0xF000 - 0xFEE0;
-      out += static_cast<char>(code);
-      i += 3;
-    } else if (i + 3 <= fullWidth.size() && c[0] == 0xE3 && c[1] == 0x80 && c[2] == 0x80) {
-      out += ' ';
-      i += 3;
-    } else {
-      out += fullWidth[i++];
-    }
-  }
-}
-
-// libaribb24 decodes the character sets of ARIB STD-B24 8-unit code (JIS X 0208
-// kanji, alphanumerics, hiragana, katakana, the additional symbols), with the
-// designations and shifts the text makes, starting from the default sets of SI
-// texts. It drops control codes, line breaks and character sizes included:
-// the text is therefore decoded run by run between those two, the decoder
-// keeping its state from one run to the next.
-class AribDecoder {
- public:
-  AribDecoder() : instance_(arib_instance_new(nullptr)) {
-    decoder_ = instance_ != nullptr ? arib_get_decoder(instance_) : nullptr;
-  }
-  ~AribDecoder() {
-    if (instance_ != nullptr) arib_instance_destroy(instance_);
-  }
-  AribDecoder(const AribDecoder&) = delete;
-  AribDecoder& operator=(const AribDecoder&) = delete;
-
-  std::string Decode(const unsigned char* bytes, std::size_t length) {
-    std::string out;
-    if (decoder_ == nullptr) return out;
-    arib_initialize_decoder(decoder_);
-    bool middleSize = false;
-    std::size_t runStart = 0;
-    for (std::size_t i = 0; i <= length; ++i) {
-      bool end = i == length;
-      if (!end && bytes[i] != kAribLineBreak && bytes[i] != kAribMiddleSize && bytes[i] != kAribNormalSize) continue;
-      std::string run = DecodeRun(bytes + runStart, i - runStart);
-      if (middleSize) {
-        AppendHalfWidth(out, run);
-      } else {
-        out += run;
-      }
-      if (end) break;
-      if (bytes[i] == kAribLineBreak) out += '\n';
-      middleSize = bytes[i] == kAribMiddleSize ? true : bytes[i] == kAribNormalSize ? false : middleSize;
-      runStart = i + 1;
-    }
-    return out;
-  }
-
- private:
-  std::string DecodeRun(const unsigned char* bytes, std::size_t length) {
-    if (length == 0) return std::string();
-    // At most 4 UTF-8 bytes for each byte of the run (an additional symbol
-    // beyond the BMP from a single-shifted byte pair).
-    std::vector<char> buffer(4 * length + 4, '\0');
-    std::size_t written = arib_decode_buffer(decoder_, bytes, length, buffer.data(), buffer.size() - 1);
-    return std::string(buffer.data(), strnlen(buffer.data(), written));
-  }
-
-  arib_instance_t* instance_;
-  arib_decoder_t* decoder_;
-};
-
-std::string Arib8UnitToUtf8(const unsigned char* bytes, std::size_t length) {
-  static AribDecoder decoder;
-  return decoder.Decode(bytes, length);
-}
-
 struct TextInLine {
   const char* opening;  // ends with the '[' before the text
   const char* closing;  // what follows the text, to the end of the line
@@ -165,7 +77,7 @@ TextCoding TextCodingOf(int standard, bool rawText) {
 std::string DecodeBroadcastText(const char* bytes, std::size_t length, TextCoding coding) {
   const unsigned char* text = reinterpret_cast<const unsigned char*>(bytes);
   switch (coding) {
-    case TextCoding::kArib8Unit: return Arib8UnitToUtf8(text, length);
+    case TextCoding::kArib8Unit: return AribTextToUtf8(text, length);
     case TextCoding::kLatin9: return Latin9ToUtf8(text, length);
     case TextCoding::kAsBroadcast: break;
   }
