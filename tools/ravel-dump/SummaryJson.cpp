@@ -1,6 +1,6 @@
-// The summary as JSON for scripts. Broadcast texts are decoded in the
-// summary's coding, line breaks kept; with --raw-text, and for file and module
-// names, bytes are escaped as in the text output (\xNN for control bytes and
+// The summary as JSON for scripts. SI texts (names, event texts) are decoded
+// in the summary's coding, line breaks kept; with --raw-text, and for the
+// application and carousel names and paths, bytes are escaped as in the text output (\xNN for control bytes and
 // bytes that are not UTF-8), so the document is valid UTF-8 whatever the
 // broadcast's character coding. Times carry the broadcast's time base.
 #include <nlohmann/json.hpp>
@@ -110,7 +110,7 @@ std::string SummaryJson(const Summary& s) {
                             {"application_id", app.applicationId},
                             {"control_code", app.controlCode},
                             {"document_resolution", app.documentResolution},
-                            {"name", Text(app.name, s.textCoding)},
+                            {"name", Bytes(app.name)},
                             {"path", Bytes(app.path)},
                             {"file", Bytes(app.file)}});
   }

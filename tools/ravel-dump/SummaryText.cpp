@@ -183,7 +183,7 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
                  "  PID %s type 0x%04x: organization 0x%08x application 0x%04x control %u (%s) name %s path %s "
                  "file %s\n",
                  Pid(app.pid).c_str(), app.applicationType, app.organizationId, app.applicationId, app.controlCode,
-                 ControlCodeName(app.controlCode), Quoted(app.name, s.textCoding).c_str(),
+                 ControlCodeName(app.controlCode), Quoted(app.name, TextCoding::kAsBroadcast).c_str(),
                  Quoted(app.path, TextCoding::kAsBroadcast).c_str(), Quoted(app.file, TextCoding::kAsBroadcast).c_str());
   }
 
