@@ -2,11 +2,15 @@
 
 #include <iconv.h>
 
+#include "BroadcastText.h"
+
+#if RAVEL_DUMP_ARIB_SYMBOLS
 // libaribb24's headers declare C functions without saying so.
 extern "C" {
 #include <aribb24/aribb24.h>
 #include <aribb24/decoder.h>
 }
+#endif
 
 namespace ravel_dump {
 namespace {
@@ -59,24 +63,6 @@ const unsigned char kMsz = 0x89, kNsz = 0x8A, kSzx = 0x8B, kCol = 0x90, kFlc = 0
 
 const unsigned int kReplacement = 0xFFFD;
 
-void AppendUtf8(std::string& out, unsigned int code) {
-  if (code < 0x80) {
-    out += static_cast<char>(code);
-  } else if (code < 0x800) {
-    out += static_cast<char>(0xC0 | (code >> 6));
-    out += static_cast<char>(0x80 | (code & 0x3F));
-  } else if (code < 0x10000) {
-    out += static_cast<char>(0xE0 | (code >> 12));
-    out += static_cast<char>(0x80 | ((code >> 6) & 0x3F));
-    out += static_cast<char>(0x80 | (code & 0x3F));
-  } else {
-    out += static_cast<char>(0xF0 | (code >> 18));
-    out += static_cast<char>(0x80 | ((code >> 12) & 0x3F));
-    out += static_cast<char>(0x80 | ((code >> 6) & 0x3F));
-    out += static_cast<char>(0x80 | (code & 0x3F));
-  }
-}
-
 // One character of the C library's iconv from `charset` (EUC-JP for JIS X 0208,
 // EUC-JISX0213 for the JIS compatible kanji planes); false when unassigned.
 class IconvCharacter {
@@ -120,8 +106,9 @@ bool AppendJisX0213(std::string& out, int plane, unsigned char row, unsigned cha
 
 // The additional symbols and kanji of rows 85 to 94 (the [字], [二], [解]
 // marks of event names, circled numbers, units, extra kanji), from the table
-// of libaribb24, designated alone into a fresh decoder.
+// of libaribb24, designated alone into a fresh decoder. Unknown without it.
 bool AppendAdditionalSymbol(std::string& out, unsigned char row, unsigned char cell) {
+#if RAVEL_DUMP_ARIB_SYMBOLS
   static arib_instance_t* instance = arib_instance_new(nullptr);
   arib_decoder_t* decoder = instance != nullptr ? arib_get_decoder(instance) : nullptr;
   if (decoder == nullptr) return false;
@@ -132,6 +119,10 @@ bool AppendAdditionalSymbol(std::string& out, unsigned char row, unsigned char c
   if (written == 0 || written >= sizeof buffer) return false;
   out.append(buffer, written);
   return true;
+#else
+  (void)out, (void)row, (void)cell;
+  return false;
+#endif
 }
 
 // Cells 0x77 to 0x7E of the hiragana and katakana sets: iteration marks,

@@ -9,19 +9,6 @@
 namespace ravel_dump {
 namespace {
 
-void AppendUtf8(std::string& out, unsigned int code) {
-  if (code < 0x80) {
-    out += static_cast<char>(code);
-  } else if (code < 0x800) {
-    out += static_cast<char>(0xC0 | (code >> 6));
-    out += static_cast<char>(0x80 | (code & 0x3F));
-  } else {
-    out += static_cast<char>(0xE0 | (code >> 12));
-    out += static_cast<char>(0x80 | ((code >> 6) & 0x3F));
-    out += static_cast<char>(0x80 | (code & 0x3F));
-  }
-}
-
 // ISO/IEC 8859-15 is ISO/IEC 8859-1 but for these eight characters.
 unsigned int Latin9Character(unsigned char byte) {
   switch (byte) {
@@ -68,6 +55,24 @@ const TextInLine kTextLines[] = {
 const char kAbsentText[] = "(null)";
 
 }  // namespace
+
+void AppendUtf8(std::string& out, unsigned int code) {
+  if (code < 0x80) {
+    out += static_cast<char>(code);
+  } else if (code < 0x800) {
+    out += static_cast<char>(0xC0 | (code >> 6));
+    out += static_cast<char>(0x80 | (code & 0x3F));
+  } else if (code < 0x10000) {
+    out += static_cast<char>(0xE0 | (code >> 12));
+    out += static_cast<char>(0x80 | ((code >> 6) & 0x3F));
+    out += static_cast<char>(0x80 | (code & 0x3F));
+  } else {
+    out += static_cast<char>(0xF0 | (code >> 18));
+    out += static_cast<char>(0x80 | ((code >> 12) & 0x3F));
+    out += static_cast<char>(0x80 | ((code >> 6) & 0x3F));
+    out += static_cast<char>(0x80 | (code & 0x3F));
+  }
+}
 
 TextCoding TextCodingOf(int standard, bool rawText) {
   if (rawText) return TextCoding::kAsBroadcast;

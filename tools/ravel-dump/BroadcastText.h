@@ -21,6 +21,9 @@ TextCoding TextCodingOf(int standard, bool rawText);
 std::string DecodeBroadcastText(const char* bytes, std::size_t length, TextCoding coding);
 std::string DecodeBroadcastText(const std::string& bytes, TextCoding coding);
 
+// Appends the UTF-8 form of the Unicode character `code`.
+void AppendUtf8(std::string& out, unsigned int code);
+
 // The same on one line, for the summary and the dumps: line breaks as spaces.
 std::string OneLineText(const std::string& bytes, TextCoding coding);
 
