@@ -103,7 +103,8 @@ const char* ControlCodeName(uint32_t code) {
 
 void PrintSummaryText(const Summary& s, std::FILE* out) {
   std::fprintf(out, "Standard: %s (%s)\n", s.standard.c_str(), s.standardReason.c_str());
-  std::fprintf(out, "Time base: UTC%s (times are as broadcast, in local time)\n", UtcOffsetText(s.utcOffsetMinutes).c_str());
+  std::fprintf(out, "Time base: UTC%s (times are as broadcast, in local time)\n",
+               UtcOffsetText(s.utcOffsetMinutes).c_str());
   if (s.network.valid) {
     std::fprintf(out, "Network: %s (network_id 0x%04x)\n",
                  s.network.name.empty() ? "(no name)" : Quoted(s.network.name, s.textCoding).c_str(), s.network.id);

@@ -156,8 +156,6 @@ int main(int argc, char** argv) {
     }
   }
 
-  // Everything is read: now the outputs, modules first so that a failure to
-  // write them leaves no half output behind.
   // The standard decides how ratings and regions parse, how texts read and
   // the time base: named on the command line, or told by the capture's tables.
   StandardChoice choice = options.standard >= 0
@@ -165,6 +163,9 @@ int main(int argc, char** argv) {
                               : DetectStandard(BuildSummary(capture.Registry(), capture.Carousel(), trace));
   RavelCfg_SetStandard(choice.standard);
   trace.SetTextCoding(TextCodingOf(choice.standard, options.rawText));
+
+  // Everything is read: now the outputs, modules first so that a failure to
+  // write them leaves no half output behind.
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
                      !options.extractDirectory.empty();
