@@ -929,7 +929,8 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
   std::string file = Write("oneseg.ts", ReceiverStream());
   ToolRun run = Run({"--summary", file});
   ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_EQ("Standard: brazil\n"
+  EXPECT_EQ("Standard: brazil (event language por; parental rating country BRA; local time offset country BRA)\n"
+      "Time base: UTC-03:00 (times are as broadcast, in local time)\n"
       "Network: \"Rede Teste\" (network_id 0x0640)\n"
       "Transport stream: 0x0640\n"
       "  TS 0x0640 of network 0x0640 \"Teste\", remote control key 5\n"
@@ -964,8 +965,8 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
       << run.err;
 
   // The broadcast standard decides how the ratings read (ARIB: rating + 3 years).
-  ToolRun japan = Run({"--standard", "japan", "--summary", file});
-  EXPECT_NE(std::string::npos, japan.out.find("Standard: japan\n"));
+  ToolRun japan = Run({"--standard", "japan", "--raw-text", "--summary", file});
+  EXPECT_NE(std::string::npos, japan.out.find("Standard: japan (--standard)\n"));
   EXPECT_NE(std::string::npos, japan.out.find("\"Jornal\" rating BRA age 0 (event 0x0001)"));
   EXPECT_NE(std::string::npos, japan.out.find("\"Novela\" rating BRA age 8 (event 0x0002)"));
 }
@@ -1063,10 +1064,12 @@ TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
   ExpectMembers({{"name", "W9"}, {"provider", "Multi4"}}, w9);
   const nlohmann::json day = {{"year", 2019}, {"month", 1}, {"day", 22}};
   ExpectMembers(day, w9["present"]["start"]);
-  ExpectMembers({{"event_id", 0x1C}, {"name", "\\x05NCIS"}}, w9["present"]);
+  // The DVB character-table byte 0x05 is a control code to the Brazilian
+  // texts' ISO/IEC 8859-15, and dropped.
+  ExpectMembers({{"event_id", 0x1C}, {"name", "NCIS"}}, w9["present"]);
   ExpectMembers({{"hour", 12}, {"minute", 35}, {"second", 0}}, w9["present"]["start"]);
   ExpectMembers({{"hours", 0}, {"minutes", 50}}, w9["present"]["duration"]);
-  ExpectMembers({{"event_id", 0x1D}, {"name", "\\x05NCIS"}}, w9["following"]);
+  ExpectMembers({{"event_id", 0x1D}, {"name", "NCIS"}}, w9["following"]);
   ExpectMembers({{"hour", 13}, {"minute", 25}}, w9["following"]["start"]);
   ExpectMembers({{"hours", 0}, {"minutes", 55}}, w9["following"]["duration"]);
   EXPECT_EQ("fra", w9["following"]["ratings"][0]["country"].get<std::string>());

@@ -66,8 +66,9 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       ("sections", "Read the input as concatenated raw sections (otherwise told from its first bytes)")
       ("receiver", "Reassemble sections with the receivers' own store (RavelCTSPktStore) instead of one "
        "that delivers every section whole; the report counts what it did not deliver whole")
-      ("standard", "Broadcast standard for ratings and regions: brazil or japan",
-       cxxopts::value<std::string>(), "NAME")
+      ("standard", "Broadcast standard for ratings, regions, texts and times: brazil or japan "
+       "(default: detected from the capture)", cxxopts::value<std::string>(), "NAME")
+      ("raw-text", "Show broadcast texts as broadcast (bytes escaped as \\xNN) instead of decoded")
       ("p,pid", "Read only these PIDs, each as a section PID (comma-separated, decimal or 0x hex)",
        cxxopts::value<std::vector<std::string>>(), "PIDS")
       ("t,table", "Dump only these tables: pat, pmt, nit, sdt, eit, tdt, tot, bit, ait, dsi, dii, ddb, "
@@ -126,6 +127,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       }
       if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
     }
+    options.rawText = result.count("raw-text") > 0;
     if (result.count("standard")) {
       std::string name = result["standard"].as<std::string>();
       std::transform(name.begin(), name.end(), name.begin(),

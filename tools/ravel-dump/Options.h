@@ -17,7 +17,8 @@ struct Options {
   bool receiversStore = false;   // --receiver: sections through RavelCTSPktStore
   OutputMode mode = OutputMode::kDump;
   std::string extractDirectory;  // --extract-modules
-  int standard = -1;             // -1: the library's default
+  int standard = -1;             // -1: detected from the capture
+  bool rawText = false;          // broadcast texts as broadcast, not decoded
   std::vector<int> pids;         // --pid: read only these, all as section PIDs
   TableFilter tables;            // --table
   unsigned int traceLevels = 0;  // --trace: library trace levels shown on stderr

@@ -1,5 +1,6 @@
 // What a viewer of the channel wants to know, gathered from the tables read.
-// Texts hold the broadcast's own bytes; the outputs escape them.
+// Texts hold the broadcast's own bytes; the outputs decode them in the
+// summary's text coding.
 #ifndef RAVEL_DUMP_SUMMARY_H
 #define RAVEL_DUMP_SUMMARY_H
 
@@ -7,6 +8,8 @@
 #include <cstdio>
 #include <string>
 #include <vector>
+
+#include "BroadcastText.h"
 
 namespace ravel_dump {
 
@@ -32,6 +35,7 @@ struct EventSummary {
   DateTime start;
   Duration duration;
   int runningStatus = 0;
+  std::string language;  // of the short event
   std::string name;
   std::string text;
   std::vector<Rating> ratings;
@@ -126,7 +130,10 @@ struct CarouselSummary {
 };
 
 struct Summary {
-  std::string standard;
+  std::string standard;        // "brazil" or "japan"
+  std::string standardReason;  // why: detected signs, or --standard
+  TextCoding textCoding = TextCoding::kAsBroadcast;
+  int utcOffsetMinutes = 0;    // time base of the broadcast's times
   int transportStreamId = -1;
   NetworkSummary network;
   std::vector<ServiceSummary> services;

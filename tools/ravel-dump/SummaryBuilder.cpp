@@ -23,6 +23,7 @@
 #include "Ravel_CTableSDT.h"
 #include "Ravel_CTableTDT.h"
 #include "Ravel_CTableTOT.h"
+#include "StandardDetection.h"
 
 namespace ravel_dump {
 namespace {
@@ -209,6 +210,7 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
   event.duration.seconds = info.iDurationSecond;
   event.runningStatus = info.iRunningStatus;
   if (const RavelCShortEventDescriptor* shortEvent = info.pShortEventDescriptor) {
+    event.language = Field(shortEvent->szLanguageCode, sizeof shortEvent->szLanguageCode);
     event.name = Text(shortEvent->pEventName);
     event.text = Text(shortEvent->pEventDescription);
   }
@@ -319,7 +321,7 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
 Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace) {
   TraceOutput::QuietScope quiet(trace);
   Summary summary;
-  summary.standard = RavelCfg_GetStandard() == 1 ? "japan" : "brazil";
+  summary.standard = StandardName(RavelCfg_GetStandard());
   AddPat(registry, summary);
   AddSdt(registry, summary);
   AddPmts(registry, summary);

@@ -1,38 +1,44 @@
-// The summary as JSON for scripts. Broadcast texts are escaped as in the text
-// output (\xNN for control bytes and bytes that are not UTF-8), so the
-// document is valid UTF-8 whatever the broadcast's character coding.
+// The summary as JSON for scripts. SI texts (names, event texts) are decoded
+// in the summary's coding, line breaks kept; with --raw-text, and for the
+// application and carousel names and paths, bytes are escaped as in the text output (\xNN for control bytes and
+// bytes that are not UTF-8), so the document is valid UTF-8 whatever the
+// broadcast's character coding. Times carry the broadcast's time base.
 #include <nlohmann/json.hpp>
 
 #include "ByteText.h"
 #include "Summary.h"
+#include "TimeBase.h"
 
 namespace ravel_dump {
 namespace {
 
 using nlohmann::json;
 
-json Text(const std::string& text) { return EscapeBytes(text); }
+json Text(const std::string& text, TextCoding coding) { return DecodeBroadcastText(text, coding); }
 
-json When(const DateTime& t) {
+json Bytes(const std::string& bytes) { return EscapeBytes(bytes); }
+
+json When(const DateTime& t, int utcOffsetMinutes) {
   if (!t.valid) return nullptr;
-  return json{{"year", t.year}, {"month", t.month}, {"day", t.day},
-              {"hour", t.hour}, {"minute", t.minute}, {"second", t.second}};
+  return json{{"year", t.year}, {"month", t.month}, {"day", t.day},   {"hour", t.hour},
+              {"minute", t.minute}, {"second", t.second}, {"iso8601", Iso8601(t, utcOffsetMinutes)}};
 }
 
 json Pid(int pid) { return pid < 0 ? json(nullptr) : json(pid); }
 
-json Event(const EventSummary& e) {
+json Event(const EventSummary& e, const Summary& s) {
   if (!e.valid) return nullptr;
   json ratings = json::array();
   for (const Rating& r : e.ratings)
-    ratings.push_back({{"country", Text(r.country)}, {"content", r.content}, {"minimum_age", r.minimumAge}});
+    ratings.push_back({{"country", Bytes(r.country)}, {"content", r.content}, {"minimum_age", r.minimumAge}});
   return json{{"event_id", e.eventId},
-              {"start", When(e.start)},
+              {"start", When(e.start, s.utcOffsetMinutes)},
               {"duration", {{"hours", e.duration.hours}, {"minutes", e.duration.minutes},
                             {"seconds", e.duration.seconds}}},
               {"running_status", e.runningStatus},
-              {"name", Text(e.name)},
-              {"text", Text(e.text)},
+              {"language", Bytes(e.language)},
+              {"name", Text(e.name, s.textCoding)},
+              {"text", Text(e.text, s.textCoding)},
               {"ratings", ratings}};
 }
 
@@ -47,7 +53,7 @@ std::string SummaryJson(const Summary& s) {
       for (const auto& service : ts.serviceList) services.push_back({{"id", service.first}, {"type", service.second}});
       streams.push_back({{"id", ts.id},
                          {"original_network_id", ts.originalNetworkId},
-                         {"name", Text(ts.name)},
+                         {"name", Text(ts.name, s.textCoding)},
                          {"remote_control_key", ts.remoteControlKey < 0 ? json(nullptr) : json(ts.remoteControlKey)},
                          {"area_code", ts.areaCode < 0 ? json(nullptr) : json(ts.areaCode)},
                          {"guard_interval", ts.guardInterval < 0 ? json(nullptr) : json(ts.guardInterval)},
@@ -56,7 +62,7 @@ std::string SummaryJson(const Summary& s) {
                          {"partial_reception", ts.partialReception},
                          {"services", services}});
     }
-    network = {{"id", s.network.id}, {"name", Text(s.network.name)}, {"transport_streams", streams}};
+    network = {{"id", s.network.id}, {"name", Text(s.network.name, s.textCoding)}, {"transport_streams", streams}};
   }
 
   json services = json::array();
@@ -69,8 +75,8 @@ std::string SummaryJson(const Summary& s) {
     }
     services.push_back({{"id", service.id},
                         {"type", service.type < 0 ? json(nullptr) : json(service.type)},
-                        {"name", Text(service.name)},
-                        {"provider", Text(service.provider)},
+                        {"name", Text(service.name, s.textCoding)},
+                        {"provider", Text(service.provider, s.textCoding)},
                         {"one_segment", service.oneSegment},
                         {"pmt_pid", Pid(service.pmtPid)},
                         {"pcr_pid", Pid(service.pcrPid)},
@@ -78,22 +84,22 @@ std::string SummaryJson(const Summary& s) {
                         {"audio_pids", service.audioPids},
                         {"caption_pid", Pid(service.captionPid)},
                         {"streams", streams},
-                        {"present", Event(service.present)},
-                        {"following", Event(service.following)}});
+                        {"present", Event(service.present, s)},
+                        {"following", Event(service.following, s)}});
   }
 
   json time = nullptr;
   if (s.time.valid) {
     json offsets = json::array();
     for (const LocalOffset& o : s.time.offsets) {
-      offsets.push_back({{"country", Text(o.country)},
+      offsets.push_back({{"country", Bytes(o.country)},
                          {"region_id", o.regionId},
                          {"polarity", o.polarity},
                          {"offset", {{"hours", o.offsetHours}, {"minutes", o.offsetMinutes}}},
-                         {"time_of_change", When(o.timeOfChange)},
+                         {"time_of_change", When(o.timeOfChange, s.utcOffsetMinutes)},
                          {"next_offset", {{"hours", o.nextHours}, {"minutes", o.nextMinutes}}}});
     }
-    time = {{"source", s.time.source}, {"time", When(s.time.time)}, {"local_time_offsets", offsets}};
+    time = {{"source", s.time.source}, {"time", When(s.time.time, s.utcOffsetMinutes)}, {"local_time_offsets", offsets}};
   }
 
   json applications = json::array();
@@ -104,9 +110,9 @@ std::string SummaryJson(const Summary& s) {
                             {"application_id", app.applicationId},
                             {"control_code", app.controlCode},
                             {"document_resolution", app.documentResolution},
-                            {"name", Text(app.name)},
-                            {"path", Text(app.path)},
-                            {"file", Text(app.file)}});
+                            {"name", Bytes(app.name)},
+                            {"path", Bytes(app.path)},
+                            {"file", Bytes(app.file)}});
   }
 
   json carousels = json::array();
@@ -116,17 +122,19 @@ std::string SummaryJson(const Summary& s) {
       modules.push_back({{"id", m.id},
                          {"size", m.size},
                          {"version", m.version},
-                         {"name", Text(m.name)},
+                         {"name", Bytes(m.name)},
                          {"blocks_received", m.blocksReceived},
                          {"blocks_total", m.blocksTotal},
                          {"complete", m.complete},
-                         {"file", m.file.empty() ? json(nullptr) : json(EscapeBytes(m.file))}});
+                         {"file", m.file.empty() ? json(nullptr) : Bytes(m.file)}});
     }
     carousels.push_back(
         {{"pid", Pid(c.pid)}, {"download_id", c.downloadId}, {"block_size", c.blockSize}, {"modules", modules}});
   }
 
   json document = {{"standard", s.standard},
+                   {"standard_reason", s.standardReason},
+                   {"time_base", UtcOffsetText(s.utcOffsetMinutes)},
                    {"transport_stream_id", s.transportStreamId < 0 ? json(nullptr) : json(s.transportStreamId)},
                    {"network", network},
                    {"services", services},

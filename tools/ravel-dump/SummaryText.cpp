@@ -3,6 +3,7 @@
 
 #include "ByteText.h"
 #include "Summary.h"
+#include "TimeBase.h"
 
 namespace ravel_dump {
 namespace {
@@ -17,7 +18,9 @@ std::string Format(const char* format, ...) {
   return buffer;
 }
 
-std::string Quoted(const std::string& text) { return "\"" + EscapeBytes(text) + "\""; }
+// A broadcast text in the summary's coding, or other bytes of the broadcast as
+// they came (kAsBroadcast).
+std::string Quoted(const std::string& text, TextCoding coding) { return "\"" + OneLineText(text, coding) + "\""; }
 
 std::string When(const DateTime& t) {
   if (!t.valid) return "?";
@@ -31,14 +34,14 @@ const char* GuardName(int guard) {
   return guard >= 0 && guard < 4 ? kNames[guard] : "?";
 }
 
-void PrintEvent(std::FILE* out, const char* label, const EventSummary& event) {
+void PrintEvent(std::FILE* out, const char* label, const EventSummary& event, TextCoding coding) {
   if (!event.valid) {
     std::fprintf(out, "    %-10s (none)\n", label);
     return;
   }
   std::string line = Format("    %-10s %s for %02d:%02d:%02d ", label, When(event.start).c_str(),
                             event.duration.hours, event.duration.minutes, event.duration.seconds);
-  line += event.name.empty() ? std::string("(no name)") : Quoted(event.name);
+  line += event.name.empty() ? std::string("(no name)") : Quoted(event.name, coding);
   for (const Rating& rating : event.ratings) {
     line += " rating " + EscapeBytes(rating.country) + Format(" age %d", rating.minimumAge);
     if (rating.content != 0) line += Format(" content 0x%x", rating.content);
@@ -99,17 +102,19 @@ const char* ControlCodeName(uint32_t code) {
 }
 
 void PrintSummaryText(const Summary& s, std::FILE* out) {
-  std::fprintf(out, "Standard: %s\n", s.standard.c_str());
+  std::fprintf(out, "Standard: %s (%s)\n", s.standard.c_str(), s.standardReason.c_str());
+  std::fprintf(out, "Time base: UTC%s (times are as broadcast, in local time)\n",
+               UtcOffsetText(s.utcOffsetMinutes).c_str());
   if (s.network.valid) {
     std::fprintf(out, "Network: %s (network_id 0x%04x)\n",
-                 s.network.name.empty() ? "(no name)" : Quoted(s.network.name).c_str(), s.network.id);
+                 s.network.name.empty() ? "(no name)" : Quoted(s.network.name, s.textCoding).c_str(), s.network.id);
   } else {
     std::fputs("Network: (no NIT)\n", out);
   }
   if (s.transportStreamId >= 0) std::fprintf(out, "Transport stream: 0x%04x\n", s.transportStreamId);
   for (const TransportStreamSummary& ts : s.network.streams) {
     std::string line = Format("  TS 0x%04x of network 0x%04x", ts.id, ts.originalNetworkId);
-    if (!ts.name.empty()) line += " " + Quoted(ts.name);
+    if (!ts.name.empty()) line += " " + Quoted(ts.name, s.textCoding);
     if (ts.remoteControlKey >= 0) line += Format(", remote control key %d", ts.remoteControlKey);
     std::fprintf(out, "%s\n", line.c_str());
     if (ts.areaCode >= 0) {
@@ -138,8 +143,8 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     std::string line = Format("  Service 0x%04x", service.id);
     if (service.type >= 0) line += Format(" %s (0x%02x)", ServiceTypeName(service.type), service.type);
     if (service.oneSegment) line += " one-segment";
-    if (!service.name.empty()) line += " " + Quoted(service.name);
-    if (!service.provider.empty()) line += " provider " + Quoted(service.provider);
+    if (!service.name.empty()) line += " " + Quoted(service.name, s.textCoding);
+    if (!service.provider.empty()) line += " provider " + Quoted(service.provider, s.textCoding);
     std::fprintf(out, "%s\n", line.c_str());
     if (service.pmtPid >= 0) {
       line = "    PMT " + Pid(service.pmtPid) + ", PCR " + Pid(service.pcrPid) + ", video " + Pid(service.videoPid) +
@@ -156,8 +161,8 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
       }
     }
     if (service.present.valid || service.following.valid) {
-      PrintEvent(out, "present:", service.present);
-      PrintEvent(out, "following:", service.following);
+      PrintEvent(out, "present:", service.present, s.textCoding);
+      PrintEvent(out, "following:", service.following, s.textCoding);
     }
   }
 
@@ -179,8 +184,8 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
                  "  PID %s type 0x%04x: organization 0x%08x application 0x%04x control %u (%s) name %s path %s "
                  "file %s\n",
                  Pid(app.pid).c_str(), app.applicationType, app.organizationId, app.applicationId, app.controlCode,
-                 ControlCodeName(app.controlCode), Quoted(app.name).c_str(), Quoted(app.path).c_str(),
-                 Quoted(app.file).c_str());
+                 ControlCodeName(app.controlCode), Quoted(app.name, TextCoding::kAsBroadcast).c_str(),
+                 Quoted(app.path, TextCoding::kAsBroadcast).c_str(), Quoted(app.file, TextCoding::kAsBroadcast).c_str());
   }
 
   std::size_t modules = 0;
@@ -190,7 +195,7 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     std::fprintf(out, "  PID %s download 0x%08x, block size %d\n", Pid(c.pid).c_str(), c.downloadId, c.blockSize);
     for (const ModuleSummary& m : c.modules) {
       std::string line = Format("    module 0x%04x version %d, %u bytes", m.id, m.version, m.size);
-      if (!m.name.empty()) line += " " + Quoted(m.name);
+      if (!m.name.empty()) line += " " + Quoted(m.name, TextCoding::kAsBroadcast);
       if (m.complete) {
         line += ", complete";
       } else {

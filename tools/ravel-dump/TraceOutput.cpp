@@ -31,7 +31,8 @@ TraceOutput::QuietScope::~QuietScope() { trace_.quiet_ = previous_; }
 void TraceOutput::OnTrace(unsigned int mask, const char* file, int line, const char* text, void* context) {
   TraceOutput* self = static_cast<TraceOutput*>(context);
   if (self->showOut_ != nullptr && (mask & kTraceLevels) == kTraceLevelDump) {
-    std::string escaped = EscapeTraceText(text);
+    std::string line = DecodeTextInTraceLine(text != nullptr ? text : "", self->textCoding_);
+    std::string escaped = EscapeTraceText(line.c_str());
     if (!escaped.empty()) {
       std::fputs(escaped.c_str(), self->showOut_);
       self->showEndedLine_ = escaped.back() == '\n';

@@ -7,6 +7,8 @@
 #include <cstdio>
 #include <string>
 
+#include "BroadcastText.h"
+
 namespace ravel_dump {
 
 struct Stats;
@@ -33,6 +35,9 @@ class TraceOutput {
     std::FILE* previous_;
   };
 
+  // The dump's broadcast texts (names, event texts) are shown in `coding`.
+  void SetTextCoding(TextCoding coding) { textCoding_ = coding; }
+
   // Whether the last dump text written ended its line (some dumps leave their
   // last line open).
   bool ShowEndedLine() const { return showEndedLine_; }
@@ -58,6 +63,7 @@ class TraceOutput {
   std::FILE* showOut_;
   bool showEndedLine_;
   bool quiet_;
+  TextCoding textCoding_ = TextCoding::kAsBroadcast;
 };
 
 }  // namespace ravel_dump

@@ -15,8 +15,10 @@
 #include "Ravel_ByteOrder.h"
 #include "Ravel_Cfg.h"
 #include "Report.h"
+#include "StandardDetection.h"
 #include "Stats.h"
 #include "StopSignal.h"
+#include "TimeBase.h"
 #include "TraceOutput.h"
 
 namespace {
@@ -172,12 +174,25 @@ int main(int argc, char** argv) {
     }
   }
 
+  // The standard decides how ratings and regions parse, how texts read and
+  // the time base: named on the command line, or told by the capture's tables.
+  StandardChoice choice = options.standard >= 0
+                              ? GivenStandard(options.standard)
+                              : DetectStandard(BuildSummary(capture.Registry(), capture.Carousel(), trace));
+  RavelCfg_SetStandard(choice.standard);
+  trace.SetTextCoding(TextCodingOf(choice.standard, options.rawText));
+
   // Everything is read: now the outputs, modules first so that a failure to
   // write them leaves no half output behind.
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
                      !options.extractDirectory.empty();
-  if (wantSummary) summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
+  if (wantSummary) {
+    summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
+    summary.standardReason = choice.reason;
+    summary.textCoding = TextCodingOf(choice.standard, options.rawText);
+    summary.utcOffsetMinutes = UtcOffsetMinutesOf(choice.standard);
+  }
   if (!options.extractDirectory.empty()) {
     if (!capture.Carousel().WriteModules(options.extractDirectory, summary.carousels, error)) return Fail(error);
   }
