@@ -35,11 +35,10 @@ class Capture : public SectionSink {
   CarouselCollector carousel_;
 };
 
-// The library's parse of a section when it first arrives, as a receiver uses
-// it: a PAT or a PMT names more section PIDs to `demux` (when there is one),
-// a DII or a DDB goes to the carousel collector. Gives the parse result.
-int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t size, Demux* demux,
-                   CarouselCollector& carousel);
+// What a receiver does with a section the library parsed when it first
+// arrives: a PAT or a PMT names more section PIDs to `demux` (when there is
+// one), a DII or a DDB goes to the carousel collector.
+void UseOnArrival(int pid, TableKind kind, RavelCSafeSection& parsed, Demux* demux, CarouselCollector& carousel);
 
 }  // namespace ravel_dump
 

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CSafeSection.h"
 #include "Ravel_CTSPktAssembler.h"
 
 namespace ravel_dump {
@@ -88,12 +89,22 @@ bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int c
   if (at >= 188) return false;
   at += 1u + packet[at];  // pointer_field
   if (at + 3 > 188) return false;
-  // A PES packet starts 00 00 01, so its "table_id" is 0 and never matches.
-  const uint8_t tableId = packet[at];
+  // A PES packet starts 00 00 01, so its "table_id" is 0 (a PAT) and never matches.
   const bool longForm = (packet[at + 1] & 0x80) != 0;
   PidRole role = PidRole::kNone;
-  if (tableId == 0x3B || tableId == 0x3C) role = PidRole::kCarousel;
-  if (tableId == 0x3D) role = PidRole::kStreamEvents;
+  switch (RavelCSafeSection::GetKind(packet + at, static_cast<int>(188 - at))) {
+    case kRavelKindDSI:
+    case kRavelKindDII:
+    case kRavelKindDDB:
+    case kRavelKindDsmccOther:
+      role = PidRole::kCarousel;
+      break;
+    case kRavelKindStreamEvents:
+      role = PidRole::kStreamEvents;
+      break;
+    default:
+      break;
+  }
   if (role == PidRole::kNone || !longForm) return false;
   AddSectionPid(pid, role);
   return true;
