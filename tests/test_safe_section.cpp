@@ -250,31 +250,33 @@ TEST(SafeSection, KnowsTheKindAndClassOfEveryTableAndWhichVerifyTheirCrc) {
     bool crc;
     bool crcWithoutSyntaxIndicator;
     bool joined;
+    bool otherStream;
   } cases[] = {
-      {/*tableId=*/0x00, /*kind=*/"PAT", /*known=*/true, /*crc=*/true, /*crcWithoutSyntaxIndicator=*/true, /*joined=*/false},
-      {0x01, "CAT", false, false, false, false},
-      {0x02, "PMT", true, true, true, true},
-      {0x3B, "DSM-CC other", true, false, false, false},
-      {0x3C, "DSM-CC other", true, false, false, false},
-      {0x3D, "stream descriptors", true, true, false, false},
-      {0x40, "NIT", true, true, true, true},
-      {0x41, "NIT", true, true, true, true},
-      {0x42, "SDT", true, true, true, true},
-      {0x43, "other", false, false, false, false},
-      {0x46, "SDT", true, true, true, true},
-      {0x4E, "EIT p/f", true, true, true, true},
-      {0x4F, "EIT p/f", true, true, true, true},
-      {0x50, "EIT schedule", true, true, true, true},
+      {/*tableId=*/0x00, /*kind=*/"PAT", /*known=*/true, /*crc=*/true, /*crcWithoutSyntaxIndicator=*/true,
+       /*joined=*/false, /*otherStream=*/false},
+      {0x01, "CAT", false, false, false, false, false},
+      {0x02, "PMT", true, true, true, true, false},
+      {0x3B, "DSM-CC other", true, false, false, false, false},
+      {0x3C, "DSM-CC other", true, false, false, false, false},
+      {0x3D, "stream descriptors", true, true, false, false, false},
+      {0x40, "NIT", true, true, true, true, false},
+      {0x41, "NIT", true, true, true, true, true},
+      {0x42, "SDT", true, true, true, true, false},
+      {0x43, "other", false, false, false, false, false},
+      {0x46, "SDT", true, true, true, true, true},
+      {0x4E, "EIT p/f", true, true, true, true, false},
+      {0x4F, "EIT p/f", true, true, true, true, true},
+      {0x50, "EIT schedule", true, true, true, true, false},
       // EIT schedule actual sections past the first four days: no class takes them.
-      {0x51, "EIT schedule", false, false, false, true},
-      {0x5F, "EIT schedule", false, false, false, true},
-      {0x60, "EIT schedule", true, true, true, true},
-      {0x6F, "EIT schedule", true, true, true, true},
-      {0x70, "TDT", true, false, false, false},
-      {0x73, "TOT", true, false, false, false},
-      {0x74, "AIT", true, true, true, false},
-      {0xC4, "BIT", true, true, true, true},
-      {0xFF, "other", false, false, false, false},
+      {0x51, "EIT schedule", false, false, false, true, false},
+      {0x5F, "EIT schedule", false, false, false, true, false},
+      {0x60, "EIT schedule", true, true, true, true, true},
+      {0x6F, "EIT schedule", true, true, true, true, true},
+      {0x70, "TDT", true, false, false, false, false},
+      {0x73, "TOT", true, false, false, false, false},
+      {0x74, "AIT", true, true, true, false, false},
+      {0xC4, "BIT", true, true, true, true, false},
+      {0xFF, "other", false, false, false, false, false},
   };
   for (const Case& c : cases) {
     const unsigned char header[3] = {c.tableId, 0xB0, 0x00};
@@ -283,6 +285,7 @@ TEST(SafeSection, KnowsTheKindAndClassOfEveryTableAndWhichVerifyTheirCrc) {
     EXPECT_EQ(c.crc, RavelCSafeSection::ChecksCrc(c.tableId, 1)) << int(c.tableId);
     EXPECT_EQ(c.crcWithoutSyntaxIndicator, RavelCSafeSection::ChecksCrc(c.tableId, 0)) << int(c.tableId);
     EXPECT_EQ(c.joined, RavelCSafeSection::JoinsSections(c.tableId)) << int(c.tableId);
+    EXPECT_EQ(c.otherStream, RavelCSafeSection::DescribesOtherStream(c.tableId)) << int(c.tableId);
   }
   EXPECT_STREQ("length mismatch", RavelCSafeSection::GetResultText(kRavelSafeLengthMismatch));
   EXPECT_STREQ("refused by the parser", RavelCSafeSection::GetResultText(kRavelSafeRefused));

@@ -182,6 +182,9 @@ class RavelCSafeSection {
   // Whether the sections of one table of this table_id make one table (joined
   // with the class's operator+=), rather than each standing alone.
   static bool JoinsSections(unsigned char tableId);
+  // Whether the table describes another transport stream than the one it
+  // arrives on (NIT, SDT and EIT "other").
+  static bool DescribesOtherStream(unsigned char tableId);
   // Whether the table's sections come in segments of eight (the EIT).
   static bool IsSegmented(unsigned char tableId);
   // Reads the header of a section of `count` bytes; false when it is too short

@@ -52,6 +52,7 @@ struct TableRow {
   JoinTableFunction pJoin;  // null: each section stands alone (or no class)
   bool bJoined;             // the sections of one table make one table
   int iStreamIdBytes;       // bytes after the long header that belong to the table's identity
+  bool bOtherStream;        // describes another transport stream than the one it arrives on
 };
 
 // Built over a null section, which traces nothing, then parsed once: the result
@@ -88,26 +89,28 @@ void JoinTable(RavelCTableBase& table, RavelCTableBase& other) {
 
 typedef RavelCSectionWalk W;
 
-// table_ids     kind                           class         class CRC                 walk             create / copy / join                                          joined  stream ids
+// table_ids     kind                           class         class CRC                 walk             create / copy / join                                          joined  stream ids  other stream
 const TableRow kTableRows[] = {
-    {0x00, 0x00, kRavelKindPAT,                 kHeldTable,   kCrcAlways,              0,               ParseNewTable<RavelCPAT>, CopyTable<RavelCPAT>, 0,                      false, 0},
-    {0x01, 0x01, kRavelKindCAT,                 kNoClass,     kCrcNever,               0,               0, 0, 0,                                                            false, 0},
-    {0x02, 0x02, kRavelKindPMT,                 kHeldTable,   kCrcAlways,              W::PMT,          ParseNewTable<RavelCPMT>, CopyPMT, JoinTable<RavelCPMT>,           true,  0},
-    {0x3B, 0x3C, kRavelKindDsmccOther,          kHeldMessage, kCrcNever,               W::Carousel,     0, 0, 0,                                                            false, 0},
-    {0x3D, 0x3D, kRavelKindStreamEvents,        kHeldTable,   kCrcWithSyntaxIndicator, W::StreamEvents, ParseNewTable<RavelCDsmccStreamEvent>, CopyTable<RavelCDsmccStreamEvent>, 0, false, 0},
-    {0x40, 0x41, kRavelKindNIT,                 kHeldTable,   kCrcAlways,              W::NIT,          ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>, JoinTable<RavelCNIT>, true,  0},
-    {0x42, 0x42, kRavelKindSDT,                 kHeldTable,   kCrcAlways,              W::SDT,          ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>, JoinTable<RavelCSDT>, true,  2},
-    {0x46, 0x46, kRavelKindSDT,                 kHeldTable,   kCrcAlways,              W::SDT,          ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>, JoinTable<RavelCSDT>, true,  2},
-    {0x4E, 0x4F, kRavelKindEITPresentFollowing, kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4},
-    {0x50, 0x50, kRavelKindEITSchedule,         kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4},
+    {0x00, 0x00, kRavelKindPAT,                 kHeldTable,   kCrcAlways,              0,               ParseNewTable<RavelCPAT>, CopyTable<RavelCPAT>, 0,                      false, 0, false},
+    {0x01, 0x01, kRavelKindCAT,                 kNoClass,     kCrcNever,               0,               0, 0, 0,                                                            false, 0, false},
+    {0x02, 0x02, kRavelKindPMT,                 kHeldTable,   kCrcAlways,              W::PMT,          ParseNewTable<RavelCPMT>, CopyPMT, JoinTable<RavelCPMT>,           true,  0, false},
+    {0x3B, 0x3C, kRavelKindDsmccOther,          kHeldMessage, kCrcNever,               W::Carousel,     0, 0, 0,                                                            false, 0, false},
+    {0x3D, 0x3D, kRavelKindStreamEvents,        kHeldTable,   kCrcWithSyntaxIndicator, W::StreamEvents, ParseNewTable<RavelCDsmccStreamEvent>, CopyTable<RavelCDsmccStreamEvent>, 0, false, 0, false},
+    {0x40, 0x40, kRavelKindNIT,                 kHeldTable,   kCrcAlways,              W::NIT,          ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>, JoinTable<RavelCNIT>, true,  0, false},
+    {0x41, 0x41, kRavelKindNIT,                 kHeldTable,   kCrcAlways,              W::NIT,          ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>, JoinTable<RavelCNIT>, true,  0, true},
+    {0x42, 0x42, kRavelKindSDT,                 kHeldTable,   kCrcAlways,              W::SDT,          ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>, JoinTable<RavelCSDT>, true,  2, false},
+    {0x46, 0x46, kRavelKindSDT,                 kHeldTable,   kCrcAlways,              W::SDT,          ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>, JoinTable<RavelCSDT>, true,  2, true},
+    {0x4E, 0x4E, kRavelKindEITPresentFollowing, kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, false},
+    {0x4F, 0x4F, kRavelKindEITPresentFollowing, kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, true},
+    {0x50, 0x50, kRavelKindEITSchedule,         kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, false},
     // EIT schedule actual sections past the first four days: the EIT class refuses them.
-    {0x51, 0x5F, kRavelKindEITSchedule,         kNoClass,     kCrcNever,               W::EIT,          0, 0, 0,                                                            true,  4},
-    {0x60, 0x6F, kRavelKindEITSchedule,         kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4},
+    {0x51, 0x5F, kRavelKindEITSchedule,         kNoClass,     kCrcNever,               W::EIT,          0, 0, 0,                                                            true,  4, false},
+    {0x60, 0x6F, kRavelKindEITSchedule,         kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, true},
     // The time tables keep their own short header and their classes check no CRC_32.
-    {0x70, 0x70, kRavelKindTDT,                 kHeldTDT,     kCrcNever,               W::TDT,          0, 0, 0,                                                            false, 0},
-    {0x73, 0x73, kRavelKindTOT,                 kHeldTOT,     kCrcNever,               W::TOT,          0, 0, 0,                                                            false, 0},
-    {0x74, 0x74, kRavelKindAIT,                 kHeldTable,   kCrcAlways,              W::AIT,          ParseNewAIT, CopyTable<RavelCAIT>, 0,                               false, 0},
-    {0xC4, 0xC4, kRavelKindBIT,                 kHeldTable,   kCrcAlways,              W::BIT,          ParseNewTable<RavelCBIT>, CopyTable<RavelCBIT>, JoinTable<RavelCBIT>, true,  0},
+    {0x70, 0x70, kRavelKindTDT,                 kHeldTDT,     kCrcNever,               W::TDT,          0, 0, 0,                                                            false, 0, false},
+    {0x73, 0x73, kRavelKindTOT,                 kHeldTOT,     kCrcNever,               W::TOT,          0, 0, 0,                                                            false, 0, false},
+    {0x74, 0x74, kRavelKindAIT,                 kHeldTable,   kCrcAlways,              W::AIT,          ParseNewAIT, CopyTable<RavelCAIT>, 0,                               false, 0, false},
+    {0xC4, 0xC4, kRavelKindBIT,                 kHeldTable,   kCrcAlways,              W::BIT,          ParseNewTable<RavelCBIT>, CopyTable<RavelCBIT>, JoinTable<RavelCBIT>, true,  0, false},
 };
 
 const int kTableRowCount = static_cast<int>(sizeof(kTableRows) / sizeof(kTableRows[0]));
@@ -474,6 +477,11 @@ bool RavelCSafeSection::IsSegmented(unsigned char tableId) {
   int row = FindTableRow(tableId);
   return row >= 0 && (kTableRows[row].eKind == kRavelKindEITPresentFollowing ||
                       kTableRows[row].eKind == kRavelKindEITSchedule);
+}
+
+bool RavelCSafeSection::DescribesOtherStream(unsigned char tableId) {
+  int row = FindTableRow(tableId);
+  return row >= 0 && kTableRows[row].bOtherStream;
 }
 
 bool RavelCSafeSection::ReadHeader(const unsigned char* section, int count, RavelSectionHeader& header) {

@@ -153,7 +153,7 @@ void AddPmts(const TableRegistry& registry, Summary& summary) {
 void AddSdt(const TableRegistry& registry, Summary& summary) {
   int tsId = summary.transportStreamId;
   const TableEntry* table = Latest(registry, kRavelKindSDT, [&](const TableEntry& t) {
-    return t.tableId == 0x42 && (tsId < 0 || t.extension == tsId);
+    return !RavelCSafeSection::DescribesOtherStream(t.tableId) && (tsId < 0 || t.extension == tsId);
   });
   if (table == nullptr) return;
   if (summary.transportStreamId < 0) summary.transportStreamId = table->extension;
@@ -172,7 +172,7 @@ void AddSdt(const TableRegistry& registry, Summary& summary) {
 
 // The NIT of this network: its name and transport streams.
 void AddNit(const TableRegistry& registry, Summary& summary) {
-  const TableEntry* table = Latest(registry, kRavelKindNIT, [](const TableEntry& t) { return t.tableId == 0x40; });
+  const TableEntry* table = Latest(registry, kRavelKindNIT, [](const TableEntry& t) { return !RavelCSafeSection::DescribesOtherStream(t.tableId); });
   if (table == nullptr) return;
   NetworkSummary& network = summary.network;
   network.id = table->extension;
@@ -240,7 +240,7 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
 void AddEvents(const TableRegistry& registry, Summary& summary) {
   for (ServiceSummary& service : summary.services) {
     const TableEntry* table = Latest(registry, kRavelKindEITPresentFollowing, [&](const TableEntry& t) {
-      return t.tableId == 0x4E && t.extension == service.id;
+      return !RavelCSafeSection::DescribesOtherStream(t.tableId) && t.extension == service.id;
     });
     if (table == nullptr) continue;
     for (const auto& kv : table->sections) {

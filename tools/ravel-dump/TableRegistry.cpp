@@ -4,6 +4,8 @@
 #include <cstring>
 #include <set>
 
+#include "Ravel_ByteOrder.h"
+
 namespace ravel_dump {
 
 uint64_t HashBytes(const uint8_t* data, std::size_t size) {
@@ -16,11 +18,6 @@ uint64_t HashBytes(const uint8_t* data, std::size_t size) {
 }
 
 namespace {
-
-uint32_t ReadCrcField(const uint8_t* section, std::size_t size) {
-  const uint8_t* crc = section + size - 4;
-  return (static_cast<uint32_t>(crc[0]) << 24) | (crc[1] << 16) | (crc[2] << 8) | crc[3];
-}
 
 // Section numbers a table announces. EIT sections are numbered by segments of
 // eight (ETSI EN 300 468 5.2.4): a segment runs from its first number to the
@@ -92,7 +89,7 @@ TableRegistry::Place TableRegistry::Locate(int pid, const uint8_t* section,
   // A section with a CRC_32 is told apart by its size and CRC, confirmed byte
   // for byte against the stored copy; a short section without one by a hash.
   place.identity = RavelCSafeSection::CarriesCrc(section) && size >= 4
-                       ? (static_cast<uint64_t>(size) << 32) | ReadCrcField(section, size)
+                       ? (static_cast<uint64_t>(size) << 32) | RavelRead32(section + size - 4)
                        : HashBytes(section, size);
   RavelSectionHeader header;
   RavelCSafeSection::ReadHeader(section, static_cast<int>(size), header);
