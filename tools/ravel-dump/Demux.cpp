@@ -90,9 +90,11 @@ bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int c
   at += 1u + packet[at];  // pointer_field
   if (at + 3 > 188) return false;
   // A PES packet starts 00 00 01, so its "table_id" is 0 (a PAT) and never matches.
-  const bool longForm = (packet[at + 1] & 0x80) != 0;
+  RavelSectionHeader header;
+  const int held = static_cast<int>(188 - at);
+  if (!RavelCSafeSection::ReadHeader(packet + at, held, header)) return false;
   PidRole role = PidRole::kNone;
-  switch (RavelCSafeSection::GetKind(packet + at, static_cast<int>(188 - at))) {
+  switch (RavelCSafeSection::GetKind(packet + at, held)) {
     case kRavelKindDSI:
     case kRavelKindDII:
     case kRavelKindDDB:
@@ -105,7 +107,7 @@ bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int c
     default:
       break;
   }
-  if (role == PidRole::kNone || !longForm) return false;
+  if (role == PidRole::kNone || !header.bLongForm) return false;
   AddSectionPid(pid, role);
   return true;
 }
