@@ -40,7 +40,7 @@ enum RavelSafeResult {
                               // or the 12-byte message header)
   kRavelSafeLengthMismatch,   // the bytes end before the declared section or message,
                               // or a message does not end before its section's CRC_32
-  kRavelSafeCrcError,         // the CRC_32 does not verify, on a table that verifies it
+  kRavelSafeCrcError,         // the CRC_32 of a section that carries one does not verify
   kRavelSafeOutsideMessage,   // a part of a DSM-CC message lies outside the message
   kRavelSafeUnknownTable,     // no class for this table_id or DSM-CC message id
   kRavelSafeRefused,          // the class's ParseRawData gave non-zero (see GetParseResult)
