@@ -1,6 +1,7 @@
 // What the tool makes of a capture while it is read: each section from the
-// demultiplexer (or from a file of raw sections) is checked, counted, kept
-// once in the table registry, and used at once where a receiver would use it:
+// demultiplexer (or from a file of raw sections) that is not a repeat is
+// checked and parsed once by the library's safe entry, counted, kept in the
+// table registry with its parsed object, and used at once where a receiver would use it:
 // a PAT or a PMT names more section PIDs, DII and DDB messages feed the
 // carousel collector.
 #ifndef RAVEL_DUMP_CAPTURE_H
