@@ -167,11 +167,28 @@ const char* const kKindNames[kRavelKindCount] = {
     "DSI", "DII", "DDB", "DSM-CC other", "stream descriptors", "other",
 };
 
-int FindTableRow(unsigned char tableId) {
-  for (int i = 0; i < kTableRowCount; ++i) {
-    if (tableId >= kTableRows[i].iFirstTableId && tableId <= kTableRows[i].iLastTableId) return i;
+// The row of every table_id (-1 for none), made once from the rows: every
+// section a receiver reads asks it several times.
+struct TableRowIndex {
+  signed char aRow[256];
+  TableRowIndex() {
+    for (int tableId = 0; tableId < 256; ++tableId) aRow[tableId] = -1;
+    for (int i = 0; i < kTableRowCount; ++i) {
+      for (int tableId = kTableRows[i].iFirstTableId; tableId <= kTableRows[i].iLastTableId; ++tableId) {
+        aRow[tableId] = static_cast<signed char>(i);
+      }
+    }
   }
-  return -1;
+};
+
+int FindTableRow(unsigned char tableId) {
+  static const TableRowIndex index;
+  return index.aRow[tableId];
+}
+
+// The EIT's sections come in segments of eight (ETSI EN 300 468 5.2.4).
+bool IsSegmentedRow(int row) {
+  return kTableRows[row].eKind == kRavelKindEITPresentFollowing || kTableRows[row].eKind == kRavelKindEITSchedule;
 }
 
 int FindMessageRow(unsigned short messageId) {
@@ -475,8 +492,7 @@ bool RavelCSafeSection::JoinsSections(unsigned char tableId) {
 
 bool RavelCSafeSection::IsSegmented(unsigned char tableId) {
   int row = FindTableRow(tableId);
-  return row >= 0 && (kTableRows[row].eKind == kRavelKindEITPresentFollowing ||
-                      kTableRows[row].eKind == kRavelKindEITSchedule);
+  return row >= 0 && IsSegmentedRow(row);
 }
 
 bool RavelCSafeSection::DescribesOtherStream(unsigned char tableId) {
@@ -502,7 +518,7 @@ bool RavelCSafeSection::ReadHeader(const unsigned char* section, int count, Rave
     for (int i = 0; i < streamIdBytes; ++i) header.iStreamIds = (header.iStreamIds << 8) | section[kLongHeaderSize + i];
   }
   // The EIT's segment_last_section_number follows its stream ids.
-  if (IsSegmented(section[0]) && count > kLongHeaderSize + streamIdBytes) {
+  if (row >= 0 && IsSegmentedRow(row) && count > kLongHeaderSize + streamIdBytes) {
     header.iSegmentLastSectionNumber = section[kLongHeaderSize + streamIdBytes];
   }
   return true;

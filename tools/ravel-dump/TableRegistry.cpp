@@ -47,6 +47,19 @@ std::set<unsigned int> Announced(const TableEntry& table) {
 
 }  // namespace
 
+std::size_t TableRegistry::KeyHash::operator()(const Key& key) const {
+  const uint64_t fields[] = {static_cast<uint64_t>(std::get<0>(key)), static_cast<uint64_t>(std::get<1>(key)),
+                             static_cast<uint64_t>(std::get<2>(key)), static_cast<uint64_t>(std::get<3>(key)),
+                             std::get<4>(key),                        static_cast<uint64_t>(std::get<5>(key)),
+                             std::get<6>(key)};
+  uint64_t hash = 0;
+  for (uint64_t field : fields) {
+    hash = (hash ^ field) * 0x9E3779B97F4A7C15ull;  // multiply and fold: a word at a time
+    hash ^= hash >> 29;
+  }
+  return static_cast<std::size_t>(hash);
+}
+
 bool TableEntry::Complete() const { return Missing().empty(); }
 
 std::vector<unsigned int> TableEntry::Missing() const {

@@ -13,6 +13,7 @@
 #include <map>
 #include <memory>
 #include <tuple>
+#include <unordered_map>
 #include <vector>
 
 #include "Ravel_CSafeSection.h"
@@ -87,7 +88,11 @@ class TableRegistry {
   TableEntry* NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header);
 
   std::vector<std::unique_ptr<TableEntry>> tables_;
-  std::map<Key, std::size_t> latest_;
+  // Looked up for every section that arrives, repeats included.
+  struct KeyHash {
+    std::size_t operator()(const Key& key) const;
+  };
+  std::unordered_map<Key, std::size_t, KeyHash> latest_;
   uint64_t arrivals_ = 0;
 };
 
