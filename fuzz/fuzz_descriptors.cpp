@@ -1,6 +1,6 @@
 // Descriptors: the factory and copier offered to the caller, and every
-// descriptor class on its own, over a descriptor followed by the zeroed padding a
-// section copy of the safe entry layer gives. The first byte chooses the class
+// descriptor class on its own, over a descriptor followed by zeroes, as a
+// descriptor that ends a section reads beyond it. The first byte chooses the class
 // (0: the factory, 1: every class that takes the descriptor's tag, then one
 // class each) and, with its top bit, the Japanese rules of the broadcast
 // standard setting. Parsed descriptors are copied, assigned and dumped.
@@ -10,7 +10,6 @@
 #include <vector>
 
 #include "FuzzSupport.h"
-#include "Ravel_CSafeSection.h"
 #include "Ravel_Cfg.h"
 #include "Ravel_CDescriptors.h"
 #include "Ravel_CDescriptorApplication.h"
@@ -129,6 +128,9 @@ void UseFactory(unsigned char* raw) {
   delete descriptor;
 }
 
+// Zeroes after the descriptor: more than any length or offset a descriptor holds can reach.
+const int kZeroes = 65536;
+
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
@@ -136,7 +138,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (size < 1) return 0;
   RavelCfg_SetStandard((data[0] & 0x80) ? 1 : 0);
   // tag 8 | length 8 | at most 255 bytes, then zeroes.
-  std::vector<unsigned char> raw(2 + 255 + RavelCSafeSection::kPadding, 0);
+  std::vector<unsigned char> raw(2 + 255 + kZeroes, 0);
   std::memcpy(raw.data(), data + 1, size - 1 < 257 ? size - 1 : 257);
   unsigned int choice = (data[0] & 0x7F) % (kClassCount + 2);
   if (choice == 0) {

@@ -33,6 +33,7 @@
 #include <nlohmann/json.hpp>
 
 #include "Captures.h"
+#include "Ravel_CSafeSection.h"
 #include "StreamBuilder.h"
 
 #ifdef RAVEL_DUMP_PATH
@@ -1302,5 +1303,62 @@ TEST_F(RavelDumpTest, StopSignalEndsPipesAndFifosAsTheirEnd) {
 #endif  // RAVEL_DUMP_EMULATOR
 
 }  // namespace
+
+
+// --- One table of tables -----------------------------------------------------
+
+TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
+  // One section per table_id, each with a good CRC; the library's answer for
+  // each decides what the tool must show. Two bodies: the short one passes the
+  // walk of the EIT layout, the long one those of the PMT, NIT, SDT and BIT.
+  // 0xFF is the stuffing byte between sections, never a table.
+  std::string shown;
+  for (size_t bodySize : {6u, 16u}) {
+    Bytes file;
+    std::vector<Bytes> sections;
+    for (int tableId = 0x00; tableId < 0xFF; ++tableId) {
+      sb::SectionOptions o;
+      o.tableId = static_cast<uint8_t>(tableId);
+      o.tableIdExtension = static_cast<uint16_t>(tableId);
+      sections.push_back(sb::LongSection(o, Bytes(bodySize, 0x00)));
+      sb::Append(file, sections.back());
+    }
+    ToolRun run = Run({"-q", "--sections", Write("all.sections", file)});
+    ASSERT_EQ(0, run.status) << run.err;
+    shown += run.out;
+    for (const Bytes& section : sections) {
+      char where[32];
+      std::snprintf(where, sizeof where, ": table_id 0x%02x,", section[0]);
+      size_t at = run.out.find(where);
+      RavelCSafeSection safe;
+      RavelSafeResult result = safe.Parse(section.data(), static_cast<int>(section.size()));
+      if (result != kRavelSafeOk && result != kRavelSafeRefused && result != kRavelSafeUnknownTable) {
+        EXPECT_EQ(std::string::npos, at) << where << " refused by the library but shown";
+        continue;
+      }
+      ASSERT_NE(std::string::npos, at) << where << " accepted by the library but not shown";
+      std::string line = run.out.substr(run.out.rfind('\n', at) + 1);
+      line = line.substr(0, line.find('\n'));
+      RavelTableKind kind = RavelCSafeSection::GetKind(section.data(), static_cast<int>(section.size()));
+      EXPECT_EQ(0u, line.find("== " + std::string(RavelCSafeSection::GetKindName(kind)) + where)) << line;
+      EXPECT_EQ(result == kRavelSafeUnknownTable,
+                line.find("(no class in the library for this table_id)") != std::string::npos)
+          << line;
+      EXPECT_EQ(result == kRavelSafeRefused, line.find("refused by the library") != std::string::npos) << line;
+    }
+  }
+  // What users see of the tables the library has no class for.
+  struct Case {
+    const char* line;
+  } cases[] = {
+      {/*line=*/"== EIT schedule: table_id 0x51, id 0x0051, version 0, 1 sections up to number 0, seen 1 time "
+                "(no class in the library for this table_id)\n"},
+      {"== CAT: table_id 0x01, id 0x0001, version 0, section 0 of 1, seen 1 time "
+       "(no class in the library for this table_id)\n"},
+      {"== other: table_id 0x80, id 0x0080, version 0, section 0 of 1, seen 1 time "
+       "(no class in the library for this table_id)\n"},
+  };
+  for (const Case& c : cases) EXPECT_NE(std::string::npos, shown.find(c.line)) << c.line;
+}
 
 #endif  // RAVEL_DUMP_PATH

@@ -1,6 +1,6 @@
-// Safe entry layer: checks of the count, the declared length and the CRC before
-// any parse, the zeroed padding after the copy, and parsing by table_id or into
-// the caller's object with the traces of a direct parse.
+// Safe entry layer: checks of the count, the declared length, the CRC and the
+// structure walk before any parse, the table of tables, and parsing by table_id
+// or into the caller's object with the traces of a direct parse.
 #include <gtest/gtest.h>
 
 #include <map>
@@ -242,26 +242,50 @@ TEST(SafeSection, GivesTheMatchingResultForEachDamage) {
   EXPECT_EQ(kRavelSafeCrcError, safe.Load(badCrc.data(), static_cast<int>(badCrc.size())));
 }
 
-TEST(SafeSection, KnowsWhichTablesItMakesAndWhichVerifyTheirCrc) {
+TEST(SafeSection, KnowsTheKindAndClassOfEveryTableAndWhichVerifyTheirCrc) {
   struct Case {
     unsigned char tableId;
-    bool known;
+    const char* kind;
+    bool known;  // a class parses it
     bool crc;
     bool crcWithoutSyntaxIndicator;
+    bool joined;
+    bool otherStream;
   } cases[] = {
-      {0x00, true, true, true},   {0x01, false, false, false}, {0x02, true, true, true},
-      {0x3B, true, false, false}, {0x3C, true, false, false},  {0x3D, true, true, false},
-      {0x40, true, true, true},   {0x41, true, true, true},    {0x42, true, true, true},
-      {0x43, false, false, false}, {0x46, true, true, true},   {0x4E, true, true, true},
-      {0x4F, true, true, true},   {0x50, true, true, true},    {0x51, false, false, false},
-      {0x5F, false, false, false}, {0x60, true, true, true},   {0x6F, true, true, true},
-      {0x70, true, false, false}, {0x73, true, false, false},  {0x74, true, true, true},
-      {0xC4, true, true, true},   {0xFF, false, false, false},
+      {/*tableId=*/0x00, /*kind=*/"PAT", /*known=*/true, /*crc=*/true, /*crcWithoutSyntaxIndicator=*/true,
+       /*joined=*/false, /*otherStream=*/false},
+      {0x01, "CAT", false, false, false, false, false},
+      {0x02, "PMT", true, true, true, true, false},
+      {0x3B, "DSM-CC other", true, false, false, false, false},
+      {0x3C, "DSM-CC other", true, false, false, false, false},
+      {0x3D, "stream descriptors", true, true, false, false, false},
+      {0x40, "NIT", true, true, true, true, false},
+      {0x41, "NIT", true, true, true, true, true},
+      {0x42, "SDT", true, true, true, true, false},
+      {0x43, "other", false, false, false, false, false},
+      {0x46, "SDT", true, true, true, true, true},
+      {0x4E, "EIT p/f", true, true, true, true, false},
+      {0x4F, "EIT p/f", true, true, true, true, true},
+      {0x50, "EIT schedule", true, true, true, true, false},
+      // EIT schedule actual sections past the first four days: no class takes them.
+      {0x51, "EIT schedule", false, false, false, true, false},
+      {0x5F, "EIT schedule", false, false, false, true, false},
+      {0x60, "EIT schedule", true, true, true, true, true},
+      {0x6F, "EIT schedule", true, true, true, true, true},
+      {0x70, "TDT", true, false, false, false, false},
+      {0x73, "TOT", true, false, false, false, false},
+      {0x74, "AIT", true, true, true, false, false},
+      {0xC4, "BIT", true, true, true, true, false},
+      {0xFF, "other", false, false, false, false, false},
   };
   for (const Case& c : cases) {
+    const unsigned char header[3] = {c.tableId, 0xB0, 0x00};
+    EXPECT_STREQ(c.kind, RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(header, 3))) << int(c.tableId);
     EXPECT_EQ(c.known, RavelCSafeSection::IsKnownTable(c.tableId)) << int(c.tableId);
     EXPECT_EQ(c.crc, RavelCSafeSection::ChecksCrc(c.tableId, 1)) << int(c.tableId);
     EXPECT_EQ(c.crcWithoutSyntaxIndicator, RavelCSafeSection::ChecksCrc(c.tableId, 0)) << int(c.tableId);
+    EXPECT_EQ(c.joined, RavelCSafeSection::JoinsSections(c.tableId)) << int(c.tableId);
+    EXPECT_EQ(c.otherStream, RavelCSafeSection::DescribesOtherStream(c.tableId)) << int(c.tableId);
   }
   EXPECT_STREQ("length mismatch", RavelCSafeSection::GetResultText(kRavelSafeLengthMismatch));
   EXPECT_STREQ("refused by the parser", RavelCSafeSection::GetResultText(kRavelSafeRefused));
@@ -468,27 +492,66 @@ TEST(SafeSection, ARefusalByTheTablesOwnParseLeavesNoTable) {
   EXPECT_EQ(12, taken->iHour);
 }
 
-TEST(SafeSection, InnerLengthsPastTheSectionReadOnlyTheZeroedPadding) {
-  // An application loop that declares the largest 12-bit length in a short
-  // section with a good CRC: the AIT walks it, and its records, in the padding.
-  Bytes section = AitSection(sb::Cat({sb::Length12(0x0FFF), sb::Length12(0x0FFF)}));
-  std::unique_ptr<unsigned char[]> bytes = Exactly(section, section.size());
+TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
+  sb::SectionOptions pmt;
+  pmt.tableId = 0x02;
+  sb::SectionOptions eitSchedule;
+  eitSchedule.tableId = 0x51;
+  struct Case {
+    const char* label;
+    Bytes section;
+    RavelSafeResult result;
+    const char* check;
+    int offset;
+  } cases[] = {
+      {/*label=*/"AIT whose loops claim the largest 12-bit length",
+       /*section=*/AitSection(sb::Cat({sb::Length12(0x0FFF), sb::Length12(0x0FFF)})),
+       /*result=*/kRavelSafeMalformed, /*check=*/"common descriptors run past the section", /*offset=*/8},
+      {"AIT application loop past the section", AitSection(sb::Cat({sb::Length12(0), sb::Length12(90)})),
+       kRavelSafeMalformed, "application loop runs past the section", 10},
+      {"PMT stream descriptor loop past the streams",
+       sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
+                                     sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
+       kRavelSafeMalformed, "loop entry runs past its loop's end", 12},
+      {"EIT schedule without a class is still walked",
+       sb::LongSection(eitSchedule, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51), sb::U16(1),
+                                             sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
+                                             sb::U16(0x8000 | 60)})),
+       kRavelSafeMalformed, "loop entry runs past its loop's end", 14},
+      {"EIT schedule without a class, well formed",
+       sb::LongSection(eitSchedule, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51)})),
+       kRavelSafeUnknownTable, "no class for this table_id", 0},
+  };
+  for (const Case& c : cases) {
+    std::unique_ptr<unsigned char[]> bytes = Exactly(c.section, c.section.size());
+    RavelCSafeSection safe;
+    TraceRecorder recorder;
+    EXPECT_EQ(c.result, safe.Parse(bytes.get(), static_cast<int>(c.section.size()))) << c.label;
+    EXPECT_EQ(nullptr, safe.GetTable()) << c.label;
+    EXPECT_EQ(c.result, safe.GetRefusal().eResult) << c.label;
+    EXPECT_STREQ(c.check, safe.GetRefusal().pCheck) << c.label;
+    EXPECT_EQ(c.offset, safe.GetRefusal().iOffset) << c.label;
+    EXPECT_TRUE(recorder.Records().empty()) << c.label;
+  }
+}
+
+TEST(SafeSection, KeepsOneBufferOfTheSectionsSizeAndHandsTheTableOver) {
+  Bytes ait = GoodAit();
+  Bytes pat = Pat({{1, 0x101}});
   RavelCSafeSection safe;
   TraceRecorder recorder;
-  ASSERT_EQ(kRavelSafeOk, safe.Parse(bytes.get(), static_cast<int>(section.size())));
-  for (int i = 0; i < RavelCSafeSection::kPadding; ++i) {
-    ASSERT_EQ(0, safe.GetData()[safe.GetDataSize() + i]) << i;
-  }
-  RavelCAIT* ait = static_cast<RavelCAIT*>(safe.GetTable());
-  // Each zeroed application is 9 bytes with an empty descriptor loop.
-  EXPECT_EQ((0x0FFF + 8) / 9, ait->GetApplicationList()->iCount);
-  EXPECT_EQ(3, (*ait->GetApplicationList())[0].iDocumentResolution);
-
+  ASSERT_EQ(kRavelSafeOk, safe.Parse(ait.data(), static_cast<int>(ait.size())));
+  unsigned char* buffer = safe.GetData();
   // The table can be taken over and outlives the safe object's next section.
   std::unique_ptr<RavelCTableBase> taken(safe.TakeTable());
   EXPECT_EQ(nullptr, safe.GetTable());
-  EXPECT_EQ(kRavelSafeTooShort, safe.Parse(bytes.get(), 1));
+  ASSERT_EQ(kRavelSafeOk, safe.Parse(pat.data(), static_cast<int>(pat.size())));
+  // A smaller section goes to the same buffer, the rest of the last one zeroed.
+  EXPECT_EQ(buffer, safe.GetData());
+  EXPECT_EQ(static_cast<int>(pat.size()), safe.GetDataSize());
+  for (size_t i = pat.size(); i < ait.size(); ++i) ASSERT_EQ(0, buffer[i]) << i;
   EXPECT_EQ(0x74, taken->iTableId);
+  EXPECT_EQ(1, static_cast<RavelCAIT*>(taken.get())->GetApplicationList()->iCount);
 }
 
 TEST(SafeSection, TakesEveryAitSectionOfTheRealCaptureFromTheAssembler) {

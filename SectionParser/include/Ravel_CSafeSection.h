@@ -1,5 +1,9 @@
 // Safe entry for section and DSM-CC message bytes received from the air
-// (ISO/IEC 13818-1 2.4.4, ISO/IEC 13818-6 7.2 and 7.3).
+// (ISO/IEC 13818-1 2.4.4, ISO/IEC 13818-6 7.2 and 7.3), and the library's one
+// table of tables: for every table_id (and DSM-CC message id) the kind of table,
+// the class that parses it (if any), whether that class verifies the CRC_32, the
+// structure walk of its loops and descriptors, and how its objects are made,
+// copied and joined (operator+=).
 //
 // The parse operations take no buffer length: they trust section_length,
 // messageLength and every length inside, as the receiver applications built on
@@ -9,16 +13,15 @@
 //   - the count must hold the section the bytes declare, 3 + section_length
 //     (table_id 8 | flags 4 | section_length 12 | section_length bytes), or the
 //     message, 12 + messageLength;
-//   - the CRC_32 must verify where the table's own parse verifies it;
-//   - a DSM-CC message must end before the section's CRC_32, and its parts must
-//     lie inside it: the DSI's server id and private data, the DII's download
-//     parameters, compatibility descriptor, every module record and the private
-//     data, the DDB's block header;
-//   - the declared section or message is copied into a buffer of its own followed
-//     by kPadding zeroed bytes and parsed there, so that every read a parse
-//     operation makes stays inside memory this object owns.
-// Bytes that fail a check get their result and are not parsed. The class traces
-// nothing itself: the trace output is what the parse operations produce.
+//   - the CRC_32 must verify on every section that carries one (section_syntax_indicator
+//     set, and the TOT), whether or not the class's own parse verifies it;
+//   - the structure walk of the table_id's layout: each loop, loop entry and
+//     descriptor ends inside its parent; a DSM-CC message ends before its
+//     section's CRC_32 and the parts its class reads lie inside it.
+// Bytes that fail a check get their result and a refusal (which check, at which
+// byte) and are not parsed. Accepted bytes are copied into a buffer of this object
+// of the declared size and parsed there. The class traces nothing itself: the
+// trace output is what the parse operations produce.
 #ifndef RAVEL_CSAFESECTION_H
 #define RAVEL_CSAFESECTION_H
 
@@ -37,33 +40,70 @@ enum RavelSafeResult {
                               // or the 12-byte message header)
   kRavelSafeLengthMismatch,   // the bytes end before the declared section or message,
                               // or a message does not end before its section's CRC_32
-  kRavelSafeCrcError,         // the CRC_32 does not verify, on a table that verifies it
+  kRavelSafeCrcError,         // the CRC_32 of a section that carries one does not verify
   kRavelSafeOutsideMessage,   // a part of a DSM-CC message lies outside the message
   kRavelSafeUnknownTable,     // no class for this table_id or DSM-CC message id
-  kRavelSafeRefused           // the class's ParseRawData gave non-zero (see GetParseResult)
+  kRavelSafeRefused,          // the class's ParseRawData gave non-zero (see GetParseResult)
+  kRavelSafeMalformed         // a loop, loop entry or descriptor runs past its parent
+};
+
+// Why bytes were refused: the result, the check that failed (a short English
+// text, null when none failed) and the byte offset from the start of the bytes
+// handed in of the field it failed on (-1 when none).
+struct RavelSafeRefusal {
+  RavelSafeResult eResult;
+  const char* pCheck;
+  int iOffset;
+};
+
+// The kinds of table the table of tables tells apart.
+enum RavelTableKind {
+  kRavelKindPAT,
+  kRavelKindCAT,
+  kRavelKindPMT,
+  kRavelKindNIT,
+  kRavelKindSDT,
+  kRavelKindEITPresentFollowing,
+  kRavelKindEITSchedule,
+  kRavelKindTDT,
+  kRavelKindTOT,
+  kRavelKindBIT,
+  kRavelKindAIT,
+  kRavelKindDSI,
+  kRavelKindDII,
+  kRavelKindDDB,
+  kRavelKindDsmccOther,     // a carousel section whose message has no class
+  kRavelKindStreamEvents,   // DSM-CC stream descriptor sections (0x3D)
+  kRavelKindOther,          // a table_id the table of tables does not list
+  kRavelKindCount
+};
+
+// The header fields that tell tables and their sections apart. The fields after
+// bLongForm are zero for a short section.
+struct RavelSectionHeader {
+  unsigned char iTableId;
+  bool bLongForm;  // section_syntax_indicator
+  unsigned short iTableIdExtension;
+  unsigned char iVersionNumber;
+  unsigned char iSectionNumber;
+  unsigned char iLastSectionNumber;
+  // What else tells apart tables of one table_id and extension: the EIT's
+  // transport_stream_id and original_network_id, the SDT's original_network_id.
+  unsigned int iStreamIds;
+  // The EIT's segment_last_section_number; the section_number for other tables.
+  unsigned char iSegmentLastSectionNumber;
 };
 
 class RavelCSafeSection {
  public:
-  // Zeroed bytes after the copied section or message. Every position a parse
-  // operation computes is the start plus fixed offsets and lengths read from the
-  // data. A length read beyond the declared end reads zero, so only lengths
-  // inside the data can move a read past it: for a section (at most 3 + 4095
-  // bytes) by one 12-bit length (4095) plus a record header and a nested
-  // descriptor (2 + 255) with the fixed fields of its body, and loops that walk
-  // on in the zeroed bytes are bounded by such a length too. The BIT's
-  // broadcaster loop length is taken modulo 65536; 64 KiB also covers any 16-bit
-  // offset from inside the data. The 16-bit lengths and counts of the DSM-CC
-  // messages are checked against the message before a parse.
-  static const int kPadding = 65536;
   // The largest section a 12-bit section_length can declare.
   static const int kMaxSectionSize = 3 + 0x0FFF;
 
   RavelCSafeSection();
   ~RavelCSafeSection();
 
-  // Checks a section and keeps its padded copy (GetData); parses nothing. Bytes
-  // after the declared section are ignored.
+  // Checks a section (length, CRC_32, structure walk) and keeps its copy
+  // (GetData); parses nothing. Bytes after the declared section are ignored.
   RavelSafeResult Load(const unsigned char* bytes, int count);
   // Checks a section and parses it with the class that its table_id selects; in
   // a DSM-CC carousel section (0x3B, 0x3C) the message that follows the 8-byte
@@ -71,8 +111,7 @@ class RavelCSafeSection {
   // is held until the next call (GetTable or GetMessage, Take...). Nothing is
   // held after a refusal.
   RavelSafeResult Parse(const unsigned char* bytes, int count);
-  // Checks a section, then the caller's table parses the copy. The CRC is checked
-  // first when the class that the table_id selects verifies it.
+  // Checks a section, then the caller's table parses the copy.
   RavelSafeResult ParseInto(const unsigned char* bytes, int count, RavelCTableBase& table);
   RavelSafeResult ParseInto(const unsigned char* bytes, int count, RavelCTDT& table);
   RavelSafeResult ParseInto(const unsigned char* bytes, int count, RavelCTOT& table);
@@ -111,18 +150,51 @@ class RavelCSafeSection {
   // Releases the held object.
   void Clear();
 
-  // The padded copy of the last section or message that passed the length checks
-  // (null when none), valid until the next call or the destruction of this
-  // object, and its declared size.
-  unsigned char* GetData() const { return pBuffer; }
+  // The copy of the last section or message that passed the length checks (null
+  // when none), valid until the next call or the destruction of this object, and
+  // its declared size. The buffer is kept from call to call and grows only for a
+  // larger section; the bytes after the declared size read zero.
+  unsigned char* GetData() const { return iDataSize > 0 ? pBuffer : 0; }
   int GetDataSize() const { return iDataSize; }
+
+  // Why the last call refused its bytes (eResult kRavelSafeOk when it did not).
+  const RavelSafeRefusal& GetRefusal() const { return cRefusal; }
 
   // A short English name of a result, for tools and logs.
   static const char* GetResultText(RavelSafeResult result);
-  // Whether a class exists for this table_id, and whether that class verifies
-  // the CRC_32 of a section with this table_id and section_syntax_indicator.
+
+  // The table of tables.
+  // The kind of the section of `count` bytes at `section`: by table_id, and for
+  // a carousel section by the message id of its DSM-CC message.
+  static RavelTableKind GetKind(const unsigned char* section, int count);
+  // "PAT", "EIT p/f", "EIT schedule", "DII", "stream descriptors", "other" ...
+  static const char* GetKindName(RavelTableKind kind);
+  // Whether a class exists for this table_id. The EIT schedule actual sections
+  // 0x51 to 0x5F have none (the EIT class refuses them): they are walked and
+  // refused with kRavelSafeUnknownTable.
   static bool IsKnownTable(unsigned char tableId);
+  // Whether the class verifies the CRC_32 of a section with this table_id and
+  // section_syntax_indicator in its own parse.
   static bool ChecksCrc(unsigned char tableId, unsigned char sectionSyntaxIndicator);
+  // Whether the section ends with a CRC_32 (checked by Load and Parse): every
+  // section with section_syntax_indicator 1, and the TOT.
+  static bool CarriesCrc(const unsigned char* section);
+  // Whether the sections of one table of this table_id make one table (joined
+  // with the class's operator+=), rather than each standing alone.
+  static bool JoinsSections(unsigned char tableId);
+  // Whether the table describes another transport stream than the one it
+  // arrives on (NIT, SDT and EIT "other").
+  static bool DescribesOtherStream(unsigned char tableId);
+  // Whether the table's sections come in segments of eight (the EIT).
+  static bool IsSegmented(unsigned char tableId);
+  // Reads the header of a section of `count` bytes; false when it is too short
+  // for its header (3 bytes, 8 for a long section).
+  static bool ReadHeader(const unsigned char* section, int count, RavelSectionHeader& header);
+  // table += other with the class's operator+=; false (nothing joined) when the
+  // table_ids have no join or not the same class.
+  static bool Join(RavelCTableBase& table, RavelCTableBase& other);
+  // A deep copy through the class's copy operation, owned by the caller.
+  static RavelCTableBase* Copy(RavelCTableBase& table);
   // The checks of a DSM-CC message of `count` bytes, by its message id:
   // kRavelSafeOk, or the result of the first check that fails.
   static RavelSafeResult CheckMessage(const unsigned char* message, int count);
@@ -132,17 +204,21 @@ class RavelCSafeSection {
   RavelCSafeSection& operator=(const RavelCSafeSection&);
 
   void Reset();
-  void CopyPadded(const unsigned char* bytes, int size);
-  RavelSafeResult ParseMessageAt(unsigned char* message, int count);
+  RavelSafeResult Refuse(RavelSafeResult result, const char* check, int offset);
+  void Keep(const unsigned char* bytes, int size);
+  RavelSafeResult ParseMessageAt(unsigned char* message);
   RavelSafeResult ParseMessageInto(const unsigned char* bytes, int count, unsigned short messageId,
                                    RavelCDsmccBase& message);
+  RavelSafeResult ParseHeld(int row);
   template <class T>
   RavelSafeResult ParseTimeTable(T*& held);
   template <class T>
   RavelSafeResult ParseCallers(const unsigned char* bytes, int count, T& table);
 
-  unsigned char* pBuffer;  // iDataSize bytes, then kPadding zeroed bytes
+  unsigned char* pBuffer;  // iCapacity bytes, the first iDataSize the checked bytes
+  int iCapacity;
   int iDataSize;
+  RavelSafeRefusal cRefusal;
   int iParseResult;
   RavelCTableBase* pTable;
   RavelCTDT* pTDT;

@@ -51,4 +51,7 @@ class RavelCPAT : public RavelCTableBase {
   void InsertInProgramOrder(RavelCPMTInfo* program);
 };
 
+// Whether `pid` is a one-segment PMT PID (0x1FC8..0x1FCF).
+bool RavelPAT_IsOneSegPMTPID(unsigned short pid);
+
 #endif

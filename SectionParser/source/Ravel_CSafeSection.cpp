@@ -6,6 +6,8 @@
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CDsmccDSI.h"
+#include "Ravel_CReadWindow.h"
+#include "Ravel_CSectionWalk.h"
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTableBIT.h"
 #include "Ravel_CTableBase.h"
@@ -22,25 +24,36 @@
 
 namespace {
 
-// Whether the table's own parse verifies the CRC_32.
+// Whether the class's own parse verifies the CRC_32.
 enum CrcRule {
   kCrcNever,
   kCrcAlways,
   kCrcWithSyntaxIndicator  // only sections with section_syntax_indicator 1
 };
 
+// Which object a class's parse makes: a table, one of the time tables (each with
+// a header of its own), or the DSM-CC message of a carousel section.
+enum Holder { kNoClass, kHeldTable, kHeldTDT, kHeldTOT, kHeldMessage };
+
 typedef RavelCTableBase* (*CreateTableFunction)(unsigned char* section, int& result);
 typedef RavelCTableBase* (*CopyTableFunction)(RavelCTableBase& table);
+typedef void (*JoinTableFunction)(RavelCTableBase& table, RavelCTableBase& other);
 
-// One row per table class: the table_ids it accepts, its CRC rule, how to make
-// one from a section and how to copy one. The same rows answer Parse, CopyTable
-// and the static questions, so they cannot disagree.
+// One row per run of table_ids. The same rows answer Parse, Copy, Join and the
+// static questions, so they cannot disagree.
 struct TableRow {
   unsigned char iFirstTableId;
   unsigned char iLastTableId;
-  CrcRule eCrc;
-  CreateTableFunction pCreate;
+  RavelTableKind eKind;
+  Holder eHolder;
+  CrcRule eClassCrc;
+  RavelCSectionWalk::Function pWalk;  // null: nothing to walk past the header
+  CreateTableFunction pCreate;        // kHeldTable only
   CopyTableFunction pCopy;
+  JoinTableFunction pJoin;  // null: each section stands alone (or no class)
+  bool bJoined;             // the sections of one table make one table
+  int iStreamIdBytes;       // bytes after the long header that belong to the table's identity
+  bool bOtherStream;        // describes another transport stream than the one it arrives on
 };
 
 // Built over a null section, which traces nothing, then parsed once: the result
@@ -70,44 +83,57 @@ RavelCTableBase* CopyPMT(RavelCTableBase& table) {
   return copy;
 }
 
-// The EIT takes 0x4E, 0x4F, 0x50 and 0x60 to 0x6F; 0x51 to 0x5F have no class.
-const TableRow kTableRows[] = {
-    {0x00, 0x00, kCrcAlways, ParseNewTable<RavelCPAT>, CopyTable<RavelCPAT>},
-    {0x02, 0x02, kCrcAlways, ParseNewTable<RavelCPMT>, CopyPMT},
-    {0x3D, 0x3D, kCrcWithSyntaxIndicator, ParseNewTable<RavelCDsmccStreamEvent>, CopyTable<RavelCDsmccStreamEvent>},
-    {0x40, 0x41, kCrcAlways, ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>},
-    {0x42, 0x42, kCrcAlways, ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>},
-    {0x46, 0x46, kCrcAlways, ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>},
-    {0x4E, 0x50, kCrcAlways, ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>},
-    {0x60, 0x6F, kCrcAlways, ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>},
-    {0x74, 0x74, kCrcAlways, ParseNewAIT, CopyTable<RavelCAIT>},
-    {0xC4, 0xC4, kCrcAlways, ParseNewTable<RavelCBIT>, CopyTable<RavelCBIT>},
-};
+template <class T>
+void JoinTable(RavelCTableBase& table, RavelCTableBase& other) {
+  static_cast<T&>(table) += static_cast<T&>(other);
+}
 
-// The time tables keep their own short header and check no CRC_32.
-const unsigned char kTDTTableId = 0x70;
-const unsigned char kTOTTableId = 0x73;
+typedef RavelCSectionWalk W;
+
+// table_ids     kind                           class         class CRC                 walk             create / copy / join                                          joined  stream ids  other stream
+const TableRow kTableRows[] = {
+    {0x00, 0x00, kRavelKindPAT,                 kHeldTable,   kCrcAlways,              0,               ParseNewTable<RavelCPAT>, CopyTable<RavelCPAT>, 0,                      false, 0, false},
+    {0x01, 0x01, kRavelKindCAT,                 kNoClass,     kCrcNever,               0,               0, 0, 0,                                                            false, 0, false},
+    {0x02, 0x02, kRavelKindPMT,                 kHeldTable,   kCrcAlways,              W::PMT,          ParseNewTable<RavelCPMT>, CopyPMT, JoinTable<RavelCPMT>,           true,  0, false},
+    {0x3B, 0x3C, kRavelKindDsmccOther,          kHeldMessage, kCrcNever,               W::Carousel,     0, 0, 0,                                                            false, 0, false},
+    {0x3D, 0x3D, kRavelKindStreamEvents,        kHeldTable,   kCrcWithSyntaxIndicator, W::StreamEvents, ParseNewTable<RavelCDsmccStreamEvent>, CopyTable<RavelCDsmccStreamEvent>, 0, false, 0, false},
+    {0x40, 0x40, kRavelKindNIT,                 kHeldTable,   kCrcAlways,              W::NIT,          ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>, JoinTable<RavelCNIT>, true,  0, false},
+    {0x41, 0x41, kRavelKindNIT,                 kHeldTable,   kCrcAlways,              W::NIT,          ParseNewTable<RavelCNIT>, CopyTable<RavelCNIT>, JoinTable<RavelCNIT>, true,  0, true},
+    {0x42, 0x42, kRavelKindSDT,                 kHeldTable,   kCrcAlways,              W::SDT,          ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>, JoinTable<RavelCSDT>, true,  2, false},
+    {0x46, 0x46, kRavelKindSDT,                 kHeldTable,   kCrcAlways,              W::SDT,          ParseNewTable<RavelCSDT>, CopyTable<RavelCSDT>, JoinTable<RavelCSDT>, true,  2, true},
+    {0x4E, 0x4E, kRavelKindEITPresentFollowing, kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, false},
+    {0x4F, 0x4F, kRavelKindEITPresentFollowing, kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, true},
+    {0x50, 0x50, kRavelKindEITSchedule,         kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, false},
+    // EIT schedule actual sections past the first four days: the EIT class refuses them.
+    {0x51, 0x5F, kRavelKindEITSchedule,         kNoClass,     kCrcNever,               W::EIT,          0, 0, 0,                                                            true,  4, false},
+    {0x60, 0x6F, kRavelKindEITSchedule,         kHeldTable,   kCrcAlways,              W::EIT,          ParseNewTable<RavelCEIT>, CopyTable<RavelCEIT>, JoinTable<RavelCEIT>, true,  4, true},
+    // The time tables keep their own short header and their classes check no CRC_32.
+    {0x70, 0x70, kRavelKindTDT,                 kHeldTDT,     kCrcNever,               W::TDT,          0, 0, 0,                                                            false, 0, false},
+    {0x73, 0x73, kRavelKindTOT,                 kHeldTOT,     kCrcNever,               W::TOT,          0, 0, 0,                                                            false, 0, false},
+    {0x74, 0x74, kRavelKindAIT,                 kHeldTable,   kCrcAlways,              W::AIT,          ParseNewAIT, CopyTable<RavelCAIT>, 0,                               false, 0, false},
+    {0xC4, 0xC4, kRavelKindBIT,                 kHeldTable,   kCrcAlways,              W::BIT,          ParseNewTable<RavelCBIT>, CopyTable<RavelCBIT>, JoinTable<RavelCBIT>, true,  0, false},
+};
 
 const int kTableRowCount = static_cast<int>(sizeof(kTableRows) / sizeof(kTableRows[0]));
 
+// A short section that still ends with a CRC_32 (ETSI EN 300 468 5.2.6).
+const unsigned char kTOTTableId = 0x73;
+
 // Carousel sections: their DSM-CC message follows the 8-byte section header and
 // ends before the CRC_32 (or checksum), neither of which the message classes read.
-const unsigned char kDsmccControlTableId = 0x3B;  // DSI, DII
-const unsigned char kDsmccDataTableId = 0x3C;     // DDB
-const int kSectionHeaderSize = 8;
-const int kSectionCrcSize = 4;
+const int kCarouselHeaderSize = 8;
+const int kCrcSize = 4;
 const int kMessageHeaderSize = 12;
+const int kLongHeaderSize = 8;
 
 typedef RavelCDsmccBase* (*CreateMessageFunction)(unsigned char* message, int& result);
 typedef RavelCDsmccBase* (*CopyMessageFunction)(RavelCDsmccBase& message);
-// Whether the parts that the class reads lie inside the message's `end` bytes.
-typedef bool (*PartsInsideFunction)(const unsigned char* message, int end);
 
 struct MessageRow {
   unsigned short iMessageId;
+  RavelTableKind eKind;
   CreateMessageFunction pCreate;
   CopyMessageFunction pCopy;  // null: the class has no copy
-  PartsInsideFunction pPartsInside;
 };
 
 template <class T>
@@ -129,49 +155,41 @@ RavelCDsmccBase* CopyMessage(RavelCDsmccBase& message) {
   return new T(static_cast<T&>(message));
 }
 
-int BodyOffset(const unsigned char* message) { return kMessageHeaderSize + message[9]; }
-
-// serverId 20 | compatibilityDescriptorLength 16 | privateDataLength 16 | privateData
-bool DsiPartsInside(const unsigned char* message, int end) {
-  int body = BodyOffset(message);
-  if (body + 24 > end) return false;
-  return body + 24 + RavelRead16(message + body + 22) <= end;
-}
-
-// download parameters 16 | compatibilityDescriptorLength 16 | descriptor |
-// numberOfModules 16 | records | privateDataLength 16 | privateData
-bool DiiPartsInside(const unsigned char* message, int end) {
-  int body = BodyOffset(message);
-  if (body + 18 > end) return false;
-  int at = body + 16 + RavelRead16(message + body + 16);
-  if (at + 4 > end) return false;
-  unsigned int numberOfModules = RavelRead16(message + at + 2);
-  at += 4;
-  for (unsigned int i = 0; i < numberOfModules; ++i) {
-    if (at + 8 > end) return false;
-    at += 8 + message[at + 7];  // moduleInfoLength
-    if (at > end) return false;
-  }
-  if (at + 2 > end) return false;
-  return at + 2 + RavelRead16(message + at) <= end;
-}
-
-// moduleId 16 | moduleVersion 8 | reserved 8 | blockNumber 16 | block to the end
-bool DdbPartsInside(const unsigned char* message, int end) { return BodyOffset(message) + 6 <= end; }
-
 const MessageRow kMessageRows[] = {
-    {RAVEL_DSMCC_MSG_DSI, ParseNewDSI, 0, DsiPartsInside},
-    {RAVEL_DSMCC_MSG_DII, ParseNewMessage<RavelCDsmccDII>, CopyMessage<RavelCDsmccDII>, DiiPartsInside},
-    {RAVEL_DSMCC_MSG_DDB, ParseNewMessage<RavelCDsmccDDB>, CopyMessage<RavelCDsmccDDB>, DdbPartsInside},
+    {RAVEL_DSMCC_MSG_DSI, kRavelKindDSI, ParseNewDSI, 0},
+    {RAVEL_DSMCC_MSG_DII, kRavelKindDII, ParseNewMessage<RavelCDsmccDII>, CopyMessage<RavelCDsmccDII>},
+    {RAVEL_DSMCC_MSG_DDB, kRavelKindDDB, ParseNewMessage<RavelCDsmccDDB>, CopyMessage<RavelCDsmccDDB>},
 };
 
 const int kMessageRowCount = static_cast<int>(sizeof(kMessageRows) / sizeof(kMessageRows[0]));
 
-int FindTableRow(unsigned char tableId) {
-  for (int i = 0; i < kTableRowCount; ++i) {
-    if (tableId >= kTableRows[i].iFirstTableId && tableId <= kTableRows[i].iLastTableId) return i;
+const char* const kKindNames[kRavelKindCount] = {
+    "PAT", "CAT", "PMT", "NIT", "SDT", "EIT p/f", "EIT schedule", "TDT", "TOT", "BIT", "AIT",
+    "DSI", "DII", "DDB", "DSM-CC other", "stream descriptors", "other",
+};
+
+// The row of every table_id (-1 for none), made once from the rows: every
+// section a receiver reads asks it several times.
+struct TableRowIndex {
+  signed char aRow[256];
+  TableRowIndex() {
+    for (int tableId = 0; tableId < 256; ++tableId) aRow[tableId] = -1;
+    for (int i = 0; i < kTableRowCount; ++i) {
+      for (int tableId = kTableRows[i].iFirstTableId; tableId <= kTableRows[i].iLastTableId; ++tableId) {
+        aRow[tableId] = static_cast<signed char>(i);
+      }
+    }
   }
-  return -1;
+};
+
+int FindTableRow(unsigned char tableId) {
+  static const TableRowIndex index;
+  return index.aRow[tableId];
+}
+
+// The EIT's sections come in segments of eight (ETSI EN 300 468 5.2.4).
+bool IsSegmentedRow(int row) {
+  return kTableRows[row].eKind == kRavelKindEITPresentFollowing || kTableRows[row].eKind == kRavelKindEITSchedule;
 }
 
 int FindMessageRow(unsigned short messageId) {
@@ -181,26 +199,26 @@ int FindMessageRow(unsigned short messageId) {
   return -1;
 }
 
-bool IsCarouselSection(unsigned char tableId) {
-  return tableId == kDsmccControlTableId || tableId == kDsmccDataTableId;
-}
-
-// The length checks of a message of `count` bytes; `end` gets its declared size.
-RavelSafeResult CheckMessageLength(const unsigned char* message, int count, int& end) {
-  if (message == 0 || count < 0) return kRavelSafeNullInput;
-  if (count < kMessageHeaderSize) return kRavelSafeTooShort;
-  end = kMessageHeaderSize + RavelRead16(message + 10);  // messageLength
-  if (end > count) return kRavelSafeLengthMismatch;
-  return kRavelSafeOk;
+RavelSafeRefusal Accepted() {
+  RavelSafeRefusal refusal = {kRavelSafeOk, 0, -1};
+  return refusal;
 }
 
 }  // namespace
 
-const int RavelCSafeSection::kPadding;
 const int RavelCSafeSection::kMaxSectionSize;
 
 RavelCSafeSection::RavelCSafeSection()
-    : pBuffer(0), iDataSize(0), iParseResult(0), pTable(0), pTDT(0), pTOT(0), pMessage(0), iRow(-1) {}
+    : pBuffer(0),
+      iCapacity(0),
+      iDataSize(0),
+      cRefusal(Accepted()),
+      iParseResult(0),
+      pTable(0),
+      pTDT(0),
+      pTOT(0),
+      pMessage(0),
+      iRow(-1) {}
 
 RavelCSafeSection::~RavelCSafeSection() {
   Clear();
@@ -219,12 +237,31 @@ void RavelCSafeSection::Clear() {
   iRow = -1;
 }
 
+// The buffer is kept; the bytes of the last section are zeroed so that the bytes
+// after the next one read zero.
 void RavelCSafeSection::Reset() {
   Clear();
   iParseResult = 0;
-  delete[] pBuffer;
-  pBuffer = 0;
+  if (iDataSize > 0) std::memset(pBuffer, 0, static_cast<unsigned int>(iDataSize));
   iDataSize = 0;
+  cRefusal = Accepted();
+}
+
+RavelSafeResult RavelCSafeSection::Refuse(RavelSafeResult result, const char* check, int offset) {
+  cRefusal.eResult = result;
+  cRefusal.pCheck = check;
+  cRefusal.iOffset = offset;
+  return result;
+}
+
+void RavelCSafeSection::Keep(const unsigned char* bytes, int size) {
+  if (size > iCapacity) {
+    delete[] pBuffer;
+    pBuffer = new unsigned char[size];
+    iCapacity = size;
+  }
+  std::memcpy(pBuffer, bytes, static_cast<unsigned int>(size));
+  iDataSize = size;
 }
 
 RavelCTableBase* RavelCSafeSection::TakeTable() {
@@ -253,10 +290,7 @@ RavelCDsmccBase* RavelCSafeSection::TakeMessage() {
   return message;
 }
 
-RavelCTableBase* RavelCSafeSection::CopyTable() const {
-  if (pTable == 0) return 0;
-  return kTableRows[iRow].pCopy(*pTable);
-}
+RavelCTableBase* RavelCSafeSection::CopyTable() const { return pTable != 0 ? Copy(*pTable) : 0; }
 
 RavelCTOT* RavelCSafeSection::CopyTOT() const { return pTOT != 0 ? new RavelCTOT(*pTOT) : 0; }
 
@@ -272,23 +306,19 @@ void RavelCSafeSection::Show() {
   if (pMessage != 0) pMessage->Show();
 }
 
-void RavelCSafeSection::CopyPadded(const unsigned char* bytes, int size) {
-  // Allocated to the exact size, so that a memory checker flags any read past the padding.
-  pBuffer = new unsigned char[size + kPadding];
-  std::memcpy(pBuffer, bytes, static_cast<unsigned int>(size));
-  std::memset(pBuffer + size, 0, static_cast<unsigned int>(kPadding));
-  iDataSize = size;
-}
-
 RavelSafeResult RavelCSafeSection::Load(const unsigned char* bytes, int count) {
   Reset();
-  if (bytes == 0 || count < 0) return kRavelSafeNullInput;
-  if (count < 3) return kRavelSafeTooShort;
+  if (bytes == 0 || count < 0) return Refuse(kRavelSafeNullInput, "no data", -1);
+  if (count < 3) return Refuse(kRavelSafeTooShort, "bytes end before section_length", count);
   int size = RavelSectionSize(bytes);
-  if (count < size) return kRavelSafeLengthMismatch;
-  CopyPadded(bytes, size);
-  if (ChecksCrc(pBuffer[0], static_cast<unsigned char>(pBuffer[1] >> 7)) && !RavelUtil_CheckSectionCRC32(pBuffer)) {
-    return kRavelSafeCrcError;
+  if (count < size) return Refuse(kRavelSafeLengthMismatch, "section runs past the bytes held", 1);
+  Keep(bytes, size);
+  if (CarriesCrc(pBuffer) && !RavelUtil_CheckSectionCRC32(pBuffer)) {
+    return Refuse(kRavelSafeCrcError, "CRC_32 does not verify", size - kCrcSize);
+  }
+  int row = FindTableRow(pBuffer[0]);
+  if (row >= 0 && kTableRows[row].pWalk != 0 && !kTableRows[row].pWalk(pBuffer, size, cRefusal)) {
+    return cRefusal.eResult;
   }
   return kRavelSafeOk;
 }
@@ -296,19 +326,26 @@ RavelSafeResult RavelCSafeSection::Load(const unsigned char* bytes, int count) {
 RavelSafeResult RavelCSafeSection::Parse(const unsigned char* bytes, int count) {
   RavelSafeResult result = Load(bytes, count);
   if (result != kRavelSafeOk) return result;
-  if (IsCarouselSection(pBuffer[0])) {
-    int messageCount = iDataSize - kSectionHeaderSize - kSectionCrcSize;
-    if (messageCount < kMessageHeaderSize) return kRavelSafeTooShort;
-    return ParseMessageAt(pBuffer + kSectionHeaderSize, messageCount);
-  }
-  if (pBuffer[0] == kTDTTableId) return ParseTimeTable(pTDT);
-  if (pBuffer[0] == kTOTTableId) return ParseTimeTable(pTOT);
   int row = FindTableRow(pBuffer[0]);
-  if (row < 0) return kRavelSafeUnknownTable;
+  switch (row < 0 ? kNoClass : kTableRows[row].eHolder) {
+    case kHeldMessage:
+      return ParseMessageAt(pBuffer + kCarouselHeaderSize);
+    case kHeldTDT:
+      return ParseTimeTable(pTDT);
+    case kHeldTOT:
+      return ParseTimeTable(pTOT);
+    case kHeldTable:
+      return ParseHeld(row);
+    default:
+      return Refuse(kRavelSafeUnknownTable, "no class for this table_id", 0);
+  }
+}
+
+RavelSafeResult RavelCSafeSection::ParseHeld(int row) {
   RavelCTableBase* table = kTableRows[row].pCreate(pBuffer, iParseResult);
   if (iParseResult != kRavelOk) {
     delete table;
-    return kRavelSafeRefused;
+    return Refuse(kRavelSafeRefused, "the class's parse refused it", -1);
   }
   pTable = table;
   iRow = row;
@@ -322,7 +359,7 @@ RavelSafeResult RavelCSafeSection::ParseTimeTable(T*& held) {
   iParseResult = table->ParseRawData(pBuffer);
   if (iParseResult != kRavelOk) {
     delete table;
-    return kRavelSafeRefused;
+    return Refuse(kRavelSafeRefused, "the class's parse refused it", -1);
   }
   held = table;
   return kRavelSafeOk;
@@ -333,7 +370,8 @@ RavelSafeResult RavelCSafeSection::ParseCallers(const unsigned char* bytes, int 
   RavelSafeResult result = Load(bytes, count);
   if (result != kRavelSafeOk) return result;
   iParseResult = table.ParseRawData(pBuffer);
-  return iParseResult == kRavelOk ? kRavelSafeOk : kRavelSafeRefused;
+  if (iParseResult != kRavelOk) return Refuse(kRavelSafeRefused, "the class's parse refused it", -1);
+  return kRavelSafeOk;
 }
 
 RavelSafeResult RavelCSafeSection::ParseInto(const unsigned char* bytes, int count, RavelCTableBase& table) {
@@ -348,15 +386,13 @@ RavelSafeResult RavelCSafeSection::ParseInto(const unsigned char* bytes, int cou
   return ParseCallers(bytes, count, table);
 }
 
-// `message` lies in pBuffer, followed by at least kPadding zeroed bytes.
-RavelSafeResult RavelCSafeSection::ParseMessageAt(unsigned char* message, int count) {
-  RavelSafeResult result = CheckMessage(message, count);
-  if (result != kRavelSafeOk) return result;
+// `message` lies in pBuffer and its parts have been walked.
+RavelSafeResult RavelCSafeSection::ParseMessageAt(unsigned char* message) {
   int row = FindMessageRow(RavelRead16(message + 2));
   RavelCDsmccBase* object = kMessageRows[row].pCreate(message, iParseResult);
   if (iParseResult != kRavelOk) {
     delete object;
-    return kRavelSafeRefused;
+    return Refuse(kRavelSafeRefused, "the class's parse refused it", -1);
   }
   pMessage = object;
   iRow = row;
@@ -365,26 +401,32 @@ RavelSafeResult RavelCSafeSection::ParseMessageAt(unsigned char* message, int co
 
 RavelSafeResult RavelCSafeSection::LoadMessage(const unsigned char* bytes, int count) {
   Reset();
-  int end = 0;
-  RavelSafeResult result = CheckMessageLength(bytes, count, end);
-  if (result != kRavelSafeOk) return result;
-  CopyPadded(bytes, end);
+  if (bytes == 0 || count < 0) return Refuse(kRavelSafeNullInput, "no data", -1);
+  if (count < kMessageHeaderSize) return Refuse(kRavelSafeTooShort, "bytes end before messageLength", count);
+  int end = kMessageHeaderSize + RavelRead16(bytes + 10);
+  if (end > count) return Refuse(kRavelSafeLengthMismatch, "message runs past the bytes held", 10);
+  Keep(bytes, end);
   return kRavelSafeOk;
 }
 
 RavelSafeResult RavelCSafeSection::ParseMessage(const unsigned char* bytes, int count) {
   RavelSafeResult result = LoadMessage(bytes, count);
   if (result != kRavelSafeOk) return result;
-  return ParseMessageAt(pBuffer, iDataSize);
+  if (!RavelCSectionWalk::Message(pBuffer, iDataSize, RavelRead16(pBuffer + 2), 0, cRefusal)) return cRefusal.eResult;
+  // A message held without its section: the window is the message itself.
+  RavelCReadWindow window(pBuffer, pBuffer + iDataSize);
+  return ParseMessageAt(pBuffer);
 }
 
 RavelSafeResult RavelCSafeSection::ParseMessageInto(const unsigned char* bytes, int count,
                                                     unsigned short messageId, RavelCDsmccBase& message) {
   RavelSafeResult result = LoadMessage(bytes, count);
   if (result != kRavelSafeOk) return result;
-  if (!kMessageRows[FindMessageRow(messageId)].pPartsInside(pBuffer, iDataSize)) return kRavelSafeOutsideMessage;
+  if (!RavelCSectionWalk::Message(pBuffer, iDataSize, messageId, 0, cRefusal)) return cRefusal.eResult;
+  RavelCReadWindow window(pBuffer, pBuffer + iDataSize);
   iParseResult = message.ParseRawData(pBuffer);
-  return iParseResult == kRavelOk ? kRavelSafeOk : kRavelSafeRefused;
+  if (iParseResult != kRavelOk) return Refuse(kRavelSafeRefused, "the class's parse refused it", -1);
+  return kRavelSafeOk;
 }
 
 RavelSafeResult RavelCSafeSection::ParseMessageInto(const unsigned char* bytes, int count, RavelCDsmccDSI& message) {
@@ -400,23 +442,40 @@ RavelSafeResult RavelCSafeSection::ParseMessageInto(const unsigned char* bytes, 
 }
 
 RavelSafeResult RavelCSafeSection::CheckMessage(const unsigned char* message, int count) {
-  int end = 0;
-  RavelSafeResult result = CheckMessageLength(message, count, end);
-  if (result != kRavelSafeOk) return result;
-  int row = FindMessageRow(RavelRead16(message + 2));
-  if (row < 0) return kRavelSafeUnknownTable;
-  return kMessageRows[row].pPartsInside(message, end) ? kRavelSafeOk : kRavelSafeOutsideMessage;
+  if (message == 0 || count < 0) return kRavelSafeNullInput;
+  if (count < kMessageHeaderSize) return kRavelSafeTooShort;
+  int end = kMessageHeaderSize + RavelRead16(message + 10);
+  if (end > count) return kRavelSafeLengthMismatch;
+  RavelSafeRefusal refusal = Accepted();
+  RavelCSectionWalk::Message(message, end, RavelRead16(message + 2), 0, refusal);
+  return refusal.eResult;
+}
+
+RavelTableKind RavelCSafeSection::GetKind(const unsigned char* section, int count) {
+  if (section == 0 || count < 1) return kRavelKindOther;
+  int row = FindTableRow(section[0]);
+  if (row < 0) return kRavelKindOther;
+  if (kTableRows[row].eHolder == kHeldMessage) {
+    if (count < kCarouselHeaderSize + 4) return kRavelKindDsmccOther;
+    int message = FindMessageRow(RavelRead16(section + kCarouselHeaderSize + 2));
+    return message < 0 ? kRavelKindDsmccOther : kMessageRows[message].eKind;
+  }
+  return kTableRows[row].eKind;
+}
+
+const char* RavelCSafeSection::GetKindName(RavelTableKind kind) {
+  return kind >= 0 && kind < kRavelKindCount ? kKindNames[kind] : "?";
 }
 
 bool RavelCSafeSection::IsKnownTable(unsigned char tableId) {
-  return FindTableRow(tableId) >= 0 || IsCarouselSection(tableId) || tableId == kTDTTableId ||
-         tableId == kTOTTableId;
+  int row = FindTableRow(tableId);
+  return row >= 0 && kTableRows[row].eHolder != kNoClass;
 }
 
 bool RavelCSafeSection::ChecksCrc(unsigned char tableId, unsigned char sectionSyntaxIndicator) {
   int row = FindTableRow(tableId);
   if (row < 0) return false;
-  switch (kTableRows[row].eCrc) {
+  switch (kTableRows[row].eClassCrc) {
     case kCrcAlways:
       return true;
     case kCrcWithSyntaxIndicator:
@@ -424,6 +483,65 @@ bool RavelCSafeSection::ChecksCrc(unsigned char tableId, unsigned char sectionSy
     default:
       return false;
   }
+}
+
+bool RavelCSafeSection::CarriesCrc(const unsigned char* section) {
+  return (section[1] & 0x80) != 0 || section[0] == kTOTTableId;
+}
+
+bool RavelCSafeSection::JoinsSections(unsigned char tableId) {
+  int row = FindTableRow(tableId);
+  return row >= 0 && kTableRows[row].bJoined;
+}
+
+bool RavelCSafeSection::IsSegmented(unsigned char tableId) {
+  int row = FindTableRow(tableId);
+  return row >= 0 && IsSegmentedRow(row);
+}
+
+bool RavelCSafeSection::DescribesOtherStream(unsigned char tableId) {
+  int row = FindTableRow(tableId);
+  return row >= 0 && kTableRows[row].bOtherStream;
+}
+
+bool RavelCSafeSection::ReadHeader(const unsigned char* section, int count, RavelSectionHeader& header) {
+  std::memset(&header, 0, sizeof header);
+  if (section == 0 || count < 3) return false;
+  header.iTableId = section[0];
+  header.bLongForm = (section[1] & 0x80) != 0;
+  if (!header.bLongForm) return true;
+  if (count < kLongHeaderSize) return false;
+  header.iTableIdExtension = RavelRead16(section + 3);
+  header.iVersionNumber = static_cast<unsigned char>((section[5] >> 1) & 0x1F);
+  header.iSectionNumber = section[6];
+  header.iLastSectionNumber = section[7];
+  header.iSegmentLastSectionNumber = section[6];
+  int row = FindTableRow(section[0]);
+  int streamIdBytes = row >= 0 ? kTableRows[row].iStreamIdBytes : 0;
+  if (count >= kLongHeaderSize + streamIdBytes) {
+    for (int i = 0; i < streamIdBytes; ++i) header.iStreamIds = (header.iStreamIds << 8) | section[kLongHeaderSize + i];
+  }
+  // The EIT's segment_last_section_number follows its stream ids.
+  if (row >= 0 && IsSegmentedRow(row) && count > kLongHeaderSize + streamIdBytes) {
+    header.iSegmentLastSectionNumber = section[kLongHeaderSize + streamIdBytes];
+  }
+  return true;
+}
+
+bool RavelCSafeSection::Join(RavelCTableBase& table, RavelCTableBase& other) {
+  int row = FindTableRow(table.iTableId);
+  int otherRow = FindTableRow(other.iTableId);
+  if (row < 0 || otherRow < 0 || kTableRows[row].pJoin == 0 || kTableRows[row].pJoin != kTableRows[otherRow].pJoin) {
+    return false;
+  }
+  kTableRows[row].pJoin(table, other);
+  return true;
+}
+
+RavelCTableBase* RavelCSafeSection::Copy(RavelCTableBase& table) {
+  int row = FindTableRow(table.iTableId);
+  if (row < 0 || kTableRows[row].pCopy == 0) return 0;
+  return kTableRows[row].pCopy(table);
 }
 
 const char* RavelCSafeSection::GetResultText(RavelSafeResult result) {
@@ -444,6 +562,8 @@ const char* RavelCSafeSection::GetResultText(RavelSafeResult result) {
       return "unknown table";
     case kRavelSafeRefused:
       return "refused by the parser";
+    case kRavelSafeMalformed:
+      return "malformed";
   }
   return "unknown result";
 }

@@ -19,9 +19,9 @@ const unsigned short kMinSectionLengthWithEntries = 10;
 const unsigned short kOneSegPMTPIDFirst = 0x1FC8;
 const unsigned short kOneSegPMTPIDLast = 0x1FCF;
 
-bool IsOneSegPMTPID(unsigned short pid) { return pid >= kOneSegPMTPIDFirst && pid <= kOneSegPMTPIDLast; }
-
 }  // namespace
+
+bool RavelPAT_IsOneSegPMTPID(unsigned short pid) { return pid >= kOneSegPMTPIDFirst && pid <= kOneSegPMTPIDLast; }
 
 // ---------------------------------------------------------------------------
 // RavelCPMTInfo
@@ -111,7 +111,7 @@ int RavelCPAT::ParseRawData(unsigned char* section) {
     } else {
       RavelCPMTInfo* program = new RavelCPMTInfo(entry);
       // The first one-segment PMT goes last in the list; any later one is sorted in.
-      if (heldBack == 0 && IsOneSegPMTPID(program->iPID)) {
+      if (heldBack == 0 && RavelPAT_IsOneSegPMTPID(program->iPID)) {
         heldBack = program;
       } else {
         InsertInProgramOrder(program);

@@ -1,7 +1,5 @@
 // What a receiver does with a section when it first arrives.
 #include "Capture.h"
-#include "LibraryTables.h"
-#include "ParseBuffer.h"
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CTablePAT.h"
@@ -11,11 +9,10 @@ namespace ravel_dump {
 namespace {
 
 // The PAT names the PMT PIDs (the one-segment one included) and the network PID.
-int FollowPat(int pid, RavelCPAT& pat, Demux* demux) {
-  if (demux == nullptr || pid != 0x0000) return 0;
+void FollowPat(int pid, RavelCPAT& pat, Demux* demux) {
+  if (demux == nullptr || pid != 0x0000) return;
   for (int i = 0; i < pat.aProgramList.iCount; ++i) demux->AddSectionPid(pat.aProgramList.ipArray[i]->iPID, PidRole::kPmt);
   if (pat.iNetworkPID != 0xFFFF) demux->AddSectionPid(pat.iNetworkPID, PidRole::kNit);
-  return 0;
 }
 
 // A PMT names the PIDs of its streams; those that carry sections are read:
@@ -43,10 +40,7 @@ void FollowPmt(RavelCPMT& pmt, Demux* demux) {
 }
 
 // The DII lists the modules of a download with their sizes and versions.
-int ListModules(int pid, unsigned char* message, CarouselCollector& carousel) {
-  RavelCDsmccDII dii(nullptr);
-  int result = dii.ParseRawData(message);
-  if (result != 0) return result;
+void ListModules(int pid, RavelCDsmccDII& dii, CarouselCollector& carousel) {
   std::vector<ModuleListing> modules;
   for (int i = 0; i < dii.cModuleInfos.iCount; ++i) {
     const RavelCModuleInfo* info = dii.cModuleInfos.ipArray[i];
@@ -58,40 +52,34 @@ int ListModules(int pid, unsigned char* message, CarouselCollector& carousel) {
     modules.push_back(module);
   }
   carousel.AddModuleList(pid, dii.iDownloadId, dii.iBlockSize, modules);
-  return 0;
 }
 
 // A DDB carries one block of a module; its header's transaction id is the downloadId.
-int KeepBlock(int pid, unsigned char* message, CarouselCollector& carousel) {
-  RavelCDsmccDDB ddb(nullptr);
-  int result = ddb.ParseRawData(message);
-  if (result != 0) return result;
+void KeepBlock(int pid, RavelCDsmccDDB& ddb, CarouselCollector& carousel) {
   carousel.AddBlock(pid, ddb.iTransactionId, ddb.iModuleId, ddb.iModuleVersion, ddb.iBlockNumber, ddb.pBlockData,
                     ddb.pBlockData != nullptr && ddb.iBlockDataLen > 0 ? static_cast<std::size_t>(ddb.iBlockDataLen) : 0);
-  return 0;
 }
 
 }  // namespace
 
-int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t size, Demux* demux,
-                   CarouselCollector& carousel) {
-  ParseBuffer buffer(section, size);
-  if (kind == TableKind::kPat) {
-    RavelCPAT pat(nullptr);
-    int result = pat.ParseRawData(buffer.Section());
-    if (result == 0) FollowPat(pid, pat, demux);
-    return result;
+// The table of tables made the object of the kind's class.
+void UseOnArrival(int pid, TableKind kind, RavelCSafeSection& parsed, Demux* demux, CarouselCollector& carousel) {
+  switch (kind) {
+    case kRavelKindPAT:
+      FollowPat(pid, static_cast<RavelCPAT&>(*parsed.GetTable()), demux);
+      break;
+    case kRavelKindPMT:
+      FollowPmt(static_cast<RavelCPMT&>(*parsed.GetTable()), demux);
+      break;
+    case kRavelKindDII:
+      ListModules(pid, static_cast<RavelCDsmccDII&>(*parsed.GetMessage()), carousel);
+      break;
+    case kRavelKindDDB:
+      KeepBlock(pid, static_cast<RavelCDsmccDDB&>(*parsed.GetMessage()), carousel);
+      break;
+    default:
+      break;
   }
-  if (kind == TableKind::kPmt) {
-    RavelCPMT pmt(nullptr);
-    int result = pmt.ParseRawData(buffer.Section());
-    if (result == 0) FollowPmt(pmt, demux);
-    return result;
-  }
-  if (kind == TableKind::kDii) return ListModules(pid, buffer.Message(), carousel);
-  if (kind == TableKind::kDdb) return KeepBlock(pid, buffer.Message(), carousel);
-  std::unique_ptr<TableObject> object = MakeTableObject(kind);
-  return object ? object->Parse(buffer.Section()) : 0;
 }
 
 }  // namespace ravel_dump

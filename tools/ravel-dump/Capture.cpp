@@ -2,8 +2,6 @@
 
 #include <cstdio>
 
-#include "SectionCheck.h"
-
 namespace ravel_dump {
 namespace {
 
@@ -22,34 +20,43 @@ std::string Where(int pid, const uint8_t* section) {
 Capture::Capture(Stats& stats) : stats_(stats), demux_(nullptr) {}
 
 void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
-  TableKind kind = KindOfSection(section, size);
+  TableKind kind = RavelCSafeSection::GetKind(section, static_cast<int>(size));
   KindStats& kindStats = stats_.Kind(kind);
   // Broadcasters resend PSI/SI many times a second: an unchanged repeat only counts.
-  if (registry_.CountRepeat(pid, kind, section, size)) {
+  if (registry_.CountRepeat(pid, section, size)) {
     ++kindStats.sections;
     return;
   }
-  if (SectionHasCrc(section) && !SectionCrcOk(section, size)) {
-    ++stats_.crcFailures;
-    ++kindStats.crcFailures;
-    stats_.Problem(Where(pid, section) + ": CRC failure");
-    return;
-  }
-  std::string reason;
-  if (!CheckSectionStructure(section, size, reason)) {
-    ++stats_.malformed;
-    ++kindStats.malformed;
-    stats_.Problem(Where(pid, section) + ": " + reason);
-    return;
+  // The one parse of these bytes: the library checks them, then its class parses them.
+  std::unique_ptr<RavelCSafeSection> parsed(new RavelCSafeSection);
+  RavelSafeResult result = parsed->Parse(section, static_cast<int>(size));
+  switch (result) {
+    case kRavelSafeOk:
+    case kRavelSafeRefused:
+    case kRavelSafeUnknownTable:  // checked, and kept with no object: shown by its header
+      break;
+    case kRavelSafeCrcError:
+      ++stats_.crcFailures;
+      ++kindStats.crcFailures;
+      stats_.Problem(Where(pid, section) + ": CRC failure");
+      return;
+    default: {
+      const RavelSafeRefusal& refusal = parsed->GetRefusal();
+      ++stats_.malformed;
+      ++kindStats.malformed;
+      stats_.Problem(Where(pid, section) + ": " + refusal.pCheck + " at byte " + std::to_string(refusal.iOffset));
+      return;
+    }
   }
   ++kindStats.sections;
-  StoredSection* stored = registry_.Add(pid, kind, section, size);
-  if (stored == nullptr) return;  // a repeat
   ++kindStats.distinct;
-  stored->parseResult = ParseOnArrival(pid, kind, section, size, demux_, carousel_);
-  if (stored->parseResult != 0) {
+  StoredSection& stored = registry_.Add(pid, kind, std::move(parsed), result);
+  if (result == kRavelSafeOk) {
+    UseOnArrival(pid, kind, *stored.parsed, demux_, carousel_);
+  } else if (result == kRavelSafeRefused) {
     ++kindStats.parseFailures;
-    stats_.Problem(Where(pid, section) + ": the library's parse gave " + std::to_string(stored->parseResult));
+    stats_.Problem(Where(pid, section) + ": the library's parse gave " +
+                   std::to_string(stored.parsed->GetParseResult()));
   }
 }
 

@@ -1,6 +1,7 @@
 // What the tool makes of a capture while it is read: each section from the
-// demultiplexer (or from a file of raw sections) is checked, counted, kept
-// once in the table registry, and used at once where a receiver would use it:
+// demultiplexer (or from a file of raw sections) that is not a repeat is
+// checked and parsed once by the library's safe entry, counted, kept in the
+// table registry with its parsed object, and used at once where a receiver would use it:
 // a PAT or a PMT names more section PIDs, DII and DDB messages feed the
 // carousel collector.
 #ifndef RAVEL_DUMP_CAPTURE_H
@@ -35,11 +36,10 @@ class Capture : public SectionSink {
   CarouselCollector carousel_;
 };
 
-// The library's parse of a section when it first arrives, as a receiver uses
-// it: a PAT or a PMT names more section PIDs to `demux` (when there is one),
-// a DII or a DDB goes to the carousel collector. Gives the parse result.
-int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t size, Demux* demux,
-                   CarouselCollector& carousel);
+// What a receiver does with a section the library parsed when it first
+// arrives: a PAT or a PMT names more section PIDs to `demux` (when there is
+// one), a DII or a DDB goes to the carousel collector.
+void UseOnArrival(int pid, TableKind kind, RavelCSafeSection& parsed, Demux* demux, CarouselCollector& carousel);
 
 }  // namespace ravel_dump
 

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "PidAssembler.h"
+#include "Ravel_CSafeSection.h"
 
 namespace ravel_dump {
 
@@ -91,13 +92,25 @@ bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int c
   if (at >= 188) return false;
   at += 1u + packet[at];  // pointer_field
   if (at + 3 > 188) return false;
-  // A PES packet starts 00 00 01, so its "table_id" is 0 and never matches.
-  const uint8_t tableId = packet[at];
-  const bool longForm = (packet[at + 1] & 0x80) != 0;
+  // A PES packet starts 00 00 01, so its "table_id" is 0 (a PAT) and never matches.
+  RavelSectionHeader header;
+  const int held = static_cast<int>(188 - at);
+  if (!RavelCSafeSection::ReadHeader(packet + at, held, header)) return false;
   PidRole role = PidRole::kNone;
-  if (tableId == 0x3B || tableId == 0x3C) role = PidRole::kCarousel;
-  if (tableId == 0x3D) role = PidRole::kStreamEvents;
-  if (role == PidRole::kNone || !longForm) return false;
+  switch (RavelCSafeSection::GetKind(packet + at, held)) {
+    case kRavelKindDSI:
+    case kRavelKindDII:
+    case kRavelKindDDB:
+    case kRavelKindDsmccOther:
+      role = PidRole::kCarousel;
+      break;
+    case kRavelKindStreamEvents:
+      role = PidRole::kStreamEvents;
+      break;
+    default:
+      break;
+  }
+  if (role == PidRole::kNone || !header.bLongForm) return false;
   AddSectionPid(pid, role);
   return true;
 }

@@ -40,14 +40,14 @@ void PrintReport(std::FILE* out, const InputSummary& input, const Stats& stats, 
                  static_cast<unsigned long long>(stats.lengthMismatches));
   }
 
-  uint64_t tables[static_cast<int>(TableKind::kCount)] = {};
-  for (const auto& table : registry.Tables()) ++tables[static_cast<int>(table->kind)];
+  uint64_t tables[kRavelKindCount] = {};
+  for (const auto& table : registry.Tables()) ++tables[table->kind];
   std::fprintf(out, "  %-20s %9s %9s %7s %13s %10s %15s\n", "kind", "sections", "distinct", "tables", "CRC failures",
                "malformed", "parse failures");
-  for (int k = 0; k < static_cast<int>(TableKind::kCount); ++k) {
+  for (int k = 0; k < kRavelKindCount; ++k) {
     const KindStats& s = stats.kinds[k];
     if (s.sections == 0 && s.crcFailures == 0 && s.malformed == 0 && tables[k] == 0) continue;
-    std::fprintf(out, "  %-20s %9llu %9llu %7llu %13llu %10llu %15llu\n", KindName(static_cast<TableKind>(k)),
+    std::fprintf(out, "  %-20s %9llu %9llu %7llu %13llu %10llu %15llu\n", RavelCSafeSection::GetKindName(static_cast<TableKind>(k)),
                  static_cast<unsigned long long>(s.sections), static_cast<unsigned long long>(s.distinct),
                  static_cast<unsigned long long>(tables[k]), static_cast<unsigned long long>(s.crcFailures),
                  static_cast<unsigned long long>(s.malformed), static_cast<unsigned long long>(s.parseFailures));

@@ -47,7 +47,7 @@ struct KindStats {
 
 struct Stats {
   std::vector<PidStats> pids = std::vector<PidStats>(kPidCount);
-  KindStats kinds[static_cast<int>(TableKind::kCount)];
+  KindStats kinds[kRavelKindCount];
 
   uint64_t sectionsAssembled = 0;   // what the assemblers (or the section file) gave
   uint64_t lengthMismatches = 0;    // section_length larger than the bytes assembled
@@ -61,7 +61,7 @@ struct Stats {
   std::vector<std::string> problems;
   void Problem(const std::string& line);
 
-  KindStats& Kind(TableKind kind) { return kinds[static_cast<int>(kind)]; }
+  KindStats& Kind(TableKind kind) { return kinds[kind]; }
 };
 
 }  // namespace ravel_dump

@@ -1,9 +1,8 @@
 // The summary, from the latest version of each table read, through the
-// library's table and descriptor classes.
+// objects the library made of its sections when they arrived.
 #include <cstring>
 
 #include "Output.h"
-#include "ParseBuffer.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
 #include "Ravel_CDescriptorNetworkName.h"
 #include "Ravel_CDescriptorParentalRating.h"
@@ -51,14 +50,26 @@ const TableEntry* Latest(const TableRegistry& registry, TableKind kind) {
   return Latest(registry, kind, [](const TableEntry&) { return true; });
 }
 
+// The object of class T the library made of a section (the table of tables
+// chose the class by the section's kind).
+template <class T>
+T& Held(const StoredSection& section) {
+  return static_cast<T&>(*section.parsed->GetTable());
+}
+template <>
+RavelCTDT& Held<RavelCTDT>(const StoredSection& section) {
+  return *section.parsed->GetTDT();
+}
+template <>
+RavelCTOT& Held<RavelCTOT>(const StoredSection& section) {
+  return *section.parsed->GetTOT();
+}
+
 // Calls `use(object)` for each section of `table` that the library accepted.
 template <class T, class Use>
 void EachSection(const TableEntry& table, Use use) {
   for (const auto& kv : table.sections) {
-    if (kv.second.parseResult != 0) continue;
-    ParseBuffer buffer(kv.second.bytes);
-    T object(nullptr);
-    if (object.ParseRawData(buffer.Section()) == 0) use(object);
+    if (kv.second.Parsed()) use(Held<T>(kv.second));
   }
 }
 
@@ -88,7 +99,7 @@ DateTime MakeDateTime(const RavelCDateTime& d) {
 
 // The PAT: the transport stream id and the services with their PMT PIDs.
 void AddPat(const TableRegistry& registry, Summary& summary) {
-  const TableEntry* table = Latest(registry, TableKind::kPat, [](const TableEntry& t) { return t.pid <= 0; });
+  const TableEntry* table = Latest(registry, kRavelKindPAT, [](const TableEntry& t) { return t.pid <= 0; });
   if (table == nullptr) return;
   EachSection<RavelCPAT>(*table, [&](RavelCPAT& pat) {
     summary.transportStreamId = pat.iTableIdExtension;
@@ -96,8 +107,7 @@ void AddPat(const TableRegistry& registry, Summary& summary) {
       const RavelCPMTInfo* program = pat.aProgramList.ipArray[i];
       ServiceSummary& service = ServiceOf(summary.services, program->iProgramNumber);
       service.pmtPid = program->iPID;
-      // The receiver's one-segment service: its PMT on 0x1FC8 to 0x1FCF.
-      service.oneSegment = program->iPID >= 0x1FC8 && program->iPID <= 0x1FCF;
+      service.oneSegment = RavelPAT_IsOneSegPMTPID(program->iPID);
     }
   });
 }
@@ -105,7 +115,7 @@ void AddPat(const TableRegistry& registry, Summary& summary) {
 // Each service's PMT: the PIDs the receiver would play.
 void AddPmts(const TableRegistry& registry, Summary& summary) {
   for (ServiceSummary& service : summary.services) {
-    const TableEntry* table = Latest(registry, TableKind::kPmt, [&](const TableEntry& t) {
+    const TableEntry* table = Latest(registry, kRavelKindPMT, [&](const TableEntry& t) {
       return t.extension == service.id && (service.pmtPid < 0 || t.pid == service.pmtPid || t.pid == kNoPid);
     });
     if (table == nullptr) continue;
@@ -143,8 +153,8 @@ void AddPmts(const TableRegistry& registry, Summary& summary) {
 // The SDT of this stream: service types, names and providers.
 void AddSdt(const TableRegistry& registry, Summary& summary) {
   int tsId = summary.transportStreamId;
-  const TableEntry* table = Latest(registry, TableKind::kSdt, [&](const TableEntry& t) {
-    return t.tableId == 0x42 && (tsId < 0 || t.extension == tsId);
+  const TableEntry* table = Latest(registry, kRavelKindSDT, [&](const TableEntry& t) {
+    return !RavelCSafeSection::DescribesOtherStream(t.tableId) && (tsId < 0 || t.extension == tsId);
   });
   if (table == nullptr) return;
   if (summary.transportStreamId < 0) summary.transportStreamId = table->extension;
@@ -163,7 +173,7 @@ void AddSdt(const TableRegistry& registry, Summary& summary) {
 
 // The NIT of this network: its name and transport streams.
 void AddNit(const TableRegistry& registry, Summary& summary) {
-  const TableEntry* table = Latest(registry, TableKind::kNit, [](const TableEntry& t) { return t.tableId == 0x40; });
+  const TableEntry* table = Latest(registry, kRavelKindNIT, [](const TableEntry& t) { return !RavelCSafeSection::DescribesOtherStream(t.tableId); });
   if (table == nullptr) return;
   NetworkSummary& network = summary.network;
   network.id = table->extension;
@@ -231,15 +241,14 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
 // the EIT present/following of the actual stream.
 void AddEvents(const TableRegistry& registry, Summary& summary) {
   for (ServiceSummary& service : summary.services) {
-    const TableEntry* table = Latest(registry, TableKind::kEitPf, [&](const TableEntry& t) {
-      return t.tableId == 0x4E && t.extension == service.id;
+    const TableEntry* table = Latest(registry, kRavelKindEITPresentFollowing, [&](const TableEntry& t) {
+      return !RavelCSafeSection::DescribesOtherStream(t.tableId) && t.extension == service.id;
     });
     if (table == nullptr) continue;
     for (const auto& kv : table->sections) {
-      if (kv.first > 1 || kv.second.parseResult != 0) continue;
-      ParseBuffer buffer(kv.second.bytes);
-      RavelCEIT eit(nullptr);
-      if (eit.ParseRawData(buffer.Section()) != 0 || eit.aEventInfo.iCount == 0) continue;
+      if (kv.first > 1 || !kv.second.Parsed()) continue;
+      RavelCEIT& eit = Held<RavelCEIT>(kv.second);
+      if (eit.aEventInfo.iCount == 0) continue;
       EventSummary event = MakeEvent(*eit.aEventInfo.ipArray[0]);
       (kv.first == 0 ? service.present : service.following) = event;
     }
@@ -249,7 +258,7 @@ void AddEvents(const TableRegistry& registry, Summary& summary) {
 // The broadcast time: the latest TOT (with the local time offset), else the latest TDT.
 void AddTime(const TableRegistry& registry, Summary& summary) {
   TimeSummary& time = summary.time;
-  if (const TableEntry* table = Latest(registry, TableKind::kTot)) {
+  if (const TableEntry* table = Latest(registry, kRavelKindTOT)) {
     EachSection<RavelCTOT>(*table, [&](RavelCTOT& tot) {
       time.valid = true;
       time.source = "TOT";
@@ -272,7 +281,7 @@ void AddTime(const TableRegistry& registry, Summary& summary) {
     });
   }
   if (time.valid) return;
-  if (const TableEntry* table = Latest(registry, TableKind::kTdt)) {
+  if (const TableEntry* table = Latest(registry, kRavelKindTDT)) {
     EachSection<RavelCTDT>(*table, [&](RavelCTDT& tdt) {
       time.valid = true;
       time.source = "TDT";
@@ -284,12 +293,10 @@ void AddTime(const TableRegistry& registry, Summary& summary) {
 // Every AIT section stands alone: the applications of all of them, each once.
 void AddApplications(const TableRegistry& registry, Summary& summary) {
   for (const auto& entry : registry.Tables()) {
-    if (entry->kind != TableKind::kAit) continue;
+    if (entry->kind != kRavelKindAIT) continue;
     for (const auto& kv : entry->sections) {
-      if (kv.second.parseResult != 0) continue;
-      ParseBuffer buffer(kv.second.bytes);
-      RavelCAIT ait;
-      if (ait.ParseRawData(buffer.Section()) != 0) continue;
+      if (!kv.second.Parsed()) continue;
+      RavelCAIT& ait = Held<RavelCAIT>(kv.second);
       RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
       for (int i = 0; i < list->iCount; ++i) {
         const GingaAITApplicationType& record = list->ipArray[i];

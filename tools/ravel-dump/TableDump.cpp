@@ -1,30 +1,26 @@
 // The default output: every distinct table's own dump, in the order first seen.
 #include <string>
 
-#include "LibraryTables.h"
 #include "Output.h"
-#include "ParseBuffer.h"
+#include "Ravel_CTableBase.h"
 
 namespace ravel_dump {
 namespace {
 
 std::string Describe(const TableEntry& table) {
   char text[256];
-  std::string line = std::string("== ") + KindName(table.kind);
+  std::string line = std::string("== ") + RavelCSafeSection::GetKindName(table.kind);
   if (table.pid != kNoPid) {
     std::snprintf(text, sizeof text, " on PID 0x%04x", table.pid);
     line += text;
   }
   std::snprintf(text, sizeof text, ": table_id 0x%02x", table.tableId);
   line += text;
-  const StoredSection& first = table.sections.begin()->second;
-  bool longForm = first.bytes.size() >= 8 && (first.bytes[1] & 0x80) != 0;
-  if (longForm) {
+  if (table.longForm) {
     std::snprintf(text, sizeof text, ", id 0x%04x, version %d", table.extension, table.version);
     line += text;
-    if (KindJoinsSections(table.kind)) {
-      bool eit = table.kind == TableKind::kEitPf || table.kind == TableKind::kEitSchedule;
-      if (eit) {
+    if (RavelCSafeSection::JoinsSections(table.tableId)) {
+      if (RavelCSafeSection::IsSegmented(table.tableId)) {
         // EIT sections come in segments of eight, not all numbers are used.
         std::snprintf(text, sizeof text, ", %zu sections up to number %d", table.sections.size(),
                       table.lastSectionNumber);
@@ -51,6 +47,43 @@ std::string Describe(const TableEntry& table) {
   return line;
 }
 
+// The object a table's sections make: the one section's own, or a copy of the
+// first joined with the others by the table's operator+=. `refused` lists the
+// sections the library's parse refused.
+class JoinedTable {
+ public:
+  explicit JoinedTable(const TableEntry& table) {
+    for (const auto& kv : table.sections) {
+      const StoredSection& section = kv.second;
+      if (section.result == kRavelSafeRefused) {
+        refused += ", section " + std::to_string(kv.first) + " refused by the library (" +
+                   std::to_string(section.parsed->GetParseResult()) + ")";
+      }
+      if (!section.Parsed()) continue;
+      if (shown_ == nullptr) {
+        shown_ = section.parsed.get();
+        continue;
+      }
+      if (!copy_) copy_.reset(RavelCSafeSection::Copy(*shown_->GetTable()));
+      if (copy_) RavelCSafeSection::Join(*copy_, *section.parsed->GetTable());
+    }
+  }
+  bool Empty() const { return shown_ == nullptr; }
+  void Show() {
+    if (copy_) {
+      copy_->Show();
+    } else if (shown_ != nullptr) {
+      shown_->Show();
+    }
+  }
+
+  std::string refused;
+
+ private:
+  RavelCSafeSection* shown_ = nullptr;
+  std::unique_ptr<RavelCTableBase> copy_;
+};
+
 }  // namespace
 
 void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out) {
@@ -58,35 +91,18 @@ void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceO
     const TableEntry& table = *entry;
     if (!filter.Accepts(table.kind, table.tableId)) continue;
     std::string line = Describe(table);
-    std::unique_ptr<TableObject> joined;
-    std::string refused;
+    std::unique_ptr<JoinedTable> joined;
     {
       TraceOutput::QuietScope quiet(trace);
-      for (const auto& kv : table.sections) {
-        const StoredSection& section = kv.second;
-        if (section.parseResult != 0) {
-          refused += ", section " + std::to_string(kv.first) + " refused by the library (" +
-                     std::to_string(section.parseResult) + ")";
-          continue;
-        }
-        std::unique_ptr<TableObject> object = MakeTableObject(table.kind);
-        if (!object) break;
-        ParseBuffer buffer(section.bytes);
-        object->Parse(buffer.Section());
-        if (!joined) {
-          joined = std::move(object);
-        } else {
-          joined->Join(*object);
-        }
-      }
+      joined.reset(new JoinedTable(table));
     }
-    line += refused;
-    if (!joined && refused.empty()) line += " (no parser for this table)";
+    line += joined->refused;
+    if (joined->Empty() && joined->refused.empty()) line += " (no class in the library for this table_id)";
     // The tool's own line starts on a line of its own, even after a dump
     // whose last line was left open.
     if (!trace.ShowEndedLine()) std::fputc('\n', out);
     std::fprintf(out, "%s\n", line.c_str());
-    if (joined) {
+    if (!joined->Empty()) {
       TraceOutput::ShowScope show(trace, out);
       joined->Show();
     }

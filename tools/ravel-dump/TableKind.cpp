@@ -7,30 +7,10 @@
 namespace ravel_dump {
 namespace {
 
-struct KindInfo {
-  TableKind kind;
-  const char* name;
-  const char* word;
-};
-
-const KindInfo kKinds[] = {
-    {TableKind::kPat, "PAT", "pat"},
-    {TableKind::kCat, "CAT", "cat"},
-    {TableKind::kPmt, "PMT", "pmt"},
-    {TableKind::kNit, "NIT", "nit"},
-    {TableKind::kSdt, "SDT", "sdt"},
-    {TableKind::kEitPf, "EIT p/f", "eit-pf"},
-    {TableKind::kEitSchedule, "EIT schedule", "eit-schedule"},
-    {TableKind::kTdt, "TDT", "tdt"},
-    {TableKind::kTot, "TOT", "tot"},
-    {TableKind::kBit, "BIT", "bit"},
-    {TableKind::kAit, "AIT", "ait"},
-    {TableKind::kDsi, "DSI", "dsi"},
-    {TableKind::kDii, "DII", "dii"},
-    {TableKind::kDdb, "DDB", "ddb"},
-    {TableKind::kDsmccOther, "DSM-CC other", "dsmcc-other"},
-    {TableKind::kStreamDescriptors, "stream descriptors", "stream-events"},
-    {TableKind::kOther, "other", "other"},
+// By kind, in the library's order.
+const char* const kKindWords[kRavelKindCount] = {
+    "pat", "cat", "pmt", "nit", "sdt", "eit-pf", "eit-schedule", "tdt", "tot", "bit", "ait",
+    "dsi", "dii", "ddb", "dsmcc-other", "stream-events", "other",
 };
 
 std::string Lower(std::string text) {
@@ -41,75 +21,7 @@ std::string Lower(std::string text) {
 
 }  // namespace
 
-TableKind KindOfSection(const uint8_t* section, std::size_t size) {
-  uint8_t tableId = section[0];
-  switch (tableId) {
-    case 0x00:
-      return TableKind::kPat;
-    case 0x01:
-      return TableKind::kCat;
-    case 0x02:
-      return TableKind::kPmt;
-    case 0x40:
-    case 0x41:
-      return TableKind::kNit;
-    case 0x42:
-    case 0x46:
-      return TableKind::kSdt;
-    case 0x4E:
-    case 0x4F:
-      return TableKind::kEitPf;
-    case 0x70:
-      return TableKind::kTdt;
-    case 0x73:
-      return TableKind::kTot;
-    case 0x74:
-      return TableKind::kAit;
-    case 0xC4:
-      return TableKind::kBit;
-    case 0x3B:
-    case 0x3C: {
-      if (size < 12) return TableKind::kDsmccOther;
-      unsigned int messageId = (section[10] << 8) | section[11];
-      if (messageId == 0x1006) return TableKind::kDsi;
-      if (messageId == 0x1002) return TableKind::kDii;
-      if (messageId == 0x1003) return TableKind::kDdb;
-      return TableKind::kDsmccOther;
-    }
-    case 0x3D:
-      return TableKind::kStreamDescriptors;
-    default:
-      break;
-  }
-  if (tableId >= 0x50 && tableId <= 0x6F) return TableKind::kEitSchedule;
-  return TableKind::kOther;
-}
-
-const char* KindName(TableKind kind) {
-  for (const KindInfo& info : kKinds)
-    if (info.kind == kind) return info.name;
-  return "?";
-}
-
-const char* KindWord(TableKind kind) {
-  for (const KindInfo& info : kKinds)
-    if (info.kind == kind) return info.word;
-  return "?";
-}
-
-bool KindJoinsSections(TableKind kind) {
-  switch (kind) {
-    case TableKind::kPmt:
-    case TableKind::kNit:
-    case TableKind::kSdt:
-    case TableKind::kEitPf:
-    case TableKind::kEitSchedule:
-    case TableKind::kBit:
-      return true;
-    default:
-      return false;
-  }
-}
+const char* KindWord(TableKind kind) { return kind >= 0 && kind < kRavelKindCount ? kKindWords[kind] : "?"; }
 
 bool ParseNumber(const std::string& text, unsigned long max, unsigned long& value) {
   if (text.empty()) return false;
@@ -141,20 +53,19 @@ bool TableFilter::Parse(const std::string& list, std::string& error) {
       continue;
     }
     if (word == "eit") {
-      kinds_.push_back(TableKind::kEitPf);
-      kinds_.push_back(TableKind::kEitSchedule);
+      kinds_.push_back(kRavelKindEITPresentFollowing);
+      kinds_.push_back(kRavelKindEITSchedule);
       continue;
     }
     if (word == "dsmcc") {
-      for (TableKind k : {TableKind::kDsi, TableKind::kDii, TableKind::kDdb, TableKind::kDsmccOther,
-                          TableKind::kStreamDescriptors})
+      for (TableKind k : {kRavelKindDSI, kRavelKindDII, kRavelKindDDB, kRavelKindDsmccOther, kRavelKindStreamEvents})
         kinds_.push_back(k);
       continue;
     }
     bool known = false;
-    for (const KindInfo& info : kKinds) {
-      if (word == info.word) {
-        kinds_.push_back(info.kind);
+    for (int kind = 0; kind < kRavelKindCount; ++kind) {
+      if (word == kKindWords[kind]) {
+        kinds_.push_back(static_cast<TableKind>(kind));
         known = true;
       }
     }

@@ -1,5 +1,6 @@
-// The kinds of table the tool tells apart, chosen by table_id (and, for the
-// DSM-CC download messages, by the message id), with their short names.
+// The kinds of table the tool tells apart are the library's (its table of
+// tables chooses them by table_id and DSM-CC message id); here only the words
+// the --table option takes for them.
 #ifndef RAVEL_DUMP_TABLEKIND_H
 #define RAVEL_DUMP_TABLEKIND_H
 
@@ -8,40 +9,14 @@
 #include <string>
 #include <vector>
 
+#include "Ravel_CSafeSection.h"
+
 namespace ravel_dump {
 
-enum class TableKind {
-  kPat,
-  kCat,
-  kPmt,
-  kNit,
-  kSdt,
-  kEitPf,
-  kEitSchedule,
-  kTdt,
-  kTot,
-  kBit,
-  kAit,
-  kDsi,
-  kDii,
-  kDdb,
-  kDsmccOther,
-  kStreamDescriptors,
-  kOther,
-  kCount
-};
+typedef RavelTableKind TableKind;
 
-// Kind of the section starting at `section` (at least 20 bytes are read only
-// for the DSM-CC sections, whose structure has been checked before).
-TableKind KindOfSection(const uint8_t* section, std::size_t size);
-// "PAT", "EIT p/f", "DII" ...
-const char* KindName(TableKind kind);
 // "pat", "eit-pf", "dii" ...: the words accepted by --table.
 const char* KindWord(TableKind kind);
-
-// Whether the kind's sections of one table are joined with the table's own
-// operator+= (PMT, NIT, SDT, EIT, BIT); the others stand alone per section.
-bool KindJoinsSections(TableKind kind);
 
 // The --table filter: kinds and/or raw table_ids. Empty means everything.
 class TableFilter {

@@ -1,10 +1,10 @@
 #include "TableRegistry.h"
 
-#include "SectionCheck.h"
-
 #include <algorithm>
 #include <cstring>
 #include <set>
+
+#include "Ravel_ByteOrder.h"
 
 namespace ravel_dump {
 
@@ -19,20 +19,13 @@ uint64_t HashBytes(const uint8_t* data, std::size_t size) {
 
 namespace {
 
-uint32_t ReadCrcField(const uint8_t* section, std::size_t size) {
-  const uint8_t* crc = section + size - 4;
-  return (static_cast<uint32_t>(crc[0]) << 24) | (crc[1] << 16) | (crc[2] << 8) | crc[3];
-}
-
-bool IsEit(TableKind kind) { return kind == TableKind::kEitPf || kind == TableKind::kEitSchedule; }
-
 // Section numbers a table announces. EIT sections are numbered by segments of
 // eight (ETSI EN 300 468 5.2.4): a segment runs from its first number to the
 // segment_last_section_number its sections carry; a segment not seen yet is
 // expected to bring at least its first section.
 std::set<unsigned int> Announced(const TableEntry& table) {
   std::set<unsigned int> numbers;
-  if (!IsEit(table.kind)) {
+  if (!RavelCSafeSection::IsSegmented(table.tableId)) {
     for (unsigned int n = 0; n <= table.lastSectionNumber; ++n) numbers.insert(n);
     return numbers;
   }
@@ -40,8 +33,10 @@ std::set<unsigned int> Announced(const TableEntry& table) {
     unsigned int first = segment * 8;
     unsigned int last = first;
     for (const auto& kv : table.sections) {
-      if (kv.first / 8 == segment && kv.second.bytes.size() > 12) {
-        last = std::max<unsigned int>(last, kv.second.bytes[12]);
+      RavelSectionHeader header;
+      if (kv.first / 8 == segment &&
+          RavelCSafeSection::ReadHeader(kv.second.Bytes(), static_cast<int>(kv.second.Size()), header)) {
+        last = std::max<unsigned int>(last, header.iSegmentLastSectionNumber);
       }
     }
     last = std::min<unsigned int>({last, first + 7, table.lastSectionNumber});
@@ -52,11 +47,24 @@ std::set<unsigned int> Announced(const TableEntry& table) {
 
 }  // namespace
 
+std::size_t TableRegistry::KeyHash::operator()(const Key& key) const {
+  const uint64_t fields[] = {static_cast<uint64_t>(std::get<0>(key)), static_cast<uint64_t>(std::get<1>(key)),
+                             static_cast<uint64_t>(std::get<2>(key)), static_cast<uint64_t>(std::get<3>(key)),
+                             std::get<4>(key),                        static_cast<uint64_t>(std::get<5>(key)),
+                             std::get<6>(key)};
+  uint64_t hash = 0;
+  for (uint64_t field : fields) {
+    hash = (hash ^ field) * 0x9E3779B97F4A7C15ull;  // multiply and fold: a word at a time
+    hash ^= hash >> 29;
+  }
+  return static_cast<std::size_t>(hash);
+}
+
 bool TableEntry::Complete() const { return Missing().empty(); }
 
 std::vector<unsigned int> TableEntry::Missing() const {
   std::vector<unsigned int> missing;
-  if (!KindJoinsSections(kind)) return missing;
+  if (!RavelCSafeSection::JoinsSections(tableId)) return missing;
   for (unsigned int n : Announced(*this))
     if (sections.find(n) == sections.end()) missing.push_back(n);
   return missing;
@@ -72,44 +80,40 @@ uint64_t TableEntry::TimesSeen() const {
   return times;
 }
 
-TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, const uint8_t* section) {
+TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header) {
   std::unique_ptr<TableEntry> entry(new TableEntry);
   entry->order = tables_.size();
   entry->pid = pid;
   entry->kind = kind;
-  entry->tableId = section[0];
-  bool longForm = (section[1] & 0x80) != 0;
-  if (longForm) {
-    entry->extension = static_cast<uint16_t>((section[3] << 8) | section[4]);
-    entry->version = static_cast<uint8_t>((section[5] >> 1) & 0x1F);
-    entry->lastSectionNumber = section[7];
-  }
+  entry->tableId = header.iTableId;
+  entry->longForm = header.bLongForm;
+  entry->extension = header.iTableIdExtension;
+  entry->version = header.iVersionNumber;
+  entry->lastSectionNumber = header.iLastSectionNumber;
   entry->firstSeen = arrivals_;
   latest_[key] = tables_.size();
   tables_.push_back(std::move(entry));
   return tables_.back().get();
 }
 
-TableRegistry::Place TableRegistry::Locate(int pid, TableKind kind, const uint8_t* section,
+TableRegistry::Place TableRegistry::Locate(int pid, const uint8_t* section,
                                            std::size_t size) const {
   Place place;
   // A section with a CRC_32 is told apart by its size and CRC, confirmed byte
   // for byte against the stored copy; a short section without one by a hash.
-  place.identity = SectionHasCrc(section) && size >= 4
-                       ? (static_cast<uint64_t>(size) << 32) | ReadCrcField(section, size)
+  place.identity = RavelCSafeSection::CarriesCrc(section) && size >= 4
+                       ? (static_cast<uint64_t>(size) << 32) | RavelRead32(section + size - 4)
                        : HashBytes(section, size);
-  bool longForm = size >= 8 && (section[1] & 0x80) != 0;
-  int extension = longForm ? ((section[3] << 8) | section[4]) : -1;
-  int version = longForm ? ((section[5] >> 1) & 0x1F) : -1;
-  place.number = longForm ? section[6] : 0;
-  if (longForm && KindJoinsSections(kind)) {
-    // Stream ids of the body tell apart EIT sub-tables and SDTs of other streams.
-    uint32_t extra = 0;
-    if (IsEit(kind) && size >= 12) extra = (section[8] << 24) | (section[9] << 16) | (section[10] << 8) | section[11];
-    if (kind == TableKind::kSdt && size >= 10) extra = (section[8] << 8) | section[9];
-    place.key = Key(pid, section[0], extension, version, extra, section[7], 0);
+  RavelSectionHeader header;
+  RavelCSafeSection::ReadHeader(section, static_cast<int>(size), header);
+  place.header = header;
+  place.number = header.iSectionNumber;
+  const int extension = header.bLongForm ? header.iTableIdExtension : -1;
+  const int version = header.bLongForm ? header.iVersionNumber : -1;
+  if (header.bLongForm && RavelCSafeSection::JoinsSections(header.iTableId)) {
+    place.key = Key(pid, header.iTableId, extension, version, header.iStreamIds, header.iLastSectionNumber, 0);
   } else {
-    place.key = Key(pid, section[0], extension, version, 0, static_cast<int>(place.number), place.identity);
+    place.key = Key(pid, header.iTableId, extension, version, 0, static_cast<int>(place.number), place.identity);
   }
   auto found = latest_.find(place.key);
   if (found == latest_.end()) return place;
@@ -117,8 +121,8 @@ TableRegistry::Place TableRegistry::Locate(int pid, TableKind kind, const uint8_
   auto slot = place.table->sections.find(place.number);
   if (slot != place.table->sections.end()) {
     const StoredSection& stored = slot->second;
-    place.same = stored.hash == place.identity && stored.bytes.size() == size &&
-                 std::memcmp(stored.bytes.data(), section, size) == 0;
+    place.same = stored.hash == place.identity && stored.Size() == size &&
+                 std::memcmp(stored.Bytes(), section, size) == 0;
     // Same table and section number, other contents (sent without a version
     // change): a table of its own from here on.
     if (!place.same) place.table = nullptr;
@@ -126,8 +130,8 @@ TableRegistry::Place TableRegistry::Locate(int pid, TableKind kind, const uint8_
   return place;
 }
 
-bool TableRegistry::CountRepeat(int pid, TableKind kind, const uint8_t* section, std::size_t size) {
-  Place place = Locate(pid, kind, section, size);
+bool TableRegistry::CountRepeat(int pid, const uint8_t* section, std::size_t size) {
+  Place place = Locate(pid, section, size);
   if (!place.same) return false;
   ++arrivals_;
   place.table->lastSeen = arrivals_;
@@ -135,19 +139,20 @@ bool TableRegistry::CountRepeat(int pid, TableKind kind, const uint8_t* section,
   return true;
 }
 
-StoredSection* TableRegistry::Add(int pid, TableKind kind, const uint8_t* section, std::size_t size) {
+StoredSection& TableRegistry::Add(int pid, TableKind kind, std::unique_ptr<RavelCSafeSection> parsed,
+                                  RavelSafeResult result) {
   ++arrivals_;
-  Place place = Locate(pid, kind, section, size);
+  Place place = Locate(pid, parsed->GetData(), static_cast<std::size_t>(parsed->GetDataSize()));
   TableEntry* table = place.table;
-  if (table == nullptr) table = NewEntry(place.key, pid, kind, section);
+  if (table == nullptr) table = NewEntry(place.key, pid, kind, place.header);
   table->lastSeen = arrivals_;
 
   StoredSection& stored = table->sections[place.number];
-  ++stored.seen;
-  if (stored.seen > 1) return nullptr;
-  stored.bytes.assign(section, section + size);
+  stored.seen = 1;
+  stored.parsed = std::move(parsed);
+  stored.result = result;
   stored.hash = place.identity;
-  return &stored;
+  return stored;
 }
 
 }  // namespace ravel_dump

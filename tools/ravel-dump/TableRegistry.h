@@ -3,6 +3,8 @@
 // once more. Sections of one table (same PID, table_id, table id extension,
 // version and, for the EIT and SDT, the stream ids of the body) are gathered
 // by section number so that they can be joined with the table's operator+=.
+// Each distinct section is kept as the library's safe entry gave it: its bytes
+// and the object its one parse made, which every output then uses.
 #ifndef RAVEL_DUMP_TABLEREGISTRY_H
 #define RAVEL_DUMP_TABLEREGISTRY_H
 
@@ -11,8 +13,10 @@
 #include <map>
 #include <memory>
 #include <tuple>
+#include <unordered_map>
 #include <vector>
 
+#include "Ravel_CSafeSection.h"
 #include "TableKind.h"
 
 namespace ravel_dump {
@@ -21,17 +25,23 @@ namespace ravel_dump {
 const int kNoPid = -1;
 
 struct StoredSection {
-  std::vector<uint8_t> bytes;
+  std::unique_ptr<RavelCSafeSection> parsed;  // the checked bytes and the parsed object
+  RavelSafeResult result = kRavelSafeOk;      // kRavelSafeOk, kRavelSafeRefused or kRavelSafeUnknownTable
   uint64_t hash = 0;  // content identity: size and CRC_32, or a hash of the bytes
   uint64_t seen = 0;
-  int parseResult = 0;  // what the library's parse gave when it first arrived
+
+  const uint8_t* Bytes() const { return parsed->GetData(); }
+  std::size_t Size() const { return static_cast<std::size_t>(parsed->GetDataSize()); }
+  // Whether the library made an object of it.
+  bool Parsed() const { return result == kRavelSafeOk; }
 };
 
 struct TableEntry {
   std::size_t order = 0;
   int pid = kNoPid;
-  TableKind kind = TableKind::kOther;
+  TableKind kind = kRavelKindOther;
   uint8_t tableId = 0;
+  bool longForm = false;
   uint16_t extension = 0;
   uint8_t version = 0;
   uint8_t lastSectionNumber = 0;
@@ -53,10 +63,9 @@ class TableRegistry {
   // A section identical to one already stored for its table is counted as
   // seen once more: true. Such a section passed every check when it was stored,
   // so a repeat needs none of them again.
-  bool CountRepeat(int pid, TableKind kind, const uint8_t* section, std::size_t size);
-  // Records a checked section of `size` bytes. Gives the stored section when
-  // it is new (the first copy of these bytes for its table), null for a repeat.
-  StoredSection* Add(int pid, TableKind kind, const uint8_t* section, std::size_t size);
+  bool CountRepeat(int pid, const uint8_t* section, std::size_t size);
+  // Keeps a section that is not a repeat, as the safe entry checked and parsed it.
+  StoredSection& Add(int pid, TableKind kind, std::unique_ptr<RavelCSafeSection> parsed, RavelSafeResult result);
 
   const std::vector<std::unique_ptr<TableEntry>>& Tables() const { return tables_; }
   uint64_t SectionsAdded() const { return arrivals_; }
@@ -69,16 +78,21 @@ class TableRegistry {
   // bytes are stored there already.
   struct Place {
     Key key;
+    RavelSectionHeader header;
     unsigned int number = 0;
     uint64_t identity = 0;
     TableEntry* table = nullptr;
     bool same = false;
   };
-  Place Locate(int pid, TableKind kind, const uint8_t* section, std::size_t size) const;
-  TableEntry* NewEntry(const Key& key, int pid, TableKind kind, const uint8_t* section);
+  Place Locate(int pid, const uint8_t* section, std::size_t size) const;
+  TableEntry* NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header);
 
   std::vector<std::unique_ptr<TableEntry>> tables_;
-  std::map<Key, std::size_t> latest_;
+  // Looked up for every section that arrives, repeats included.
+  struct KeyHash {
+    std::size_t operator()(const Key& key) const;
+  };
+  std::unordered_map<Key, std::size_t, KeyHash> latest_;
   uint64_t arrivals_ = 0;
 };
 
