@@ -4,7 +4,8 @@
 
 #include "PacketReader.h"
 #include "Ravel_ByteOrder.h"
-#include "SectionCheck.h"
+#include "Ravel_CSafeSection.h"
+#include "Ravel_Util.h"
 
 namespace ravel_dump {
 namespace {
@@ -31,8 +32,8 @@ bool LooksLikeRawSections(const uint8_t* head, std::size_t size, bool whole) {
     std::size_t sectionSize = static_cast<std::size_t>(RavelSectionSize(head + pos));
     // A section cut by the end of what was looked at is judged by those before it.
     if (sectionSize > size - pos) return !whole && crcsVerified > 0;
-    if (SectionHasCrc(head + pos)) {
-      if (sectionSize < 4 || !SectionCrcOk(head + pos, sectionSize)) return false;
+    if (RavelCSafeSection::CarriesCrc(head + pos)) {
+      if (sectionSize < 7 || RavelUtil_CheckSectionCRC32(head + pos) == 0) return false;
       ++crcsVerified;
     }
     ++checked;
