@@ -2,7 +2,7 @@
 # Installs what the build needs from the system's packages, where it can.
 set -euo pipefail
 
-packages=(cmake g++ make libgtest-dev libgmock-dev nlohmann-json3-dev libcxxopts-dev)
+packages=(cmake g++ make libgtest-dev libgmock-dev nlohmann-json3-dev libcxxopts-dev zlib1g-dev)
 [ "${RAVEL_WITH_BENCH:-0}" = 1 ] && packages+=(libbenchmark-dev libdvbpsi-dev)
 [ "${RAVEL_WITH_SANITIZERS:-0}" = 1 ] && packages+=(clang libclang-rt-14-dev)
 [ "${RAVEL_WITH_CROSS:-0}" = 1 ] && packages+=(g++-arm-linux-gnueabihf g++-aarch64-linux-gnu qemu-user)

@@ -4,6 +4,7 @@
 #include "ParseBuffer.h"
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
+#include "Ravel_CDsmccDSI.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTablePMT.h"
 
@@ -43,10 +44,13 @@ void FollowPmt(RavelCPMT& pmt, Demux* demux) {
 }
 
 // The DII lists the modules of a download with their sizes and versions.
-int ListModules(int pid, unsigned char* message, CarouselCollector& carousel) {
+int ListModules(int pid, unsigned char* message, std::size_t messageSize, CarouselCollector& carousel) {
   RavelCDsmccDII dii(nullptr);
   int result = dii.ParseRawData(message);
   if (result != 0) return result;
+  // The library keeps the ARIB compression descriptor only; the object
+  // carousel's one sits deeper in the module info, read here from the bytes.
+  std::vector<ModuleCompression> compressions = DiiModuleCompressions(message, messageSize);
   std::vector<ModuleListing> modules;
   for (int i = 0; i < dii.cModuleInfos.iCount; ++i) {
     const RavelCModuleInfo* info = dii.cModuleInfos.ipArray[i];
@@ -55,10 +59,23 @@ int ListModules(int pid, unsigned char* message, CarouselCollector& carousel) {
     module.size = info->iModuleSize;
     module.version = info->iModuleVersion;
     if (info->pNameDescriptor != nullptr) module.name = info->pNameDescriptor->GetFileName();
+    if (static_cast<std::size_t>(i) < compressions.size()) module.compression = compressions[static_cast<std::size_t>(i)];
     modules.push_back(module);
   }
   carousel.AddModuleList(pid, dii.iDownloadId, dii.iBlockSize, modules);
   return 0;
+}
+
+// A DSI's private data is the IOR of the object carousel's service gateway.
+int NameServiceGateway(int pid, unsigned char* message, std::size_t messageSize, CarouselCollector& carousel) {
+  RavelCDsmccDSI dsi(nullptr);
+  int result = dsi.ParseRawData(message);
+  if (result != 0 || dsi.pPrivateData == nullptr || dsi.iPrivateDataLength <= 0) return result;
+  const std::size_t offset = static_cast<std::size_t>(dsi.pPrivateData - message);
+  const std::size_t length = static_cast<std::size_t>(dsi.iPrivateDataLength);
+  if (offset > messageSize || messageSize - offset < length) return result;  // declared past the message
+  carousel.AddServiceGateway(pid, std::vector<uint8_t>(dsi.pPrivateData, dsi.pPrivateData + length));
+  return result;
 }
 
 // A DDB carries one block of a module; its header's transaction id is the downloadId.
@@ -88,7 +105,12 @@ int ParseOnArrival(int pid, TableKind kind, const uint8_t* section, std::size_t 
     if (result == 0) FollowPmt(pmt, demux);
     return result;
   }
-  if (kind == TableKind::kDii) return ListModules(pid, buffer.Message(), carousel);
+  // The DSM-CC message: the section less its 8-byte header and its CRC.
+  const std::size_t messageSize = size >= 12 ? size - 12 : 0;
+  if (kind == TableKind::kDsi && buffer.Message() != nullptr) {
+    return NameServiceGateway(pid, buffer.Message(), messageSize, carousel);
+  }
+  if (kind == TableKind::kDii) return ListModules(pid, buffer.Message(), messageSize, carousel);
   if (kind == TableKind::kDdb) return KeepBlock(pid, buffer.Message(), carousel);
   std::unique_ptr<TableObject> object = MakeTableObject(kind);
   return object ? object->Parse(buffer.Section()) : 0;

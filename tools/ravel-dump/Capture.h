@@ -2,7 +2,7 @@
 // demultiplexer (or from a file of raw sections) is checked, counted, kept
 // once in the table registry, and used at once where a receiver would use it:
 // a PAT or a PMT names more section PIDs, DII and DDB messages feed the
-// carousel collector.
+// carousel collector, whose complete modules build the object carousels.
 #ifndef RAVEL_DUMP_CAPTURE_H
 #define RAVEL_DUMP_CAPTURE_H
 
@@ -11,6 +11,7 @@
 
 #include "Carousel.h"
 #include "Demux.h"
+#include "ObjectCarousel.h"
 #include "Stats.h"
 #include "TableRegistry.h"
 
@@ -27,12 +28,15 @@ class Capture : public SectionSink {
 
   const TableRegistry& Registry() const { return registry_; }
   const CarouselCollector& Carousel() const { return carousel_; }
+  ObjectCarousels& Objects() { return objects_; }
+  const ObjectCarousels& Objects() const { return objects_; }
 
  private:
   Stats& stats_;
   Demux* demux_;
   TableRegistry registry_;
   CarouselCollector carousel_;
+  ObjectCarousels objects_;
 };
 
 // The library's parse of a section when it first arrives, as a receiver uses

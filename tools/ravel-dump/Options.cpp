@@ -61,6 +61,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       ("j,json", "Print the summary as JSON")
       ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
        cxxopts::value<std::string>(), "DIR")
+      ("extract-files", "Rebuild the object carousel's directories and files under DIR, each file as soon as "
+       "its module is complete", cxxopts::value<std::string>(), "DIR")
       ("sections", "The input is a file of concatenated raw sections, not a transport stream")
       ("standard", "Broadcast standard for ratings and regions: brazil or japan",
        cxxopts::value<std::string>(), "NAME")
@@ -111,6 +113,14 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       options.extractDirectory = result["extract-modules"].as<std::string>();
       if (options.extractDirectory.empty()) {
         error = "--extract-modules needs a directory";
+        return ParseOutcome::kUsageError;
+      }
+      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+    }
+    if (result.count("extract-files")) {
+      options.filesDirectory = result["extract-files"].as<std::string>();
+      if (options.filesDirectory.empty()) {
+        error = "--extract-files needs a directory";
         return ParseOutcome::kUsageError;
       }
       if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;

@@ -16,6 +16,7 @@ struct Options {
   bool sections = false;         // the input is concatenated raw sections
   OutputMode mode = OutputMode::kDump;
   std::string extractDirectory;  // --extract-modules
+  std::string filesDirectory;    // --extract-files
   int standard = -1;             // -1: the library's default
   std::vector<int> pids;         // --pid: read only these, all as section PIDs
   TableFilter tables;            // --table
