@@ -250,13 +250,18 @@ TEST_F(ObjectCarouselTest, HostileNamesAndKeysAreReportedAndNothingIsWrittenOuts
 TEST_F(ObjectCarouselTest, FileIsWrittenAgainWhenItsModuleVersionChanges) {
   std::vector<Bytes> sections = {DsiSection(Ior("srg", 1, "r"))};
   auto gateway = DirectoryMessage("r", "srg", {Binding("a.txt", "fil", FileAt("a")),
-                                               Binding("later.txt", "fil", FileAt("l", 2))});
-  for (const Bytes& s : ModuleSections({{1, 1, {gateway, FileMessage("a", "first")}}, {2, 1, {FileMessage("l", "x")}}})) {
+                                               Binding("later.txt", "fil", FileAt("l", 2)),
+                                               Binding("video", "str", Ior("str", 1, "v"))});
+  const Bytes stream = BiopMessage("v", "str", Bytes(9, 0));  // listed, not written
+  for (const Bytes& s : ModuleSections({{1, 1, {gateway, FileMessage("a", "first"), stream}},
+                                        {2, 1, {FileMessage("l", "x")}}})) {
     // Module 2 never completes: none of its blocks (table_id_extension 2) is sent.
     const bool blockOfModule2 = s[0] == 0x3C && s[3] == 0x00 && s[4] == 0x02;
     if (!blockOfModule2) sections.push_back(s);
   }
-  for (const Bytes& s : ModuleSections({{1, 2, {gateway, FileMessage("a", "second, longer")}}})) sections.push_back(s);
+  for (const Bytes& s : ModuleSections({{1, 2, {gateway, FileMessage("a", "second, longer"), stream}}})) {
+    sections.push_back(s);
+  }
   sb::PacketWriter writer(kCarouselPid);
   for (const Bytes& s : sections) writer.AddSection(s);
   const std::string out = Path("files");
@@ -265,10 +270,12 @@ TEST_F(ObjectCarouselTest, FileIsWrittenAgainWhenItsModuleVersionChanges) {
   EXPECT_EQ("second, longer", ReadFile(out + "/a.txt"));
   EXPECT_EQ((std::set<std::string>{"a.txt"}), TreeBelow(out));
   const nlohmann::json entries = nlohmann::json::parse(run.out)["object_carousels"][0]["entries"];
-  ASSERT_EQ(3u, entries.size()) << entries.dump();
+  ASSERT_EQ(4u, entries.size()) << entries.dump();
   ExpectMembers({{"path", "/a.txt"}, {"size", 14}, {"module", 1}, {"version", 2}, {"complete", true}}, entries[1]);
   ExpectMembers({{"path", "/later.txt"}, {"module", 2}, {"version", nullptr}, {"complete", false}, {"file", nullptr}},
                 entries[2]);
+  ExpectMembers({{"path", "/video"}, {"kind", "stream"}, {"size", 9}, {"complete", true}, {"file", nullptr}},
+                entries[3]);
 }
 
 TEST_F(ObjectCarouselTest, GingaEntryFileIsLookedUpInTheTree) {

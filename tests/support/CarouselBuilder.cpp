@@ -58,23 +58,19 @@ Bytes Binding(const std::string& name, const std::string& kind, const Bytes& ior
   return Cat({U8(1), U8(id.size()), id, U8(kindBytes.size()), kindBytes, U8(1), ior, U16(0)});
 }
 
-namespace {
-
-Bytes Message(const std::string& key, const std::string& kind, const Bytes& body) {
+Bytes BiopMessage(const std::string& key, const std::string& kind, const Bytes& body) {
   Bytes kindBytes = Cat({sb::Text(kind), U8(0)});
   Bytes rest = Cat({U8(key.size()), sb::Text(key), U32(kindBytes.size()), kindBytes, U16(0), U8(0),
                     U32(body.size()), body});
   return Cat({sb::Text("BIOP"), U8(1), U8(0), U8(0), U8(0), U32(rest.size()), rest});
 }
 
-}  // namespace
-
 Bytes DirectoryMessage(const std::string& key, const std::string& kind, const std::vector<Bytes>& bindings) {
-  return Message(key, kind, Cat({U16(bindings.size()), Cat(bindings)}));
+  return BiopMessage(key, kind, Cat({U16(bindings.size()), Cat(bindings)}));
 }
 
 Bytes FileMessage(const std::string& key, const std::string& content) {
-  return Message(key, "fil", Cat({U32(content.size()), sb::Text(content)}));
+  return BiopMessage(key, "fil", Cat({U32(content.size()), sb::Text(content)}));
 }
 
 Bytes ObjectModuleInfo(bool compressed, uint32_t originalSize) {

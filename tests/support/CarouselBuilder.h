@@ -37,6 +37,8 @@ Bytes Binding(const std::string& name, const std::string& kind, const Bytes& ior
 // A service gateway ("srg") or directory ("dir") message with its bindings.
 Bytes DirectoryMessage(const std::string& key, const std::string& kind, const std::vector<Bytes>& bindings);
 Bytes FileMessage(const std::string& key, const std::string& content);
+// Any BIOP 1.0 message: key, kind, empty object info and context list, body.
+Bytes BiopMessage(const std::string& key, const std::string& kind, const Bytes& body);
 
 // BIOP::ModuleInfo whose user info holds a compressed module descriptor
 // (0x09) declaring `originalSize`, or none when `compressed` is false.

@@ -1,13 +1,8 @@
 #include "Carousel.h"
 
-#include <cerrno>
 #include <cstdio>
-#include <cstring>
-#include <filesystem>
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
+#include "FileTree.h"
 
 namespace ravel_dump {
 namespace {
@@ -21,42 +16,6 @@ std::size_t ExpectedBlockLength(uint32_t size, uint16_t blockSize, unsigned int 
   uint64_t offset = static_cast<uint64_t>(number) * blockSize;
   uint64_t rest = size - offset;
   return static_cast<std::size_t>(rest < blockSize ? rest : blockSize);
-}
-
-// Writes `bytes` to `path` through a temporary file in the same directory.
-bool WriteAtomically(const std::string& directory, const std::string& name, const std::vector<uint8_t>& bytes,
-                     std::string& error) {
-  std::string final = directory + "/" + name;
-  std::string temp = directory + "/." + name + ".XXXXXX";
-  std::vector<char> pattern(temp.begin(), temp.end());
-  pattern.push_back('\0');
-  int fd = mkstemp(pattern.data());
-  if (fd < 0) {
-    error = "cannot write in " + directory + ": " + std::strerror(errno);
-    return false;
-  }
-  std::size_t done = 0;
-  while (done < bytes.size()) {
-    ssize_t n = write(fd, bytes.data() + done, bytes.size() - done);
-    if (n < 0 && errno == EINTR) continue;
-    if (n <= 0) {
-      error = "cannot write " + final + ": " + std::strerror(errno);
-      close(fd);
-      unlink(pattern.data());
-      return false;
-    }
-    done += static_cast<std::size_t>(n);
-  }
-  // Readable like any file the user creates.
-  mode_t mask = umask(0);
-  umask(mask);
-  fchmod(fd, 0666 & ~mask);
-  if (close(fd) != 0 || rename(pattern.data(), final.c_str()) != 0) {
-    error = "cannot write " + final + ": " + std::strerror(errno);
-    unlink(pattern.data());
-    return false;
-  }
-  return true;
 }
 
 }  // namespace
@@ -197,12 +156,8 @@ std::vector<CarouselSummary> CarouselCollector::Summarize() const {
 
 bool CarouselCollector::WriteModules(const std::string& directory, std::vector<CarouselSummary>& carousels,
                                      std::string& error) const {
-  std::error_code code;
-  std::filesystem::create_directories(directory, code);
-  if (code || !std::filesystem::is_directory(directory)) {
-    error = directory + ": cannot make the module directory" + (code ? ": " + code.message() : std::string());
-    return false;
-  }
+  FileTreeWriter writer;
+  if (!writer.Open(directory, "module", error)) return false;
   for (CarouselSummary& carousel : carousels) {
     for (ModuleSummary& module : carousel.modules) {
       if (!module.complete) continue;
@@ -215,7 +170,10 @@ bool CarouselCollector::WriteModules(const std::string& directory, std::vector<C
       // A module that does not inflate as declared is reported, not written.
       if (!ModuleContent(ref, bytes, module.problem)) continue;
       std::string name = ModuleFileName(carousel.pid, carousel.downloadId, module.id, module.version);
-      if (!WriteAtomically(directory, name, bytes, error)) return false;
+      if (!writer.WriteFile({name}, bytes.data(), bytes.size(), error)) {
+        error = directory + error;
+        return false;
+      }
       module.file = directory + "/" + name;
     }
   }

@@ -38,12 +38,12 @@ FileTreeWriter::~FileTreeWriter() {
   if (root_ >= 0) close(root_);
 }
 
-bool FileTreeWriter::Open(const std::string& directory, std::string& error) {
+bool FileTreeWriter::Open(const std::string& directory, const char* purpose, std::string& error) {
   std::error_code code;
   std::filesystem::create_directories(directory, code);
   root_ = code ? -1 : open(directory.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
   if (root_ < 0) {
-    error = directory + ": cannot make the file directory" + (code ? ": " + code.message() : ": " + std::string(std::strerror(errno)));
+    error = directory + ": cannot make the " + purpose + " directory: " + (code ? code.message() : std::strerror(errno));
     return false;
   }
   rootPath_ = directory;

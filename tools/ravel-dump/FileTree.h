@@ -24,14 +24,16 @@ class FileTreeWriter {
   FileTreeWriter(const FileTreeWriter&) = delete;
   FileTreeWriter& operator=(const FileTreeWriter&) = delete;
 
-  // Makes `directory` (with its parents) and holds it open. False with a one-line reason.
-  bool Open(const std::string& directory, std::string& error);
+  // Makes `directory` (with its parents) and holds it open. False with a
+  // one-line reason that names the `purpose` of the directory.
+  bool Open(const std::string& directory, const char* purpose, std::string& error);
   bool IsOpen() const { return root_ >= 0; }
   const std::string& Root() const { return rootPath_; }
 
   // The directory at `components` below the root, made where missing.
   bool MakeDirectory(const std::vector<std::string>& components, std::string& error);
-  // The file at `components` (its directories made where missing), replaced whole.
+  // The file at `components` (its directories made where missing), replaced
+  // whole. A reason starts with the path below the root.
   bool WriteFile(const std::vector<std::string>& components, const uint8_t* data, std::size_t size,
                  std::string& error);
 

@@ -290,7 +290,7 @@ std::vector<TreeNode> ResolveTree(const ObjectLocation& root, const std::map<uin
 }
 
 bool ObjectCarousels::WriteFilesTo(const std::string& directory, std::string& error) {
-  return writer_.Open(directory, error);
+  return writer_.Open(directory, "file", error);
 }
 
 void ObjectCarousels::OnServiceGateway(int pid, const std::vector<uint8_t>& ior) {
@@ -310,7 +310,7 @@ void ObjectCarousels::OnServiceGateway(int pid, const std::vector<uint8_t>& ior)
   }
   carousel.hasRoot = true;
   carousel.root = root;
-  WriteFiles(pid, carousel);
+  WriteFiles(carousel);
 }
 
 void ObjectCarousels::OnModuleComplete(const CarouselCollector& collector, const ModuleRef& ref) {
@@ -328,11 +328,10 @@ void ObjectCarousels::OnModuleComplete(const CarouselCollector& collector, const
   module.version = ref.version;
   module.bytes = std::move(bytes);
   if (!ParseBiopModule(module.bytes, module.objects, error)) carousel.problems.push_back(where + error);
-  WriteFiles(ref.pid, carousel);
+  WriteFiles(carousel);
 }
 
-void ObjectCarousels::WriteFiles(int pid, Carousel& carousel) {
-  (void)pid;
+void ObjectCarousels::WriteFiles(Carousel& carousel) {
   if (!writer_.IsOpen() || !carousel.hasRoot) return;
   std::vector<std::string> ignored;
   for (const TreeNode& node : ResolveTree(carousel.root, carousel.modules, ignored)) {

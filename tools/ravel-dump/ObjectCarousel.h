@@ -99,7 +99,7 @@ class ObjectCarousels : public CarouselListener {
   };
 
   // Writes what is complete and new or changed since last time.
-  void WriteFiles(int pid, Carousel& carousel);
+  void WriteFiles(Carousel& carousel);
 
   std::map<int, Carousel> carousels_;
   FileTreeWriter writer_;

@@ -59,7 +59,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
       ("j,json", "Print the summary as JSON")
-      ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
+      ("x,extract-modules", "Rebuild the carousel modules and write each complete one to DIR, inflated when "
+       "its DII says it is compressed",
        cxxopts::value<std::string>(), "DIR")
       ("extract-files", "Rebuild the object carousel's directories and files under DIR, each file as soon as "
        "its module is complete", cxxopts::value<std::string>(), "DIR")

@@ -122,7 +122,7 @@ struct ModuleSummary {
   bool complete = false;
   bool compressed = false;  // zlib, by the module info's compression descriptor
   uint32_t originalSize = 0;  // once inflated, as declared
-  std::string problem;      // why a complete module could not be inflated
+  std::string problem;      // why --extract-modules could not inflate it
   std::string file;         // where --extract-modules wrote it
 };
 
