@@ -29,7 +29,21 @@ if [ ! -f "$gtest/prefix/lib/cmake/GTest/GTestConfig.cmake" ]; then
   cmake --install "$gtest/build" >/dev/null
 fi
 
+# zlib for the target (ravel-dump inflates carousel modules with it): Debian's
+# package of the target architecture, unpacked into build-<target>-zlib and
+# linked statically.
+case "$target" in
+  armhf) debian_arch=armhf triple=arm-linux-gnueabihf ;;
+  aarch64) debian_arch=arm64 triple=aarch64-linux-gnu ;;
+esac
+zlib="$PWD/build-$target-zlib"
+if [ ! -f "$zlib/usr/lib/$triple/libz.a" ]; then
+  mkdir -p "$zlib"
+  (cd "$zlib" && apt-get download -qq "zlib1g-dev:$debian_arch" && dpkg -x zlib1g-dev_*_"$debian_arch".deb .)
+fi
+
 cmake -S . -B "build-$target" -DCMAKE_TOOLCHAIN_FILE="$toolchain" -DCMAKE_BUILD_TYPE=RelWithDebInfo \
-  -DGTest_DIR="$gtest/prefix/lib/cmake/GTest" >/dev/null
+  -DGTest_DIR="$gtest/prefix/lib/cmake/GTest" \
+  -DZLIB_INCLUDE_DIR="$zlib/usr/include" -DZLIB_LIBRARY="$zlib/usr/lib/$triple/libz.a" >/dev/null
 cmake --build "build-$target" -j"$jobs"
 ctest --test-dir "build-$target" --output-on-failure -j"$jobs"

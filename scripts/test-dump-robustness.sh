@@ -22,7 +22,7 @@ seed="${RAVEL_SEED:-$(date +%s)}"
 RANDOM=$((seed % 32768))
 work=build-asan/dump-robustness
 rm -rf "$work"
-mkdir -p "$work/failures" "$work/modules"
+mkdir -p "$work/failures" "$work/modules" "$work/files"
 
 # Distinct exit statuses for the sanitizers, which otherwise exit with 1 like a
 # refused input.
@@ -31,7 +31,8 @@ export UBSAN_OPTIONS="halt_on_error=1:print_stacktrace=1:exitcode=87${UBSAN_OPTI
 
 runs=0
 failures=0
-modes=("" "--summary" "--json" "--extract-modules $work/modules" "--standard japan" "--trace all")
+modes=("" "--summary" "--json" "--extract-modules $work/modules" "--extract-files $work/files" "--standard japan"
+  "--trace all")
 
 # A random number below $1 (up to 2^30).
 below() { echo $(((RANDOM * 32768 + RANDOM) % $1)); }

@@ -32,140 +32,18 @@
 
 #include <nlohmann/json.hpp>
 
+#include "CarouselBuilder.h"
 #include "Captures.h"
 #include "Ravel_CSafeSection.h"
+#include "RavelDumpFixture.h"
 #include "StreamBuilder.h"
 
 #ifdef RAVEL_DUMP_PATH
 
 namespace {
 
-namespace fs = std::filesystem;
-
-struct ToolRun {
-  int status = -1;  // exit status, or -1 when the tool did not exit normally
-  std::string out;
-  std::string err;
-};
-
-std::string ReadFile(const std::string& path) {
-  std::ifstream in(path.c_str(), std::ios::binary);
-  return std::string(std::istreambuf_iterator<char>(in), std::istreambuf_iterator<char>());
-}
-
-void WriteFile(const std::string& path, const Bytes& bytes) {
-  std::ofstream out(path.c_str(), std::ios::binary);
-  out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
-}
-
-// Every member of `expected` is in `actual` with the same value.
-void ExpectMembers(const nlohmann::json& expected, const nlohmann::json& actual) {
-  for (const auto& member : expected.items()) EXPECT_EQ(member.value(), actual[member.key()]) << member.key();
-}
-
-size_t Lines(const std::string& text) {
-  size_t count = 0;
-  for (char c : text) count += c == '\n';
-  return count;
-}
-
-class RavelDumpTest : public ::testing::Test {
- protected:
-  void SetUp() override {
-    char pattern[] = "/tmp/ravel_dump_test_XXXXXX";
-    ASSERT_NE(nullptr, mkdtemp(pattern));
-    dir_ = pattern;
-  }
-  void TearDown() override {
-    std::error_code ignored;
-    fs::permissions(dir_, fs::perms::owner_all, fs::perm_options::add, ignored);
-    fs::remove_all(dir_, ignored);
-  }
-
-  std::string Path(const std::string& name) const { return dir_ + "/" + name; }
-
-  std::string Write(const std::string& name, const Bytes& bytes) const {
-    WriteFile(Path(name), bytes);
-    return Path(name);
-  }
-
-  // Runs the tool with `args`; `input` becomes its standard input.
-  ToolRun Run(const std::vector<std::string>& args, const Bytes& input = Bytes()) const {
-    const std::string in = Path(".stdin");
-    WriteFile(in, input);
-    const int fd = open(in.c_str(), O_RDONLY);
-    const pid_t child = Start(args, fd);
-    close(fd);
-    return Finish(child, 0);
-  }
-
-  // Runs the tool with a terminal as its standard input.
-  ToolRun RunAtTerminal(const std::vector<std::string>& args) const {
-    int terminal = posix_openpt(O_RDWR | O_NOCTTY);
-    if (terminal < 0 || grantpt(terminal) != 0 || unlockpt(terminal) != 0) {
-      ADD_FAILURE() << "no pseudo-terminal";
-      return ToolRun();
-    }
-    const int fd = open(ptsname(terminal), O_RDONLY | O_NOCTTY);
-    const pid_t child = Start(args, fd);
-    if (fd >= 0) close(fd);
-    ToolRun run = Finish(child, 0);
-    close(terminal);
-    return run;
-  }
-
-  // Starts the tool with `args`; `input` (a descriptor, -1 for none) becomes its
-  // standard input. Its outputs go to files that Finish reads.
-  pid_t Start(const std::vector<std::string>& args, int input) const {
-    const std::string out = Path(".stdout"), err = Path(".stderr");
-    pid_t child = fork();
-    if (child == 0) {
-      int fdOut = open(out.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-      int fdErr = open(err.c_str(), O_WRONLY | O_CREAT | O_TRUNC, 0600);
-      if (input >= 0) dup2(input, 0);
-      dup2(fdOut, 1);
-      dup2(fdErr, 2);
-      // A cross build's tool runs through its emulator, named first.
-      std::vector<std::string> words;
-#ifdef RAVEL_DUMP_EMULATOR
-      std::istringstream emulator(RAVEL_DUMP_EMULATOR);
-      for (std::string word; emulator >> word;) words.push_back(word);
-#endif
-      words.push_back(RAVEL_DUMP_PATH);
-      words.insert(words.end(), args.begin(), args.end());
-      std::vector<char*> argv;
-      for (std::string& w : words) argv.push_back(const_cast<char*>(w.c_str()));
-      argv.push_back(nullptr);
-      execvp(argv[0], argv.data());
-      _exit(127);
-    }
-    return child;
-  }
-
-  // Sends `signal` (0: none) and waits for the tool's exit; past the time limit
-  // it is killed and counts as not exited normally.
-  ToolRun Finish(pid_t child, int signal) const {
-    if (signal != 0) kill(child, signal);
-    ToolRun run;
-    int status = 0;
-    const auto deadline = std::chrono::steady_clock::now() + std::chrono::seconds(300);
-    pid_t done = 0;
-    while (child > 0 && (done = waitpid(child, &status, WNOHANG)) == 0) {
-      if (std::chrono::steady_clock::now() > deadline) {
-        kill(child, SIGKILL);
-        waitpid(child, &status, 0);
-        break;
-      }
-      std::this_thread::sleep_for(std::chrono::milliseconds(5));
-    }
-    if (done == child && WIFEXITED(status)) run.status = WEXITSTATUS(status);
-    run.out = ReadFile(Path(".stdout"));
-    run.err = ReadFile(Path(".stderr"));
-    return run;
-  }
-
-  std::string dir_;
-};
+using namespace ravel_dump_test;
+using namespace cb;
 
 // --- Built streams ---------------------------------------------------------
 
@@ -180,53 +58,6 @@ Bytes PatSection(uint16_t tsId, uint8_t version, const std::vector<std::pair<int
     sb::Append(body, sb::U16(0xE000 | p.second));
   }
   return sb::LongSection(options, body);
-}
-
-// An AIT section with one application carrying a name and a Ginga location.
-Bytes AitSection(const std::string& name, const std::string& base, const std::string& initial) {
-  Bytes nameBody = sb::Cat({sb::Text("por"), sb::U8(name.size()), sb::Text(name)});
-  Bytes locationBody = sb::Cat({sb::U8(base.size()), sb::Text(base), sb::U8(0), sb::Text(initial)});
-  Bytes descriptors = sb::Cat({sb::Descriptor(0x01, nameBody), sb::Descriptor(0x07, locationBody)});
-  Bytes application = sb::Cat({sb::U32(0x0000000A), sb::U16(0x0001), sb::U8(0x01),
-                               sb::U16(0xC000 | descriptors.size()), descriptors});
-  sb::SectionOptions options;
-  options.tableId = 0x74;
-  options.tableIdExtension = 0x0009;
-  Bytes body = sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | application.size()), application});
-  return sb::LongSection(options, body);
-}
-
-// DSM-CC download messages (ISO/IEC 13818-6) in sections 0x3B and 0x3C.
-Bytes DsmccMessage(uint16_t messageId, uint32_t transactionId, const Bytes& body) {
-  return sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(messageId), sb::U32(transactionId), sb::U8(0xFF), sb::U8(0),
-                  sb::U16(body.size()), body});
-}
-
-struct ModuleEntry {
-  uint16_t id;
-  uint32_t size;
-  uint8_t version;
-};
-
-Bytes DiiSection(uint32_t downloadId, uint16_t blockSize, const std::vector<ModuleEntry>& modules) {
-  Bytes body = sb::Cat({sb::U32(downloadId), sb::U16(blockSize), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0),
-                        sb::U16(0), sb::U16(modules.size())});
-  for (const ModuleEntry& m : modules) sb::Append(body, sb::Cat({sb::U16(m.id), sb::U32(m.size), sb::U8(m.version), sb::U8(0)}));
-  sb::Append(body, sb::U16(0));
-  sb::SectionOptions options;
-  options.tableId = 0x3B;
-  options.tableIdExtension = 0x0002;
-  return sb::LongSection(options, DsmccMessage(0x1002, 0x80000002, body));
-}
-
-Bytes DdbSection(uint32_t downloadId, uint16_t moduleId, uint8_t version, uint16_t block, const Bytes& data) {
-  Bytes body = sb::Cat({sb::U16(moduleId), sb::U8(version), sb::U8(0xFF), sb::U16(block), data});
-  sb::SectionOptions options;
-  options.tableId = 0x3C;
-  options.tableIdExtension = moduleId;
-  options.version = version & 0x1F;
-  options.sectionNumber = block & 0xFF;
-  return sb::LongSection(options, DsmccMessage(0x1003, downloadId, body));
 }
 
 Bytes ModuleBytes(size_t size, uint8_t seed) {
@@ -898,30 +729,6 @@ TEST_F(RavelDumpTest, ModuleDirectoryThatCannotBeMadeFailsCleanly) {
   EXPECT_EQ("", run.out);
   EXPECT_EQ(1u, Lines(run.err)) << run.err;
   EXPECT_NE(std::string::npos, run.err.find("cannot make the module directory"));
-}
-
-TEST_F(RavelDumpTest, ObjectCarouselCaptureModulesAreComplete) {
-  std::string capture = captures::Path("object-carousel.ts");
-  if (capture.empty()) GTEST_SKIP() << "shared capture object-carousel.ts absent";
-  // Named with --pid, or found by its DSM-CC section starts when nothing names it.
-  const std::vector<std::vector<std::string>> pidOptions = {{"--pid", "0x076a"}, {}};
-  for (const std::vector<std::string>& pidOption : pidOptions) {
-    std::string out = Path(pidOption.empty() ? "modules-found" : "modules-named");
-    std::vector<std::string> args = pidOption;
-    for (const char* arg : {"--extract-modules", out.c_str(), "--json", capture.c_str()}) args.push_back(arg);
-    ToolRun run = Run(args);
-    ASSERT_EQ(0, run.status) << run.err;
-    nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
-    ASSERT_EQ(1u, carousels.size());
-    const nlohmann::json& modules = carousels[0]["modules"];
-    ASSERT_EQ(3u, modules.size());
-    for (const nlohmann::json& module : modules) {
-      EXPECT_TRUE(module["complete"].get<bool>()) << module.dump();
-      std::string file = module["file"].get<std::string>();
-      EXPECT_EQ(module["size"].get<uintmax_t>(), fs::file_size(file)) << file;
-    }
-    EXPECT_NE(std::string::npos, run.err.find("0x076a       6405")) << run.err;
-  }
 }
 
 // --- A receiver's whole path -------------------------------------------------

@@ -2,6 +2,7 @@
 #include "Capture.h"
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
+#include "Ravel_CDsmccDSI.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTablePMT.h"
 
@@ -40,7 +41,11 @@ void FollowPmt(RavelCPMT& pmt, Demux* demux) {
 }
 
 // The DII lists the modules of a download with their sizes and versions.
-void ListModules(int pid, RavelCDsmccDII& dii, CarouselCollector& carousel) {
+void ListModules(int pid, RavelCDsmccDII& dii, const unsigned char* message, std::size_t messageSize,
+                 CarouselCollector& carousel) {
+  // The library keeps the ARIB compression descriptor only; the object
+  // carousel's one sits deeper in the module info, read here from the bytes.
+  std::vector<ModuleCompression> compressions = DiiModuleCompressions(message, messageSize);
   std::vector<ModuleListing> modules;
   for (int i = 0; i < dii.cModuleInfos.iCount; ++i) {
     const RavelCModuleInfo* info = dii.cModuleInfos.ipArray[i];
@@ -49,9 +54,27 @@ void ListModules(int pid, RavelCDsmccDII& dii, CarouselCollector& carousel) {
     module.size = info->iModuleSize;
     module.version = info->iModuleVersion;
     if (info->pNameDescriptor != nullptr) module.name = info->pNameDescriptor->GetFileName();
+    if (static_cast<std::size_t>(i) < compressions.size()) module.compression = compressions[static_cast<std::size_t>(i)];
     modules.push_back(module);
   }
   carousel.AddModuleList(pid, dii.iDownloadId, dii.iBlockSize, modules);
+}
+
+// A DSI's private data is the IOR of the object carousel's service gateway.
+void NameServiceGateway(int pid, const RavelCDsmccDSI& dsi, const unsigned char* message, std::size_t messageSize,
+                        CarouselCollector& carousel) {
+  if (dsi.pPrivateData == nullptr || dsi.iPrivateDataLength <= 0) return;
+  const std::size_t offset = static_cast<std::size_t>(dsi.pPrivateData - message);
+  const std::size_t length = static_cast<std::size_t>(dsi.iPrivateDataLength);
+  if (offset > messageSize || messageSize - offset < length) return;  // declared past the message
+  carousel.AddServiceGateway(pid, std::vector<uint8_t>(dsi.pPrivateData, dsi.pPrivateData + length));
+}
+
+// The DSM-CC message of a carousel section: the section less its 8-byte header
+// and its CRC_32.
+const unsigned char* Message(const RavelCSafeSection& parsed) { return parsed.GetData() + 8; }
+std::size_t MessageSize(const RavelCSafeSection& parsed) {
+  return parsed.GetDataSize() >= 12 ? static_cast<std::size_t>(parsed.GetDataSize() - 12) : 0;
 }
 
 // A DDB carries one block of a module; its header's transaction id is the downloadId.
@@ -71,8 +94,13 @@ void UseOnArrival(int pid, TableKind kind, RavelCSafeSection& parsed, Demux* dem
     case kRavelKindPMT:
       FollowPmt(static_cast<RavelCPMT&>(*parsed.GetTable()), demux);
       break;
+    case kRavelKindDSI:
+      NameServiceGateway(pid, static_cast<RavelCDsmccDSI&>(*parsed.GetMessage()), Message(parsed), MessageSize(parsed),
+                         carousel);
+      break;
     case kRavelKindDII:
-      ListModules(pid, static_cast<RavelCDsmccDII&>(*parsed.GetMessage()), carousel);
+      ListModules(pid, static_cast<RavelCDsmccDII&>(*parsed.GetMessage()), Message(parsed), MessageSize(parsed),
+                  carousel);
       break;
     case kRavelKindDDB:
       KeepBlock(pid, static_cast<RavelCDsmccDDB&>(*parsed.GetMessage()), carousel);

@@ -17,7 +17,7 @@ std::string Where(int pid, const uint8_t* section) {
 
 }  // namespace
 
-Capture::Capture(Stats& stats) : stats_(stats), demux_(nullptr) {}
+Capture::Capture(Stats& stats) : stats_(stats), demux_(nullptr) { carousel_.SetListener(&objects_); }
 
 void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   TableKind kind = RavelCSafeSection::GetKind(section, static_cast<int>(size));

@@ -3,7 +3,7 @@
 // checked and parsed once by the library's safe entry, counted, kept in the
 // table registry with its parsed object, and used at once where a receiver would use it:
 // a PAT or a PMT names more section PIDs, DII and DDB messages feed the
-// carousel collector.
+// carousel collector, whose complete modules build the object carousels.
 #ifndef RAVEL_DUMP_CAPTURE_H
 #define RAVEL_DUMP_CAPTURE_H
 
@@ -12,6 +12,7 @@
 
 #include "Carousel.h"
 #include "Demux.h"
+#include "ObjectCarousel.h"
 #include "Stats.h"
 #include "TableRegistry.h"
 
@@ -28,12 +29,15 @@ class Capture : public SectionSink {
 
   const TableRegistry& Registry() const { return registry_; }
   const CarouselCollector& Carousel() const { return carousel_; }
+  ObjectCarousels& Objects() { return objects_; }
+  const ObjectCarousels& Objects() const { return objects_; }
 
  private:
   Stats& stats_;
   Demux* demux_;
   TableRegistry registry_;
   CarouselCollector carousel_;
+  ObjectCarousels objects_;
 };
 
 // What a receiver does with a section the library parsed when it first

@@ -1,13 +1,8 @@
 #include "Carousel.h"
 
-#include <cerrno>
 #include <cstdio>
-#include <cstring>
-#include <filesystem>
 
-#include <fcntl.h>
-#include <sys/stat.h>
-#include <unistd.h>
+#include "FileTree.h"
 
 namespace ravel_dump {
 namespace {
@@ -21,42 +16,6 @@ std::size_t ExpectedBlockLength(uint32_t size, uint16_t blockSize, unsigned int 
   uint64_t offset = static_cast<uint64_t>(number) * blockSize;
   uint64_t rest = size - offset;
   return static_cast<std::size_t>(rest < blockSize ? rest : blockSize);
-}
-
-// Writes `bytes` to `path` through a temporary file in the same directory.
-bool WriteAtomically(const std::string& directory, const std::string& name, const std::vector<uint8_t>& bytes,
-                     std::string& error) {
-  std::string final = directory + "/" + name;
-  std::string temp = directory + "/." + name + ".XXXXXX";
-  std::vector<char> pattern(temp.begin(), temp.end());
-  pattern.push_back('\0');
-  int fd = mkstemp(pattern.data());
-  if (fd < 0) {
-    error = "cannot write in " + directory + ": " + std::strerror(errno);
-    return false;
-  }
-  std::size_t done = 0;
-  while (done < bytes.size()) {
-    ssize_t n = write(fd, bytes.data() + done, bytes.size() - done);
-    if (n < 0 && errno == EINTR) continue;
-    if (n <= 0) {
-      error = "cannot write " + final + ": " + std::strerror(errno);
-      close(fd);
-      unlink(pattern.data());
-      return false;
-    }
-    done += static_cast<std::size_t>(n);
-  }
-  // Readable like any file the user creates.
-  mode_t mask = umask(0);
-  umask(mask);
-  fchmod(fd, 0666 & ~mask);
-  if (close(fd) != 0 || rename(pattern.data(), final.c_str()) != 0) {
-    error = "cannot write " + final + ": " + std::strerror(errno);
-    unlink(pattern.data());
-    return false;
-  }
-  return true;
 }
 
 }  // namespace
@@ -81,13 +40,63 @@ void CarouselCollector::AddModuleList(int pid, uint32_t downloadId, uint16_t blo
   }
   found->second.blockSize = blockSize;
   for (const ModuleListing& module : modules) found->second.modules[{module.id, module.version}] = module;
+  for (const ModuleListing& module : modules) NoteIfComplete(ModuleKey(pid, downloadId, module.id, module.version));
+}
+
+void CarouselCollector::AddServiceGateway(int pid, const std::vector<uint8_t>& ior) {
+  if (listener_ != nullptr) listener_->OnServiceGateway(pid, ior);
+}
+
+const ModuleListing* CarouselCollector::Listing(const ModuleKey& key, uint16_t& blockSize) const {
+  auto download = listings_.find(DownloadKey(std::get<0>(key), std::get<1>(key)));
+  if (download == listings_.end()) return nullptr;
+  auto module = download->second.modules.find({std::get<2>(key), std::get<3>(key)});
+  if (module == download->second.modules.end()) return nullptr;
+  blockSize = download->second.blockSize;
+  return &module->second;
+}
+
+void CarouselCollector::NoteIfComplete(const ModuleKey& key) {
+  if (listener_ == nullptr || completed_.count(key)) return;
+  uint16_t blockSize = 0;
+  const ModuleListing* listing = Listing(key, blockSize);
+  if (listing == nullptr) return;
+  auto blocks = blocks_.find(key);
+  // Counting the held blocks costs a walk over them: only once there can be enough.
+  const std::size_t held = blocks == blocks_.end() ? 0 : blocks->second.size();
+  const unsigned int total = BlockCount(listing->size, blockSize);
+  if ((blockSize == 0 && listing->size != 0) || held < total || BlocksHeld(key, listing->size, blockSize) != total) return;
+  completed_.insert(key);
+  ModuleRef module;
+  module.pid = std::get<0>(key);
+  module.downloadId = std::get<1>(key);
+  module.id = std::get<2>(key);
+  module.version = std::get<3>(key);
+  listener_->OnModuleComplete(*this, module);
+}
+
+bool CarouselCollector::ModuleContent(const ModuleRef& module, std::vector<uint8_t>& bytes, std::string& error) const {
+  const ModuleKey key(module.pid, module.downloadId, module.id, module.version);
+  uint16_t blockSize = 0;
+  const ModuleListing* listing = Listing(key, blockSize);
+  if (listing == nullptr || !Assemble(key, listing->size, blockSize, bytes)) {
+    error = "not complete";
+    return false;
+  }
+  if (!listing->compression.compressed) return true;
+  std::vector<uint8_t> inflated;
+  if (!InflateModule(bytes, listing->compression.originalSize, inflated, error)) return false;
+  bytes.swap(inflated);
+  return true;
 }
 
 void CarouselCollector::AddBlock(int pid, uint32_t downloadId, uint16_t moduleId, uint8_t version,
                                  uint16_t blockNumber, const uint8_t* data, std::size_t size) {
-  auto& blocks = blocks_[ModuleKey(pid, downloadId, moduleId, version)];
+  const ModuleKey key(pid, downloadId, moduleId, version);
+  auto& blocks = blocks_[key];
   if (blocks.find(blockNumber) != blocks.end()) return;
   blocks[blockNumber].assign(data, data + size);
+  NoteIfComplete(key);
 }
 
 unsigned int CarouselCollector::BlocksHeld(const ModuleKey& key, uint32_t size, uint16_t blockSize) const {
@@ -132,6 +141,8 @@ std::vector<CarouselSummary> CarouselCollector::Summarize() const {
       module.size = listing.size;
       module.version = listing.version;
       module.name = listing.name;
+      module.compressed = listing.compression.compressed;
+      module.originalSize = listing.compression.originalSize;
       ModuleKey moduleKey(carousel.pid, carousel.downloadId, listing.id, listing.version);
       module.blocksTotal = BlockCount(listing.size, download.blockSize);
       module.blocksReceived = BlocksHeld(moduleKey, listing.size, download.blockSize);
@@ -145,21 +156,24 @@ std::vector<CarouselSummary> CarouselCollector::Summarize() const {
 
 bool CarouselCollector::WriteModules(const std::string& directory, std::vector<CarouselSummary>& carousels,
                                      std::string& error) const {
-  std::error_code code;
-  std::filesystem::create_directories(directory, code);
-  if (code || !std::filesystem::is_directory(directory)) {
-    error = directory + ": cannot make the module directory" + (code ? ": " + code.message() : std::string());
-    return false;
-  }
+  FileTreeWriter writer;
+  if (!writer.Open(directory, "module", error)) return false;
   for (CarouselSummary& carousel : carousels) {
     for (ModuleSummary& module : carousel.modules) {
       if (!module.complete) continue;
       std::vector<uint8_t> bytes;
-      ModuleKey key(carousel.pid, carousel.downloadId, static_cast<uint16_t>(module.id),
-                    static_cast<uint8_t>(module.version));
-      if (!Assemble(key, module.size, static_cast<uint16_t>(carousel.blockSize), bytes)) continue;
+      ModuleRef ref;
+      ref.pid = carousel.pid;
+      ref.downloadId = carousel.downloadId;
+      ref.id = static_cast<uint16_t>(module.id);
+      ref.version = static_cast<uint8_t>(module.version);
+      // A module that does not inflate as declared is reported, not written.
+      if (!ModuleContent(ref, bytes, module.problem)) continue;
       std::string name = ModuleFileName(carousel.pid, carousel.downloadId, module.id, module.version);
-      if (!WriteAtomically(directory, name, bytes, error)) return false;
+      if (!writer.WriteFile({name}, bytes.data(), bytes.size(), error)) {
+        error = directory + error;
+        return false;
+      }
       module.file = directory + "/" + name;
     }
   }

@@ -61,8 +61,11 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
       ("j,json", "Print the summary as JSON")
-      ("x,extract-modules", "Rebuild the data-carousel modules and write each complete one to DIR",
+      ("x,extract-modules", "Rebuild the carousel modules and write each complete one to DIR, inflated when "
+       "its DII says it is compressed",
        cxxopts::value<std::string>(), "DIR")
+      ("extract-files", "Rebuild the object carousel's directories and files under DIR, each file as soon as "
+       "its module is complete", cxxopts::value<std::string>(), "DIR")
       ("sections", "Read the input as concatenated raw sections (otherwise told from its first bytes)")
       ("receiver", "Reassemble sections with the receivers' own store (RavelCTSPktStore) instead of one "
        "that delivers every section whole; the report counts what it did not deliver whole")
@@ -128,6 +131,14 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
     }
     options.rawText = result.count("raw-text") > 0;
+    if (result.count("extract-files")) {
+      options.filesDirectory = result["extract-files"].as<std::string>();
+      if (options.filesDirectory.empty()) {
+        error = "--extract-files needs a directory";
+        return ParseOutcome::kUsageError;
+      }
+      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+    }
     if (result.count("standard")) {
       std::string name = result["standard"].as<std::string>();
       std::transform(name.begin(), name.end(), name.begin(),

@@ -17,6 +17,7 @@ struct Options {
   bool receiversStore = false;   // --receiver: sections through RavelCTSPktStore
   OutputMode mode = OutputMode::kDump;
   std::string extractDirectory;  // --extract-modules
+  std::string filesDirectory;    // --extract-files
   int standard = -1;             // -1: detected from the capture
   bool rawText = false;          // broadcast texts as broadcast, not decoded
   std::vector<int> pids;         // --pid: read only these, all as section PIDs

@@ -109,6 +109,11 @@ struct ApplicationSummary {
   std::string name;
   std::string path;
   std::string file;
+  // The entry file, base directory and initial class joined, looked up in the
+  // object carousels' trees (when there are any).
+  std::string entry;
+  bool entryChecked = false;
+  bool entryPresent = false;
 };
 
 struct ModuleSummary {
@@ -119,6 +124,9 @@ struct ModuleSummary {
   unsigned int blocksReceived = 0;
   unsigned int blocksTotal = 0;
   bool complete = false;
+  bool compressed = false;  // zlib, by the module info's compression descriptor
+  uint32_t originalSize = 0;  // once inflated, as declared
+  std::string problem;      // why --extract-modules could not inflate it
   std::string file;         // where --extract-modules wrote it
 };
 
@@ -127,6 +135,23 @@ struct CarouselSummary {
   uint32_t downloadId = 0;
   int blockSize = 0;
   std::vector<ModuleSummary> modules;
+};
+
+// One object of an object carousel's tree.
+struct TreeEntrySummary {
+  std::string path;   // "/" for the service gateway
+  std::string kind;   // "service gateway", "directory", "file", "stream", "stream event"
+  uint64_t size = 0;  // a file's content; the message body of the others
+  int module = -1;
+  int version = -1;   // of the module, -1 while it is not complete
+  bool complete = false;
+  std::string file;   // where --extract-files wrote it
+};
+
+struct ObjectCarouselSummary {
+  int pid = -1;
+  std::vector<TreeEntrySummary> entries;
+  std::vector<std::string> problems;
 };
 
 struct Summary {
@@ -140,6 +165,7 @@ struct Summary {
   TimeSummary time;
   std::vector<ApplicationSummary> applications;
   std::vector<CarouselSummary> carousels;
+  std::vector<ObjectCarouselSummary> objectCarousels;
 };
 
 void PrintSummaryText(const Summary& summary, std::FILE* out);

@@ -112,7 +112,9 @@ std::string SummaryJson(const Summary& s) {
                             {"document_resolution", app.documentResolution},
                             {"name", Bytes(app.name)},
                             {"path", Bytes(app.path)},
-                            {"file", Bytes(app.file)}});
+                            {"file", Bytes(app.file)},
+                            {"entry", app.entryChecked ? Bytes(app.entry) : json(nullptr)},
+                            {"entry_present", app.entryChecked ? json(app.entryPresent) : json(nullptr)}});
   }
 
   json carousels = json::array();
@@ -126,10 +128,28 @@ std::string SummaryJson(const Summary& s) {
                          {"blocks_received", m.blocksReceived},
                          {"blocks_total", m.blocksTotal},
                          {"complete", m.complete},
+                         {"compressed", m.compressed},
+                         {"original_size", m.compressed ? json(m.originalSize) : json(nullptr)},
+                         {"problem", m.problem.empty() ? json(nullptr) : json(m.problem)},
                          {"file", m.file.empty() ? json(nullptr) : Bytes(m.file)}});
     }
     carousels.push_back(
         {{"pid", Pid(c.pid)}, {"download_id", c.downloadId}, {"block_size", c.blockSize}, {"modules", modules}});
+  }
+
+  json objectCarousels = json::array();
+  for (const ObjectCarouselSummary& c : s.objectCarousels) {
+    json entries = json::array();
+    for (const TreeEntrySummary& e : c.entries) {
+      entries.push_back({{"path", Bytes(e.path)},
+                         {"kind", e.kind},
+                         {"size", e.size},
+                         {"module", e.module},
+                         {"version", e.version < 0 ? json(nullptr) : json(e.version)},
+                         {"complete", e.complete},
+                         {"file", e.file.empty() ? json(nullptr) : json(EscapeBytes(e.file))}});
+    }
+    objectCarousels.push_back({{"pid", Pid(c.pid)}, {"entries", entries}, {"problems", c.problems}});
   }
 
   json document = {{"standard", s.standard},
@@ -140,7 +160,8 @@ std::string SummaryJson(const Summary& s) {
                    {"services", services},
                    {"time", time},
                    {"applications", applications},
-                   {"carousels", carousels}};
+                   {"carousels", carousels},
+                   {"object_carousels", objectCarousels}};
   return document.dump(2) + "\n";
 }
 

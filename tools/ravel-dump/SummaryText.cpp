@@ -184,8 +184,12 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
                  "  PID %s type 0x%04x: organization 0x%08x application 0x%04x control %u (%s) name %s path %s "
                  "file %s\n",
                  Pid(app.pid).c_str(), app.applicationType, app.organizationId, app.applicationId, app.controlCode,
-                 ControlCodeName(app.controlCode), Quoted(app.name, TextCoding::kAsBroadcast).c_str(),
-                 Quoted(app.path, TextCoding::kAsBroadcast).c_str(), Quoted(app.file, TextCoding::kAsBroadcast).c_str());
+                 ControlCodeName(app.controlCode), Quoted(app.name, TextCoding::kAsBroadcast).c_str(), Quoted(app.path, TextCoding::kAsBroadcast).c_str(),
+                 Quoted(app.file, TextCoding::kAsBroadcast).c_str());
+    if (app.entryChecked) {
+      std::fprintf(out, "    entry %s %s\n", Quoted(app.entry, TextCoding::kAsBroadcast).c_str(),
+                   app.entryPresent ? "is in the carousel" : "is not in the carousel");
+    }
   }
 
   std::size_t modules = 0;
@@ -195,15 +199,33 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     std::fprintf(out, "  PID %s download 0x%08x, block size %d\n", Pid(c.pid).c_str(), c.downloadId, c.blockSize);
     for (const ModuleSummary& m : c.modules) {
       std::string line = Format("    module 0x%04x version %d, %u bytes", m.id, m.version, m.size);
+      if (m.compressed) line += Format(" (zlib, %u inflated)", m.originalSize);
       if (!m.name.empty()) line += " " + Quoted(m.name, TextCoding::kAsBroadcast);
       if (m.complete) {
         line += ", complete";
       } else {
         line += Format(", %u of %u blocks", m.blocksReceived, m.blocksTotal);
       }
+      if (!m.problem.empty()) line += ", not written: " + m.problem;
       if (!m.file.empty()) line += " -> " + EscapeBytes(m.file);
       std::fprintf(out, "%s\n", line.c_str());
     }
+  }
+
+  for (const ObjectCarouselSummary& c : s.objectCarousels) {
+    std::fprintf(out, "Object carousel on PID %s (%zu objects):\n", Pid(c.pid).c_str(), c.entries.size());
+    for (const TreeEntrySummary& e : c.entries) {
+      std::string line = "  " + EscapeBytes(e.path) + " " + e.kind;
+      if (e.complete) {
+        line += Format(", %llu bytes, module 0x%04x version %d", static_cast<unsigned long long>(e.size), e.module,
+                       e.version);
+      } else {
+        line += Format(", module 0x%04x not complete", e.module);
+      }
+      if (!e.file.empty()) line += " -> " + EscapeBytes(e.file);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+    for (const std::string& problem : c.problems) std::fprintf(out, "  problem: %s\n", problem.c_str());
   }
 }
 

@@ -4,6 +4,7 @@
 #include <string>
 #include <vector>
 
+#include "ByteText.h"
 #include "Capture.h"
 #include "CaptureKind.h"
 #include "Demux.h"
@@ -148,6 +149,10 @@ int main(int argc, char** argv) {
   }
 
   Capture capture(stats);
+  // Files are written while the capture is read, as their modules complete.
+  if (!options.filesDirectory.empty() && !capture.Objects().WriteFilesTo(options.filesDirectory, error)) {
+    return Fail(error);
+  }
   Demux demux(stats, capture);
   InputSummary inputSummary;
   inputSummary.name = input.Name();
@@ -186,15 +191,32 @@ int main(int argc, char** argv) {
   // write them leaves no half output behind.
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
-                     !options.extractDirectory.empty();
+                     !options.extractDirectory.empty() || !options.filesDirectory.empty();
   if (wantSummary) {
     summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
     summary.standardReason = choice.reason;
     summary.textCoding = TextCodingOf(choice.standard, options.rawText);
     summary.utcOffsetMinutes = UtcOffsetMinutesOf(choice.standard);
+    summary.objectCarousels = capture.Objects().Summarize();
+    ResolveApplications(summary.objectCarousels, summary.applications);
+    for (const ObjectCarouselSummary& carousel : summary.objectCarousels) {
+      for (const std::string& problem : carousel.problems) {
+        char pid[32];
+        std::snprintf(pid, sizeof pid, "PID 0x%04x: ", carousel.pid);
+        stats.Problem(pid + problem);
+      }
+    }
   }
   if (!options.extractDirectory.empty()) {
     if (!capture.Carousel().WriteModules(options.extractDirectory, summary.carousels, error)) return Fail(error);
+    for (const CarouselSummary& carousel : summary.carousels) {
+      for (const ModuleSummary& module : carousel.modules) {
+        if (module.problem.empty()) continue;
+        char where[64];
+        std::snprintf(where, sizeof where, "module 0x%04x version %d: ", module.id, module.version);
+        stats.Problem(where + module.problem);
+      }
+    }
   }
   switch (options.mode) {
     case OutputMode::kDump:
@@ -210,6 +232,11 @@ int main(int argc, char** argv) {
       for (const CarouselSummary& carousel : summary.carousels) {
         for (const ModuleSummary& module : carousel.modules) {
           if (!module.file.empty()) std::printf("%s\n", module.file.c_str());
+        }
+      }
+      for (const ObjectCarouselSummary& carousel : summary.objectCarousels) {
+        for (const TreeEntrySummary& entry : carousel.entries) {
+          if (!entry.file.empty()) std::printf("%s\n", EscapeBytes(entry.file).c_str());
         }
       }
       break;
