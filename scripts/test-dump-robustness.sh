@@ -4,6 +4,8 @@
 # capture and the sample cut at random points, captures with random bytes
 # written over them, and files of random bytes. Each run must end cleanly:
 # status 0, or 1 with ravel-dump's own message; no sanitizer report, no hang.
+# A cut capture must also keep its intact part: its summary is that of its
+# whole packets alone, with status 0.
 #
 #   scripts/test-dump-robustness.sh [CUTS_PER_FILE]      default 30
 #
@@ -62,6 +64,42 @@ check() {
   fi
 }
 
+# The packet size of capture $1 (188, 192 or 204), from its sync bytes; 0 for none.
+packet_size() {
+  local size
+  for size in 188 204 192; do
+    local sync=$((size == 192 ? 4 : 0))
+    if [ "$(od -An -tx1 -j$sync -N1 "$1" | tr -d ' ')" = 47 ] &&
+      [ "$(od -An -tx1 -j$((sync + size)) -N1 "$1" | tr -d ' ')" = 47 ]; then
+      echo "$size"
+      return
+    fi
+  done
+  echo 0
+}
+
+# Capture $1 cut inside a packet at $2 must give the summary of its whole
+# packets: damage at the end costs nothing before it.
+check_intact() {
+  local input=$1 point=$2 stride=$3
+  [ "$stride" -gt 0 ] || return 0
+  local whole=$((point / stride * stride))
+  [ $((whole / stride)) -ge 5 ] && [ "$whole" -lt "$point" ] || return 0
+  head -c "$point" "$input" >"$work/cut"
+  head -c "$whole" "$input" >"$work/whole"
+  runs=$((runs + 1))
+  local rc=0
+  timeout 120 "$dump" --no-progress -q --summary "$work/whole" >"$work/whole.out" 2>/dev/null || true
+  timeout 120 "$dump" --no-progress -q --summary "$work/cut" >"$work/cut.out" 2>"$work/err" || rc=$?
+  if [ "$rc" -ne 0 ] || ! cmp -s "$work/whole.out" "$work/cut.out"; then
+    failures=$((failures + 1))
+    local kept="$work/failures/$failures-$(basename "$input")-cut-$point"
+    cp "$work/cut" "$kept"
+    echo "FAILED (the intact part is lost, status $rc): ravel-dump --summary $kept" >&2
+    head -n 5 "$work/err" >&2
+  fi
+}
+
 files=()
 for f in "$captures"/*.ts "$captures"/*.sections samples/*.ts; do
   [ -f "$f" ] && files+=("$f")
@@ -75,6 +113,7 @@ for f in "${files[@]}"; do
   size=$(stat -c %s "$f")
   options=""
   case "$f" in *.sections) options="--sections" ;; esac
+  stride=$(packet_size "$f")
   points=(0 1 3 187 188 189 $((size - 1)))
   for ((i = 0; i < cuts; i++)); do points+=("$(below "$size")"); done
   for point in "${points[@]}"; do
@@ -82,6 +121,7 @@ for f in "${files[@]}"; do
     head -c "$point" "$f" >"$work/input"
     label="$(basename "$f") cut at $point"
     check "$work/input" "$options ${modes[$((runs % ${#modes[@]}))]}"
+    [ -n "$options" ] || check_intact "$f" "$point" "$stride"
   done
   # Random bytes written over the capture, in 1 to 64 places.
   for ((i = 0; i < cuts / 3 + 1; i++)); do

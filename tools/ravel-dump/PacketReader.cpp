@@ -18,6 +18,8 @@ const uint8_t kSync = 0x47;
 const int kLockRun = 5;
 // Sync bytes that confirm a new position after garbage.
 const int kResyncRun = 3;
+// Damage lines kept for the report; a long noisy input would otherwise grow them.
+const std::size_t kDamageLines = 20;
 
 struct Format {
   int stride;
@@ -31,9 +33,15 @@ PacketReader::PacketReader(InputFile& input)
     : input_(input), buffer_(kChunk), pos_(0), end_(0), base_(0), eof_(false), stride_(188),
       syncOffset_(0), packets_(0), skipped_(0), resyncs_(0) {}
 
-bool PacketReader::Fail(const std::string& error) {
-  error_ = error;
-  return false;
+void PacketReader::Cut(std::size_t left) {
+  skipped_ += left;
+  pos_ = end_;
+  NoteDamage(input_.Name() + ": truncated: the input ends with " + std::to_string(left) +
+         " bytes that do not make a whole packet");
+}
+
+void PacketReader::NoteDamage(const std::string& line) {
+  if (damage_.size() < kDamageLines) damage_.push_back(line);
 }
 
 bool PacketReader::Fill(std::size_t need) {
@@ -114,28 +122,42 @@ bool PacketReader::Start(std::string& error) {
   return true;
 }
 
+bool PacketReader::RunAt(int stride, std::size_t syncOffset, bool whole) const {
+  const std::size_t left = end_ - pos_;
+  if (left < syncOffset + kPacket || buffer_[pos_ + syncOffset] != kSync) return false;
+  for (int k = 1; k < kResyncRun; ++k) {
+    std::size_t at = syncOffset + k * static_cast<std::size_t>(stride);
+    if (at >= left) return !whole;  // the input ends: the packets it holds decide
+    if (buffer_[pos_ + at] != kSync) return false;
+  }
+  return true;
+}
+
 bool PacketReader::Resync() {
   ++resyncs_;
-  const std::size_t look = syncOffset_ + (kResyncRun - 1) * stride_ + kPacket;
+  // Room for a run at the largest packet size, whichever size the input goes on with.
+  const std::size_t look = 4 + (kResyncRun - 1) * 204 + kPacket;
   for (;;) {
     ++pos_;
     ++skipped_;
     Fill(look);
     if (!error_.empty()) return false;
-    std::size_t left = end_ - pos_;
+    const std::size_t left = end_ - pos_;
     if (left < syncOffset_ + kPacket) {
-      skipped_ += left;
-      pos_ = end_;
-      return Fail(input_.Name() + ": truncated: the input ends with " + std::to_string(left) +
-                  " bytes that do not make a whole packet");
+      Cut(left);
+      return false;
     }
-    if (buffer_[pos_ + syncOffset_] != kSync) continue;
-    bool run = true;
-    for (int k = 1; k < kResyncRun && run; ++k) {
-      std::size_t at = syncOffset_ + k * stride_;
-      if (at < left) run = buffer_[pos_ + at] == kSync;
+    if (RunAt(stride_, syncOffset_, false)) return true;
+    // Recorders and remultiplexers change packet size between pieces of a
+    // capture; a new size needs a whole run, as the first one did.
+    for (const Format& f : kFormats) {
+      if (f.stride == stride_ || !RunAt(f.stride, f.syncOffset, true)) continue;
+      NoteDamage(input_.Name() + ": the packet size changes from " + std::to_string(stride_) + " to " +
+             std::to_string(f.stride) + " bytes at byte " + std::to_string(Offset()));
+      stride_ = f.stride;
+      syncOffset_ = f.syncOffset;
+      return true;
     }
-    if (run) return true;
   }
 }
 
@@ -144,9 +166,14 @@ const uint8_t* PacketReader::Next() {
     if (!Fill(stride_)) {
       if (!error_.empty()) return nullptr;
       std::size_t left = end_ - pos_;
-      if (left == 0) return nullptr;
-      Fail(input_.Name() + ": truncated: the input ends inside a packet (" + std::to_string(left) + " of " +
-           std::to_string(stride_) + " bytes)");
+      if (left >= syncOffset_ + kPacket && buffer_[pos_ + syncOffset_] == kSync) {
+        // A last 204-byte packet cut in its 16-byte trailer still has its 188 bytes.
+        const uint8_t* packet = buffer_.data() + pos_ + syncOffset_;
+        pos_ = end_;
+        ++packets_;
+        return packet;
+      }
+      if (left > 0) Cut(left);
       return nullptr;
     }
     if (buffer_[pos_ + syncOffset_] == kSync) {
@@ -157,20 +184,6 @@ const uint8_t* PacketReader::Next() {
     }
     if (!Resync()) return nullptr;
   }
-}
-
-bool ReadWholeInput(InputFile& input, std::vector<uint8_t>& data, std::string& error) {
-  data.clear();
-  std::size_t used = 0;
-  for (;;) {
-    if (data.size() - used < kChunk) data.resize(used + kChunk);
-    long long n = input.Read(data.data() + used, data.size() - used, error);
-    if (n < 0) return false;
-    if (n == 0) break;
-    used += static_cast<std::size_t>(n);
-  }
-  data.resize(used);
-  return true;
 }
 
 }  // namespace ravel_dump

@@ -24,11 +24,14 @@ class PacketReader {
   bool Start(std::string& error);
 
   // The next 188-byte packet (from its sync byte), valid until the next call;
-  // null at the end of the input or on a failure (then Error() is set: a read
-  // error, or an input that ends inside a packet).
+  // null at the end of the input or on a read error (then Error() is set).
+  // Damage met on the way (an input that ends inside a packet, garbage, a
+  // change of packet size) is skipped and told by Damage().
   const uint8_t* Next();
 
   const std::string& Error() const { return error_; }
+  // One line per damage met, in input order.
+  const std::vector<std::string>& Damage() const { return damage_; }
   int PacketSize() const { return stride_; }
   uint64_t Packets() const { return packets_; }
   uint64_t SkippedBytes() const { return skipped_; }
@@ -48,7 +51,12 @@ class PacketReader {
   // Makes `need` bytes from pos_ available; false when the input ends first.
   bool Fill(std::size_t need);
   bool Resync();
-  bool Fail(const std::string& error);
+  // Whether a run of sync bytes `stride` apart starts at pos_ + `syncOffset`;
+  // unless `whole`, a run cut by the end of the input counts as far as it goes.
+  bool RunAt(int stride, std::size_t syncOffset, bool whole) const;
+  // The input ends with `left` bytes that make no whole packet.
+  void Cut(std::size_t left);
+  void NoteDamage(const std::string& line);
 
   InputFile& input_;
   std::vector<uint8_t> buffer_;
@@ -62,10 +70,8 @@ class PacketReader {
   uint64_t skipped_;
   uint64_t resyncs_;
   std::string error_;
+  std::vector<std::string> damage_;
 };
-
-// The whole input in memory (for a file of raw sections). False with a reason.
-bool ReadWholeInput(InputFile& input, std::vector<uint8_t>& data, std::string& error);
 
 }  // namespace ravel_dump
 

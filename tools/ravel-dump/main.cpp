@@ -1,6 +1,7 @@
 // ravel-dump: reads a capture end to end through the section parser's public
 // interface, the way a receiver application does, and prints what it holds.
 #include <cstdio>
+#include <cstring>
 #include <string>
 #include <vector>
 
@@ -28,6 +29,10 @@ using namespace ravel_dump;
 
 const int kExitBadInput = 1;
 const int kExitUsage = 2;
+// Enough of a file of sections to tell a transport stream given as one.
+const std::size_t kSectionsLook = 4096;
+// A chunk of a file of sections: many sections, and always one whole (4096 bytes at most).
+const std::size_t kSectionsChunk = 1u << 20;
 
 int Fail(const std::string& message) {
   std::fprintf(stderr, "ravel-dump: %s\n", message.c_str());
@@ -35,58 +40,66 @@ int Fail(const std::string& message) {
 }
 
 // A file of concatenated raw sections (each 3 + section_length bytes; 0xFF
-// bytes between them are stuffing).
+// bytes between them are stuffing), read as a stream: each section is handed
+// on once its bytes are in, and only one chunk and one section are held.
 bool ReadSections(InputFile& input, Capture& capture, Stats& stats, InputSummary& summary, std::string& error) {
-  std::vector<uint8_t> data;
-  if (!ReadWholeInput(input, data, error)) return false;
-  summary.bytes = data.size();
-  if (data.empty()) {
+  std::vector<uint8_t> head;
+  if (!input.Peek(kSectionsLook, head, error)) return false;
+  if (head.empty()) {
     error = input.Name() + ": empty input";
     return false;
   }
   std::size_t syncAt = 0;
   int stride = 0;
-  if (data[0] == 0x47 && PacketReader::FindLock(data.data(), data.size(), syncAt, stride) && syncAt == 0) {
+  if (head[0] == 0x47 && PacketReader::FindLock(head.data(), head.size(), syncAt, stride) && syncAt == 0) {
     error = input.Name() + ": a transport stream, not raw sections (drop --sections)";
     return false;
   }
+  std::vector<uint8_t> buffer(kSectionsChunk);
   std::size_t pos = 0;
+  std::size_t end = 0;
+  uint64_t base = 0;  // input offset of buffer[0]
   uint64_t sections = 0;
-  while (pos < data.size()) {
-    if (data[pos] == 0xFF) {
-      ++pos;
-      continue;
-    }
-    if (data.size() - pos < 3) {
-      error = input.Name() + ": truncated: the input ends inside a section header at byte " + std::to_string(pos);
-      return false;
-    }
-    std::size_t size = static_cast<std::size_t>(RavelSectionSize(data.data() + pos));
-    if (size > data.size() - pos) {
-      if (sections == 0) {
-        error = input.Name() + ": not a file of raw sections (the first would need " + std::to_string(size) +
-                " bytes, the input holds " + std::to_string(data.size() - pos) + ")";
-      } else {
-        error = input.Name() + ": truncated: the section at byte " + std::to_string(pos) + " needs " +
-                std::to_string(size) + " bytes, " + std::to_string(data.size() - pos) + " are left";
+  bool more = true;
+  for (;;) {
+    while (pos < end && buffer[pos] == 0xFF) ++pos;
+    const std::size_t need = end - pos < 3 ? 3 : static_cast<std::size_t>(RavelSectionSize(buffer.data() + pos));
+    if (end - pos < need && more) {
+      // Too few bytes for the next section: keep what is left, read on.
+      std::memmove(buffer.data(), buffer.data() + pos, end - pos);
+      base += pos;
+      end -= pos;
+      pos = 0;
+      long long n = input.Read(buffer.data() + end, buffer.size() - end, error);
+      if (n < 0) {
+        if (sections == 0) return false;
+        stats.Problem(error);
+        error.clear();
       }
-      return false;
-    }
-    pos += size;
-    ++sections;
-  }
-  // Only a walk that fits the file exactly gets here; now hand the sections on.
-  pos = 0;
-  while (pos < data.size()) {
-    if (data[pos] == 0xFF) {
-      ++pos;
+      if (n <= 0) more = false;
+      end += n > 0 ? static_cast<std::size_t>(n) : 0;
       continue;
     }
-    std::size_t size = static_cast<std::size_t>(RavelSectionSize(data.data() + pos));
+    if (pos == end) break;
+    if (end - pos < need) {
+      const std::string at = std::to_string(base + pos);
+      if (sections == 0) {
+        error = input.Name() + ": not a file of raw sections (the first would need " + std::to_string(need) +
+                " bytes, the input holds " + std::to_string(end - pos) + ")";
+        return false;
+      }
+      // What came before the cut stands.
+      stats.Problem(input.Name() + ": truncated: the section at byte " + at + " needs " + std::to_string(need) +
+                    " bytes, " + std::to_string(end - pos) + " are left");
+      pos = end;
+      break;
+    }
+    ++sections;
     ++stats.sectionsAssembled;
-    capture.OnSection(kNoPid, data.data() + pos, size);
-    pos += size;
+    capture.OnSection(kNoPid, buffer.data() + pos, need);
+    pos += need;
   }
+  summary.bytes = base + pos;
   uint64_t accepted = 0;
   for (const KindStats& k : stats.kinds) accepted += k.sections;
   if (sections > 0 && accepted == 0) {
@@ -96,8 +109,8 @@ bool ReadSections(InputFile& input, Capture& capture, Stats& stats, InputSummary
   return true;
 }
 
-bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, InputSummary& summary,
-                         std::string& error) {
+bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, Stats& stats,
+                         InputSummary& summary, std::string& error) {
   PacketReader reader(input);
   if (!reader.Start(error)) return false;
   Progress progress(options.progress, input.Size());
@@ -112,10 +125,17 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   summary.skippedBytes = reader.SkippedBytes();
   summary.resyncs = reader.Resyncs();
   summary.bytes = reader.Offset();
-  // A stop request ends the input where it is, inside a packet or not.
-  if (!reader.Error().empty() && !StopRequested()) {
-    error = reader.Error();
-    return false;
+  // Damage costs only the bytes it spoils: what was read before and after it stands.
+  for (const std::string& line : reader.Damage()) {
+    // A stop request ends the input where it is, inside a packet or not.
+    if (!StopRequested()) stats.Problem(line);
+  }
+  if (!reader.Error().empty()) {
+    if (reader.Packets() == 0) {
+      error = reader.Error();
+      return false;
+    }
+    stats.Problem(reader.Error());
   }
   return true;
 }
@@ -168,7 +188,7 @@ int main(int argc, char** argv) {
     } else {
       demux.RestrictTo(options.pids);
     }
-    if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (!ReadTransportStream(input, options, demux, stats, inputSummary, error)) return Fail(error);
     if (input.Udp() != nullptr && input.Udp()->IgnoredDatagrams() > 0) {
       stats.Problem(std::to_string(input.Udp()->IgnoredDatagrams()) + " of " +
                     std::to_string(input.Udp()->Datagrams()) +
