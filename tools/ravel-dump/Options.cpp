@@ -102,7 +102,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
                 << "joined) is read as it arrives, until its end or SIGINT/SIGTERM, which end the run as the end\n"
                 << "of the input does.\n"
                 << "A report of packets, continuity breaks, CRC failures and tables goes to stderr at the end.\n"
-                << "Exit status: 0 done, 1 unreadable or bad input, 2 bad command line.\n";
+                << "Damage (a cut end, garbage, a change of packet size) is reported and skipped.\n"
+                << "Exit status: 0 something was read, 1 unreadable or bad input, 2 bad command line.\n";
       return ParseOutcome::kExitOk;
     }
     if (result.count("version")) {
