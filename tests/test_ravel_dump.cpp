@@ -456,7 +456,7 @@ TEST_F(RavelDumpTest, PacketSizesAndGarbageGiveTheSameTables) {
   EXPECT_NE(std::string::npos, piped.err.find("report: standard input"));
 }
 
-TEST_F(RavelDumpTest, RepeatedTableIsShownOnceWithItsCount) {
+TEST_F(RavelDumpTest, RepeatedTableIsShownAgainOnlyWhenItChanges) {
   Bytes v3 = PatSection(0x1234, 3, {{1, 0x0100}});
   Bytes v4 = PatSection(0x1234, 4, {{1, 0x0100}, {2, 0x0101}});
   sb::PacketWriter writer(0x0000);
@@ -465,12 +465,15 @@ TEST_F(RavelDumpTest, RepeatedTableIsShownOnceWithItsCount) {
   writer.AddSection(v3);  // back to the first contents: the same table again
   ToolRun run = Run({Write("pat.ts", writer.Stream())});
   ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_NE(std::string::npos, run.out.find("version 3, section 0 of 1, seen 5 times\n"));
-  EXPECT_NE(std::string::npos, run.out.find("version 4, section 0 of 1, seen 2 times\n"));
+  const size_t first = run.out.find("version 3, section 0 of 1\n");
+  const size_t change = run.out.find("version 4, section 0 of 1, changed\n");
+  const size_t back = run.out.find("version 3, section 0 of 1, changed\n");
   size_t headers = 0;
   for (size_t at = run.out.find("== "); at != std::string::npos; at = run.out.find("\n== ", at + 1)) ++headers;
-  EXPECT_EQ(2u, headers);
-  EXPECT_LT(run.out.find("version 3"), run.out.find("version 4"));  // first-seen order
+  EXPECT_EQ(3u, headers) << run.out;
+  EXPECT_LT(first, change);
+  EXPECT_LT(change, back);
+  EXPECT_NE(std::string::npos, back);
   EXPECT_NE(std::string::npos, run.out.find("The number of PMT Table Info=[2]\n"));
 }
 
@@ -483,7 +486,7 @@ TEST_F(RavelDumpTest, CorruptSectionsAreCountedNotShown) {
   writer.AddSection(good);
   ToolRun run = Run({Write("pat.ts", writer.Stream())});
   ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_NE(std::string::npos, run.out.find("seen 1 time\n"));
+  EXPECT_NE(std::string::npos, run.out.find("section 0 of 1\n"));
   EXPECT_NE(std::string::npos, run.err.find("2 assembled, 1 CRC failures"));
   EXPECT_NE(std::string::npos, run.err.find("PID 0x0000 table_id 0x00: CRC failure"));
 }
@@ -668,7 +671,7 @@ TEST_F(RavelDumpTest, RawSectionsAreReadWithoutPids) {
                             PatSection(0x1234, 3, {{1, 0x0100}})});
   ToolRun run = Run({"--sections", Write("all.sections", sections)});
   ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_NE(std::string::npos, run.out.find("== PAT: table_id 0x00, id 0x1234, version 3, section 0 of 1, seen 2 times"));
+  EXPECT_NE(std::string::npos, run.out.find("== PAT: table_id 0x00, id 0x1234, version 3, section 0 of 1\n"));
   EXPECT_NE(std::string::npos, run.out.find("== AIT: table_id 0x74"));
   EXPECT_NE(std::string::npos, run.err.find("input: " + std::to_string(sections.size()) + " bytes of raw sections"));
 }
@@ -826,7 +829,7 @@ TEST_F(RavelDumpTest, DumpShowsEachTableOnceInFirstSeenOrder) {
             headers)
       << run.out;
   EXPECT_NE(std::string::npos, run.out.find("== EIT p/f on PID 0x0027: table_id 0x4e, id 0x0642, version 0, "
-                                            "2 sections up to number 1, seen 1 time\n"));
+                                            "2 sections up to number 1\n"));
   // The two EIT sections are joined with the table's operator+=: one dump, both events.
   EXPECT_NE(std::string::npos, run.out.find("##################### Event Information [1] #####################\n"));
   EXPECT_NE(std::string::npos, run.out.find("Stream Information. Size=[5]\n"));
@@ -1140,10 +1143,76 @@ TEST_F(RavelDumpTest, StopSignalEndsPipesAndFifosAsTheirEnd) {
     EXPECT_NE(std::string::npos, run.err.find("input: 143 packets of 188 bytes")) << run.err;
   }
 }
+
+// A live user sees each table as it completes, not at the end of the input.
+TEST_F(RavelDumpTest, TablesAppearWhileThePipeIsStillOpen) {
+  struct Case {
+    const char* name;
+    std::vector<std::string> args;
+    const char* shown;  // in the output before the input ends
+  } cases[] = {
+      {.name = "dump", .args = {"-"}, .shown = "== PAT on PID 0x0000"},
+      {.name = "JSON lines", .args = {"--jsonl", "-"}, .shown = "\"kind\":\"PAT\""},
+  };
+  const Bytes sample = Sample();
+  for (const Case& c : cases) {
+    SCOPED_TRACE(c.name);
+    int ends[2] = {-1, -1};
+    ASSERT_EQ(0, pipe2(ends, O_CLOEXEC));  // the tool holds no writing end: closing ours ends its input
+    const pid_t tool = Start(c.args, ends[0]);
+    close(ends[0]);
+    const bool whole = write(ends[1], sample.data(), sample.size()) == static_cast<ssize_t>(sample.size());
+    const std::string out = Path(".stdout");
+    const bool shown = WaitUntil([&] { return ReadFile(out).find(c.shown) != std::string::npos; });
+    close(ends[1]);
+    ToolRun run = Finish(tool, 0);
+    ASSERT_TRUE(whole);
+    EXPECT_TRUE(shown) << run.out;
+    EXPECT_EQ(0, run.status) << run.err;
+  }
+}
 #endif  // RAVEL_DUMP_EMULATOR
 
 }  // namespace
 
+
+// --- Events as they happen -------------------------------------------------
+
+TEST_F(RavelDumpTest, JsonLinesTellEachEventOnce) {
+  Bytes corrupt = PatSection(0x0640, 2, {{0x0641, 0x0100}});
+  corrupt[9] ^= 0x01;  // the CRC no longer verifies
+  Bytes stream = sb::Cat({ReceiverStream(), Packets(0x0012, {corrupt}),
+                          Packets(0x0000, {PatSection(0x0640, 2, {{0x0641, 0x0100}, {0x0642, 0x1FC8}})}, 3)});
+  ToolRun run = Run({"--jsonl", Write("events.ts", stream)});
+  ASSERT_EQ(0, run.status) << run.err;
+  std::vector<nlohmann::json> events;
+  std::istringstream lines(run.out);
+  for (std::string line; std::getline(lines, line);) events.push_back(nlohmann::json::parse(line));
+  struct Case {
+    const char* what;
+    nlohmann::json members;
+    size_t count;
+  } cases[] = {
+      {.what = "first PAT", .members = {{"event", "table"}, {"kind", "PAT"}, {"change", false}, {"version", 1}},
+       .count = 1},
+      {.what = "changed PAT", .members = {{"event", "table"}, {"kind", "PAT"}, {"change", true}, {"version", 2}},
+       .count = 1},
+      {.what = "module", .members = {{"event", "module"}, {"pid", 0x0115}, {"module_id", 1}, {"version", 1}},
+       .count = 1},
+      {.what = "time", .members = {{"event", "time"}, {"kind", "TOT"}, {"time", "2013-05-10 12:34:56"}}, .count = 1},
+      {.what = "problem", .members = {{"event", "problem"}, {"problem", "PID 0x0012 table_id 0x00: CRC failure"}},
+       .count = 1},
+  };
+  for (const Case& c : cases) {
+    size_t count = 0;
+    for (const nlohmann::json& event : events) {
+      bool match = true;
+      for (const auto& member : c.members.items()) match = match && event.value(member.key(), nlohmann::json()) == member.value();
+      count += match;
+    }
+    EXPECT_EQ(c.count, count) << c.what << "\n" << run.out;
+  }
+}
 
 // --- One table of tables -----------------------------------------------------
 
@@ -1191,11 +1260,11 @@ TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
   struct Case {
     const char* line;
   } cases[] = {
-      {/*line=*/"== EIT schedule: table_id 0x51, id 0x0051, version 0, 1 sections up to number 0, seen 1 time "
+      {/*line=*/"== EIT schedule: table_id 0x51, id 0x0051, version 0, 1 sections up to number 0 "
                 "(no class in the library for this table_id)\n"},
-      {"== CAT: table_id 0x01, id 0x0001, version 0, section 0 of 1, seen 1 time "
+      {"== CAT: table_id 0x01, id 0x0001, version 0, section 0 of 1 "
        "(no class in the library for this table_id)\n"},
-      {"== other: table_id 0x80, id 0x0080, version 0, section 0 of 1, seen 1 time "
+      {"== other: table_id 0x80, id 0x0080, version 0, section 0 of 1 "
        "(no class in the library for this table_id)\n"},
   };
   for (const Case& c : cases) EXPECT_NE(std::string::npos, shown.find(c.line)) << c.line;

@@ -19,12 +19,19 @@ std::string Where(int pid, const uint8_t* section) {
 
 Capture::Capture(Stats& stats) : stats_(stats), demux_(nullptr) { carousel_.SetListener(&objects_); }
 
+void Capture::SetEvents(LiveEvents* events) {
+  events_ = events;
+  events->ForwardCarouselTo(&objects_);
+  carousel_.SetListener(events);
+}
+
 void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   TableKind kind = RavelCSafeSection::GetKind(section, static_cast<int>(size));
   KindStats& kindStats = stats_.Kind(kind);
   // Broadcasters resend PSI/SI many times a second: an unchanged repeat only counts.
   if (registry_.CountRepeat(pid, section, size)) {
     ++kindStats.sections;
+    if (events_ != nullptr) events_->OnTableSection(registry_.LastTable());
     return;
   }
   // The one parse of these bytes: the library checks them, then its class parses them.
@@ -53,7 +60,9 @@ void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   StoredSection& stored = registry_.Add(pid, kind, std::move(parsed), result);
   if (result == kRavelSafeOk) {
     UseOnArrival(pid, kind, *stored.parsed, demux_, carousel_);
-  } else if (result == kRavelSafeRefused) {
+  }
+  if (events_ != nullptr) events_->OnTableSection(registry_.LastTable());
+  if (result == kRavelSafeRefused) {
     ++kindStats.parseFailures;
     stats_.Problem(Where(pid, section) + ": the library's parse gave " +
                    std::to_string(stored.parsed->GetParseResult()));

@@ -12,6 +12,7 @@
 
 #include "Carousel.h"
 #include "Demux.h"
+#include "LiveEvents.h"
 #include "ObjectCarousel.h"
 #include "Stats.h"
 #include "TableRegistry.h"
@@ -26,6 +27,9 @@ class Capture : public SectionSink {
   void SetDemux(Demux* demux) { demux_ = demux; }
 
   void OnSection(int pid, const uint8_t* section, std::size_t size) override;
+  // Told of every section of a table as it arrives; carousel events pass
+  // through it to the object carousels.
+  void SetEvents(LiveEvents* events);
 
   const TableRegistry& Registry() const { return registry_; }
   const CarouselCollector& Carousel() const { return carousel_; }
@@ -35,6 +39,7 @@ class Capture : public SectionSink {
  private:
   Stats& stats_;
   Demux* demux_;
+  LiveEvents* events_ = nullptr;
   TableRegistry registry_;
   CarouselCollector carousel_;
   ObjectCarousels objects_;

@@ -61,6 +61,8 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
       ("j,json", "Print the summary as JSON")
+      ("jsonl", "Print one JSON object a line per event as it happens (a table new or changed, a module "
+       "complete, a time, a problem), for programs that follow a live input")
       ("x,extract-modules", "Rebuild the carousel modules and write each complete one to DIR, inflated when "
        "its DII says it is compressed",
        cxxopts::value<std::string>(), "DIR")
@@ -91,8 +93,9 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     cxxopts::ParseResult result = parser.parse(argc, argv);
     if (result.count("help")) {
       std::cout << parser.help({""}) << "\n"
-                << "Without --summary or --json, each distinct table is dumped by the library's own Show(),\n"
-                << "in the order first seen. Section PIDs are those a receiver reads (PAT, NIT, SDT, EIT,\n"
+                << "Without --summary or --json, each table is dumped by the library's own Show() as soon as\n"
+                << "it is complete, and again, marked as changed, when its version or contents change.\n"
+                << "Section PIDs are those a receiver reads (PAT, NIT, SDT, EIT,\n"
                 << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
                 << "PMTs name), and any PID where a DSM-CC carousel or stream-event section starts;\n"
                 << "other PIDs are read with --pid.\n"
@@ -123,6 +126,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     options.sections = result.count("sections") > 0;
     if (result.count("summary")) options.mode = OutputMode::kSummary;
     if (result.count("json")) options.mode = OutputMode::kJson;
+    if (result.count("jsonl")) options.mode = OutputMode::kJsonLines;
     if (result.count("extract-modules")) {
       options.extractDirectory = result["extract-modules"].as<std::string>();
       if (options.extractDirectory.empty()) {

@@ -9,7 +9,7 @@
 
 namespace ravel_dump {
 
-enum class OutputMode { kDump, kSummary, kJson, kNone };
+enum class OutputMode { kDump, kSummary, kJson, kJsonLines, kNone };
 
 struct Options {
   std::string input;             // path, "-" for standard input, or udp://...

@@ -17,6 +17,9 @@ namespace ravel_dump {
 // saying what it is and how often it was seen, then the table's own Show().
 // The sections of a table are joined with its operator+= first.
 void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out);
+// One table so: as it completes, new or changed, or at the end, with its count.
+enum class TableMoment { kNew, kChanged, kAtEnd };
+void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, std::FILE* out);
 
 // The summary of the tables read (the latest version of each) and of the
 // carousel modules.

@@ -25,6 +25,7 @@ const char* PidRoleName(PidRole role) {
 }
 
 void Stats::Problem(const std::string& line) {
+  if (onProblem) onProblem(line);
   if (problems.size() < kProblemLines) problems.push_back(line);
 }
 

@@ -3,6 +3,7 @@
 #define RAVEL_DUMP_STATS_H
 
 #include <cstdint>
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -60,6 +61,8 @@ struct Stats {
   // The first few problems, each on one line, for the report.
   std::vector<std::string> problems;
   void Problem(const std::string& line);
+  // Told of every problem as it is met (those past the report's few too).
+  std::function<void(const std::string&)> onProblem;
 
   KindStats& Kind(TableKind kind) { return kinds[kind]; }
 };

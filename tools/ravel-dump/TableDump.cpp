@@ -7,7 +7,7 @@
 namespace ravel_dump {
 namespace {
 
-std::string Describe(const TableEntry& table) {
+std::string Describe(const TableEntry& table, TableMoment moment) {
   char text[256];
   std::string line = std::string("== ") + RavelCSafeSection::GetKindName(table.kind);
   if (table.pid != kNoPid) {
@@ -42,8 +42,12 @@ std::string Describe(const TableEntry& table) {
       line += text;
     }
   }
-  uint64_t times = table.TimesSeen();
-  line += ", seen " + std::to_string(times) + (times == 1 ? " time" : " times");
+  if (moment == TableMoment::kChanged) line += ", changed";
+  // Counted by the end only; a table told as it completes was just seen.
+  if (moment == TableMoment::kAtEnd) {
+    uint64_t times = table.TimesSeen();
+    line += ", seen " + std::to_string(times) + (times == 1 ? " time" : " times");
+  }
   return line;
 }
 
@@ -86,28 +90,30 @@ class JoinedTable {
 
 }  // namespace
 
-void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out) {
-  for (const auto& entry : registry.Tables()) {
-    const TableEntry& table = *entry;
-    if (!filter.Accepts(table.kind, table.tableId)) continue;
-    std::string line = Describe(table);
-    std::unique_ptr<JoinedTable> joined;
-    {
-      TraceOutput::QuietScope quiet(trace);
-      joined.reset(new JoinedTable(table));
-    }
-    line += joined->refused;
-    if (joined->Empty() && joined->refused.empty()) line += " (no class in the library for this table_id)";
-    // The tool's own line starts on a line of its own, even after a dump
-    // whose last line was left open.
-    if (!trace.ShowEndedLine()) std::fputc('\n', out);
-    std::fprintf(out, "%s\n", line.c_str());
-    if (!joined->Empty()) {
-      TraceOutput::ShowScope show(trace, out);
-      joined->Show();
-    }
+void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, std::FILE* out) {
+  std::string line = Describe(table, moment);
+  std::unique_ptr<JoinedTable> joined;
+  {
+    TraceOutput::QuietScope quiet(trace);
+    joined.reset(new JoinedTable(table));
+  }
+  line += joined->refused;
+  if (joined->Empty() && joined->refused.empty()) line += " (no class in the library for this table_id)";
+  // The tool's own line starts on a line of its own, even after a dump
+  // whose last line was left open.
+  if (!trace.ShowEndedLine()) std::fputc('\n', out);
+  std::fprintf(out, "%s\n", line.c_str());
+  if (!joined->Empty()) {
+    TraceOutput::ShowScope show(trace, out);
+    joined->Show();
   }
   if (!trace.ShowEndedLine()) std::fputc('\n', out);
+}
+
+void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out) {
+  for (const auto& entry : registry.Tables()) {
+    if (filter.Accepts(entry->kind, entry->tableId)) DumpTable(*entry, TableMoment::kAtEnd, trace, out);
+  }
 }
 
 }  // namespace ravel_dump

@@ -134,6 +134,7 @@ bool TableRegistry::CountRepeat(int pid, const uint8_t* section, std::size_t siz
   Place place = Locate(pid, section, size);
   if (!place.same) return false;
   ++arrivals_;
+  last_ = place.table;
   place.table->lastSeen = arrivals_;
   ++place.table->sections[place.number].seen;
   return true;
@@ -145,6 +146,7 @@ StoredSection& TableRegistry::Add(int pid, TableKind kind, std::unique_ptr<Ravel
   Place place = Locate(pid, parsed->GetData(), static_cast<std::size_t>(parsed->GetDataSize()));
   TableEntry* table = place.table;
   if (table == nullptr) table = NewEntry(place.key, pid, kind, place.header);
+  last_ = table;
   table->lastSeen = arrivals_;
 
   StoredSection& stored = table->sections[place.number];

@@ -68,6 +68,8 @@ class TableRegistry {
   StoredSection& Add(int pid, TableKind kind, std::unique_ptr<RavelCSafeSection> parsed, RavelSafeResult result);
 
   const std::vector<std::unique_ptr<TableEntry>>& Tables() const { return tables_; }
+  // The table the last section counted or kept went to.
+  const TableEntry& LastTable() const { return *last_; }
   uint64_t SectionsAdded() const { return arrivals_; }
 
  private:
@@ -94,6 +96,7 @@ class TableRegistry {
   };
   std::unordered_map<Key, std::size_t, KeyHash> latest_;
   uint64_t arrivals_ = 0;
+  const TableEntry* last_ = nullptr;
 };
 
 // 64-bit FNV-1a of a byte run: the identity of a section's contents.

@@ -2,6 +2,7 @@
 // interface, the way a receiver application does, and prints what it holds.
 #include <cstdio>
 #include <cstring>
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -10,6 +11,7 @@
 #include "CaptureKind.h"
 #include "Demux.h"
 #include "Input.h"
+#include "LiveEvents.h"
 #include "Options.h"
 #include "Output.h"
 #include "PacketReader.h"
@@ -169,6 +171,15 @@ int main(int argc, char** argv) {
   }
 
   Capture capture(stats);
+  // Tables and events go out as they happen; the summaries wait for the end.
+  std::unique_ptr<LiveEvents> events;
+  if (options.mode == OutputMode::kDump || options.mode == OutputMode::kJsonLines) {
+    events.reset(new LiveEvents(options.mode == OutputMode::kDump ? LiveFormat::kDump : LiveFormat::kJsonLines,
+                                options.tables, trace, stdout));
+    capture.SetEvents(events.get());
+    LiveEvents* told = events.get();
+    stats.onProblem = [told](const std::string& line) { told->OnProblem(line); };
+  }
   // Files are written while the capture is read, as their modules complete.
   if (!options.filesDirectory.empty() && !capture.Objects().WriteFilesTo(options.filesDirectory, error)) {
     return Fail(error);
@@ -240,7 +251,9 @@ int main(int argc, char** argv) {
   }
   switch (options.mode) {
     case OutputMode::kDump:
-      DumpTables(capture.Registry(), options.tables, trace, stdout);
+      events->End(capture.Registry());
+      break;
+    case OutputMode::kJsonLines:
       break;
     case OutputMode::kSummary:
       PrintSummaryText(summary, stdout);
