@@ -7,6 +7,11 @@
 namespace ravel_dump {
 namespace {
 
+// Modules in progress kept at most: their bytes together, and how many blocks
+// of any module may pass without one for them before they are given up.
+const std::size_t kInProgressBytes = 4u << 20;
+const uint64_t kInProgressAgeBlocks = 100000;
+
 unsigned int BlockCount(uint32_t size, uint16_t blockSize) {
   if (blockSize == 0) return 0;
   return static_cast<unsigned int>((static_cast<uint64_t>(size) + blockSize - 1) / blockSize);
@@ -39,6 +44,18 @@ void CarouselCollector::AddModuleList(int pid, uint32_t downloadId, uint16_t blo
     found = listings_.emplace(key, Download()).first;
   }
   found->second.blockSize = blockSize;
+  // A DII that changes drops the blocks of the module versions it no longer lists.
+  std::set<std::pair<uint16_t, uint8_t>> listed;
+  for (const ModuleListing& module : modules) listed.insert({module.id, module.version});
+  std::vector<ModuleKey> unlisted;
+  for (const auto& progress : inProgress_) {
+    const ModuleKey& held = progress.first;
+    if (std::get<0>(held) == pid && std::get<1>(held) == downloadId &&
+        listed.count({std::get<2>(held), std::get<3>(held)}) == 0) {
+      unlisted.push_back(held);
+    }
+  }
+  for (const ModuleKey& held : unlisted) DropInProgress(held);
   for (const ModuleListing& module : modules) found->second.modules[{module.id, module.version}] = module;
   for (const ModuleListing& module : modules) NoteIfComplete(ModuleKey(pid, downloadId, module.id, module.version));
 }
@@ -67,6 +84,12 @@ void CarouselCollector::NoteIfComplete(const ModuleKey& key) {
   const unsigned int total = BlockCount(listing->size, blockSize);
   if ((blockSize == 0 && listing->size != 0) || held < total || BlocksHeld(key, listing->size, blockSize) != total) return;
   completed_.insert(key);
+  // Complete: its blocks are the module now, kept for the outputs.
+  auto progress = inProgress_.find(key);
+  if (progress != inProgress_.end()) {
+    for (const auto& block : blocks->second) bytesInProgress_ -= block.second.size();
+    inProgress_.erase(progress);
+  }
   ModuleRef module;
   module.pid = std::get<0>(key);
   module.downloadId = std::get<1>(key);
@@ -96,7 +119,33 @@ void CarouselCollector::AddBlock(int pid, uint32_t downloadId, uint16_t moduleId
   auto& blocks = blocks_[key];
   if (blocks.find(blockNumber) != blocks.end()) return;
   blocks[blockNumber].assign(data, data + size);
+  if (completed_.count(key) == 0) {
+    inProgress_[key] = ++blocksSeen_;
+    bytesInProgress_ += size;
+  }
   NoteIfComplete(key);
+  LimitInProgress();
+}
+
+void CarouselCollector::DropInProgress(const ModuleKey& key) {
+  auto blocks = blocks_.find(key);
+  if (blocks != blocks_.end()) {
+    for (const auto& block : blocks->second) bytesInProgress_ -= block.second.size();
+    blocks_.erase(blocks);
+  }
+  inProgress_.erase(key);
+}
+
+void CarouselCollector::LimitInProgress() {
+  while (!inProgress_.empty()) {
+    auto oldest = inProgress_.begin();
+    for (auto it = inProgress_.begin(); it != inProgress_.end(); ++it) {
+      if (it->second < oldest->second) oldest = it;
+    }
+    const bool tooOld = blocksSeen_ - oldest->second > kInProgressAgeBlocks;
+    if (!tooOld && bytesInProgress_ <= kInProgressBytes) return;
+    DropInProgress(oldest->first);
+  }
 }
 
 unsigned int CarouselCollector::BlocksHeld(const ModuleKey& key, uint32_t size, uint16_t blockSize) const {

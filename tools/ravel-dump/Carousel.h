@@ -89,11 +89,21 @@ class CarouselCollector {
   const ModuleListing* Listing(const ModuleKey& key, uint16_t& blockSize) const;
   // Tells the listener when the module has just become complete.
   void NoteIfComplete(const ModuleKey& key);
+  // Forgets the blocks of a module in progress.
+  void DropInProgress(const ModuleKey& key);
+  // Modules in progress past the age or the total size kept are dropped,
+  // the longest unfed first: a carousel that never completes holds no more.
+  void LimitInProgress();
 
   std::map<DownloadKey, Download> listings_;
   std::vector<DownloadKey> order_;
   std::map<ModuleKey, std::map<uint16_t, std::vector<uint8_t>>> blocks_;
   std::set<ModuleKey> completed_;
+  // Modules in progress: the block count when each last got a block, and the
+  // bytes they hold together.
+  std::map<ModuleKey, uint64_t> inProgress_;
+  std::size_t bytesInProgress_ = 0;
+  uint64_t blocksSeen_ = 0;
   CarouselListener* listener_ = nullptr;
 };
 

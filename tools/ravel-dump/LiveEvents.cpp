@@ -10,19 +10,6 @@ namespace {
 
 using nlohmann::json;
 
-// What tells one table from another across its versions: PID, table_id, the
-// table id extension and, for the EIT and SDT, the stream ids of the body; a
-// section that is a table of its own (DSM-CC blocks, TDT) by its number too.
-uint64_t Identity(const TableEntry& table) {
-  RavelSectionHeader header;
-  const StoredSection& first = table.sections.begin()->second;
-  RavelCSafeSection::ReadHeader(first.Bytes(), static_cast<int>(first.Size()), header);
-  uint64_t identity = (static_cast<uint64_t>(table.pid & 0x1FFF) << 48) | (static_cast<uint64_t>(table.tableId) << 40) |
-                      (static_cast<uint64_t>(table.longForm ? table.extension : 0) << 24);
-  if (RavelCSafeSection::JoinsSections(table.tableId)) return identity ^ (header.iStreamIds * 0x9E3779B97F4A7C15ull);
-  return identity | table.sections.begin()->first;
-}
-
 // The date and time of a TDT or TOT (a 16-bit MJD and six BCD digits),
 // "2024-05-14 19:00:00", as broadcast, in local time.
 std::string BroadcastTime(const StoredSection& section) {
@@ -53,15 +40,14 @@ void LiveEvents::Emit(const std::string& line) {
 }
 
 void LiveEvents::OnTableSection(const TableEntry& table) {
-  const uint64_t identity = Identity(table);
-  auto told = told_.find(identity);
-  if (told != told_.end() && told->second == table.order) return;
+  auto told = told_.find(table.identity);
+  if (told != told_.end() && told->second == table.serial) return;
   if (!table.Complete()) return;
   const bool change = told != told_.end();
-  told_[identity] = table.order;
+  told_[table.identity] = table.serial;
   if (!filter_.Accepts(table.kind, table.tableId)) return;
   if (format_ == LiveFormat::kDump) {
-    shown_.insert(table.order);
+    if (settle_) settle_();
     DumpTable(table, change ? TableMoment::kChanged : TableMoment::kNew, trace_, out_);
     std::fflush(out_);
     return;
@@ -91,7 +77,8 @@ void LiveEvents::OnProblem(const std::string& line) {
 void LiveEvents::End(const TableRegistry& registry) {
   if (format_ != LiveFormat::kDump) return;
   for (const auto& entry : registry.Tables()) {
-    if (shown_.count(entry->order) == 0 && filter_.Accepts(entry->kind, entry->tableId)) {
+    // A complete table was dumped as it completed.
+    if (!entry->Complete() && filter_.Accepts(entry->kind, entry->tableId)) {
       DumpTable(*entry, TableMoment::kAtEnd, trace_, out_);
     }
   }

@@ -9,9 +9,9 @@
 
 #include <cstdint>
 #include <cstdio>
+#include <functional>
 #include <string>
 #include <unordered_map>
-#include <unordered_set>
 
 #include "Carousel.h"
 #include "TableKind.h"
@@ -28,6 +28,9 @@ class LiveEvents : public CarouselListener {
 
   // Carousel events go on to `next` (the object carousels) after being told.
   void ForwardCarouselTo(CarouselListener* next) { next_ = next; }
+  // Called before a table is dumped: the texts' coding follows the standard
+  // the tables read so far show.
+  void BeforeDump(std::function<void()> settle) { settle_ = settle; }
 
   // A section of `table` has just arrived, new or a repeat.
   void OnTableSection(const TableEntry& table);
@@ -46,10 +49,9 @@ class LiveEvents : public CarouselListener {
   TraceOutput& trace_;
   std::FILE* out_;
   CarouselListener* next_ = nullptr;
-  // Per table identity (PID, table_id, id, and what else tells tables apart),
-  // the order number of the version last told.
-  std::unordered_map<uint64_t, std::size_t> told_;
-  std::unordered_set<std::size_t> shown_;  // order numbers of the tables dumped
+  std::function<void()> settle_;
+  // Per table identity, the serial number of the version last told.
+  std::unordered_map<uint64_t, uint64_t> told_;
 };
 
 }  // namespace ravel_dump

@@ -80,9 +80,18 @@ uint64_t TableEntry::TimesSeen() const {
   return times;
 }
 
-TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header) {
+TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header,
+                                    unsigned int number) {
   std::unique_ptr<TableEntry> entry(new TableEntry);
-  entry->order = tables_.size();
+  uint64_t identity = (static_cast<uint64_t>(pid & 0x1FFF) << 48) | (static_cast<uint64_t>(header.iTableId) << 40) |
+                      (static_cast<uint64_t>(header.bLongForm ? header.iTableIdExtension : 0) << 24);
+  if (header.bLongForm && RavelCSafeSection::JoinsSections(header.iTableId)) {
+    identity ^= header.iStreamIds * 0x9E3779B97F4A7C15ull;
+  } else {
+    identity |= number;
+  }
+  entry->identity = identity;
+  entry->serial = ++serials_;
   entry->pid = pid;
   entry->kind = kind;
   entry->tableId = header.iTableId;
@@ -91,7 +100,22 @@ TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, con
   entry->version = header.iVersionNumber;
   entry->lastSectionNumber = header.iLastSectionNumber;
   entry->firstSeen = arrivals_;
+  auto previous = byIdentity_.find(identity);
+  if (previous != byIdentity_.end()) {
+    // The new version takes the old one's place; the old one is forgotten.
+    const std::size_t slot = previous->second;
+    latest_.erase(keys_[slot]);
+    entry->order = slot;
+    entry->firstSeen = tables_[slot]->firstSeen;
+    tables_[slot] = std::move(entry);
+    keys_[slot] = key;
+    latest_[key] = slot;
+    return tables_[slot].get();
+  }
+  entry->order = tables_.size();
+  byIdentity_[identity] = tables_.size();
   latest_[key] = tables_.size();
+  keys_.push_back(key);
   tables_.push_back(std::move(entry));
   return tables_.back().get();
 }
@@ -145,7 +169,7 @@ StoredSection& TableRegistry::Add(int pid, TableKind kind, std::unique_ptr<Ravel
   ++arrivals_;
   Place place = Locate(pid, parsed->GetData(), static_cast<std::size_t>(parsed->GetDataSize()));
   TableEntry* table = place.table;
-  if (table == nullptr) table = NewEntry(place.key, pid, kind, place.header);
+  if (table == nullptr) table = NewEntry(place.key, pid, kind, place.header, place.number);
   last_ = table;
   table->lastSeen = arrivals_;
 

@@ -1,4 +1,6 @@
-// Distinct tables in the order first seen. Broadcasters resend PSI/SI many
+// Tables in the order first seen, each in its latest version only (a new
+// version or new contents take the old one's place, so that memory does not
+// grow with the length of a live input). Broadcasters resend PSI/SI many
 // times a second: a section that comes again unchanged only counts as seen
 // once more. Sections of one table (same PID, table_id, table id extension,
 // version and, for the EIT and SDT, the stream ids of the body) are gathered
@@ -38,6 +40,11 @@ struct StoredSection {
 
 struct TableEntry {
   std::size_t order = 0;
+  // What tells this table from others across its versions (PID, table_id,
+  // id, the EIT's and SDT's stream ids; the section number of a section that
+  // is a table of its own), and which version this is of all seen.
+  uint64_t identity = 0;
+  uint64_t serial = 0;
   int pid = kNoPid;
   TableKind kind = kRavelKindOther;
   uint8_t tableId = 0;
@@ -87,9 +94,13 @@ class TableRegistry {
     bool same = false;
   };
   Place Locate(int pid, const uint8_t* section, std::size_t size) const;
-  TableEntry* NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header);
+  TableEntry* NewEntry(const Key& key, int pid, TableKind kind, const RavelSectionHeader& header,
+                       unsigned int number);
 
   std::vector<std::unique_ptr<TableEntry>> tables_;
+  std::vector<Key> keys_;  // the key of each of tables_
+  std::unordered_map<uint64_t, std::size_t> byIdentity_;
+  uint64_t serials_ = 0;
   // Looked up for every section that arrives, repeats included.
   struct KeyHash {
     std::size_t operator()(const Key& key) const;

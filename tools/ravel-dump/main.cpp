@@ -31,6 +31,8 @@ using namespace ravel_dump;
 
 const int kExitBadInput = 1;
 const int kExitUsage = 2;
+// Dumps before which the standard is looked for, while no table shows a sign of either.
+const int kStandardLooks = 64;
 // Enough of a file of sections to tell a transport stream given as one.
 const std::size_t kSectionsLook = 4096;
 // A chunk of a file of sections: many sections, and always one whole (4096 bytes at most).
@@ -177,6 +179,20 @@ int main(int argc, char** argv) {
     events.reset(new LiveEvents(options.mode == OutputMode::kDump ? LiveFormat::kDump : LiveFormat::kJsonLines,
                                 options.tables, trace, stdout));
     capture.SetEvents(events.get());
+    if (options.standard >= 0) {
+      trace.SetTextCoding(TextCodingOf(options.standard, options.rawText));
+    } else {
+      // Until a table shows a sign of either standard, each dump looks again.
+      int looks = 0;
+      bool settled = false;
+      events->BeforeDump([&capture, &trace, &options, looks, settled]() mutable {
+        if (settled) return;
+        StandardChoice choice = DetectStandard(BuildSummary(capture.Registry(), capture.Carousel(), trace));
+        RavelCfg_SetStandard(choice.standard);
+        trace.SetTextCoding(TextCodingOf(choice.standard, options.rawText));
+        settled = choice.reason.find("no sign") != 0 || ++looks >= kStandardLooks;
+      });
+    }
     LiveEvents* told = events.get();
     stats.onProblem = [told](const std::string& line) { told->OnProblem(line); };
   }
