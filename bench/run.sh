@@ -11,6 +11,9 @@
 #   ravel-dump / bare loop on the realistic capture,             target >= 0.8
 #   ravel-dump / bare loop on the SI-heavy capture,              target >= 0.3
 #   ravel-dump / libdvbpsi on the capture whose sections differ  (no target)
+# and ravel-dump's peak memory on captures of changing EIT content and of
+# carousels that never complete, at 1x and 16x their length (target: the
+# 16x peak within 25 % of the 1x one).
 #
 # Environment: RAVEL_BENCH_MB   size of each repeated capture in MB (default 300)
 #              RAVEL_BENCH_DISTINCT_MB size of the capture whose sections differ (default 100)
@@ -205,6 +208,32 @@ for kind in live epg distinct; do
   rm -f "$big"
 done
 
+# --- Peak memory --------------------------------------------------------------
+# ravel-dump over captures whose tables change on every repetition (made by
+# make_changing_capture.py), at 1x and 16x their length: its peak resident
+# memory (the maximum resident set GNU time reports) must not grow with the input.
+# Targets: the 16x peak within 25 % of the 1x one, for each kind.
+declare -A growth=()
+peak_kb() {  # file -> peak resident KB of ravel-dump --summary on it (GNU time's %M)
+  /usr/bin/time -f %M -o "$work/peak" "$dump" --summary --no-progress --quiet "$1" >/dev/null
+  cat "$work/peak"
+}
+if [ "$have_dump" = 1 ]; then
+  for kind in eit carousel; do
+    case "$kind" in eit) reps=20000 ;; carousel) reps=200 ;; esac
+    echo "Measuring peak memory on changing $kind captures (1x, 16x) ..." >&2
+    python3 "$root/bench/make_changing_capture.py" "$kind" "$reps" "$work/changing-1x.ts"
+    python3 "$root/bench/make_changing_capture.py" "$kind" $((reps * 16)) "$work/changing-16x.ts"
+    one=$(peak_kb "$work/changing-1x.ts")
+    sixteen=$(peak_kb "$work/changing-16x.ts")
+    mb() { awk -v b="$(stat -c %s "$1")" 'BEGIN { printf "%.0f MB", b / 1e6 }'; }
+    row "$kind changing: ravel-dump peak memory, 1x" "$one" "KB" "$(mb "$work/changing-1x.ts")"
+    row "$kind changing: ravel-dump peak memory, 16x" "$sixteen" "KB" "$(mb "$work/changing-16x.ts")"
+    growth[$kind]=$(awk -v a="$sixteen" -v b="$one" 'BEGIN { printf "%.1f", (a / b - 1) * 100 }')
+    rm -f "$work/changing-1x.ts" "$work/changing-16x.ts"
+  done
+fi
+
 # --- The table --------------------------------------------------------------
 cores=$(nproc 2>/dev/null || echo "?")
 cpu=$(awk -F': ' '/^model name/ { print $2; exit }' /proc/cpuinfo 2>/dev/null || true)
@@ -225,3 +254,6 @@ verdict() { awk -v r="$1" -v t="$2" 'BEGIN { if (r == "n/a") print "not measured
 echo "ravel-dump / bare loop, realistic capture (dvb-live.ts): $ratio_live (target >= 0.8: $(verdict "$ratio_live" 0.8))"
 echo "ravel-dump / bare loop, SI-heavy capture (dvb-epg.ts):   $ratio_epg (target >= 0.3: $(verdict "$ratio_epg" 0.3))"
 echo "ravel-dump / libdvbpsi, capture of distinct sections:    $ratio_distinct"
+below() { awk -v r="$1" -v t="$2" 'BEGIN { if (r == "") print "not measured"; else if (r + 0 < t) print "met"; else print "NOT met" }'; }
+echo "ravel-dump peak memory, 16x / 1x, changing EIT:        +${growth[eit]:-?} % (target < 25 %: $(below "${growth[eit]:-}" 25))"
+echo "ravel-dump peak memory, 16x / 1x, unfinished carousel: +${growth[carousel]:-?} % (target < 25 %: $(below "${growth[carousel]:-}" 25))"
