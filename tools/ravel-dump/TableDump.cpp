@@ -99,14 +99,13 @@ void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, 
   }
   line += joined->refused;
   if (joined->Empty() && joined->refused.empty()) line += " (no class in the library for this table_id)";
-  // The tool's own line starts on a line of its own, even after a dump
-  // whose last line was left open.
-  if (!trace.ShowEndedLine()) std::fputc('\n', out);
   std::fprintf(out, "%s\n", line.c_str());
   if (!joined->Empty()) {
     TraceOutput::ShowScope show(trace, out);
     joined->Show();
   }
+  // The next line (the tool's own) starts on a line of its own, even after
+  // a dump whose last line was left open.
   if (!trace.ShowEndedLine()) std::fputc('\n', out);
 }
 
