@@ -1214,6 +1214,21 @@ TEST_F(RavelDumpTest, JsonLinesTellEachEventOnce) {
   }
 }
 
+// A live input runs for days: a table that changes keeps its latest version
+// only, however many came before.
+TEST_F(RavelDumpTest, EachTableKeepsOnlyItsLatestVersion) {
+  sb::PacketWriter writer(0x0000);
+  const int kVersions = 40;
+  for (int v = 0; v < kVersions; ++v) {
+    writer.AddSection(PatSection(0x1234, static_cast<uint8_t>(v % 32), {{1, 0x100 + v}}));
+  }
+  ToolRun run = Run({"--summary", Write("versions.ts", writer.Stream())});
+  ASSERT_EQ(0, run.status) << run.err;
+  char row[128];
+  std::snprintf(row, sizeof row, "  %-20s %9d %9d %7d ", "PAT", kVersions, kVersions, 1);
+  EXPECT_NE(std::string::npos, run.err.find(row)) << run.err;
+}
+
 // --- One table of tables -----------------------------------------------------
 
 TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
