@@ -757,6 +757,22 @@ TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
       << text.out;
 }
 
+// A module version its DII no longer lists will not come whole: its blocks
+// are dropped, so that a carousel that changes holds no stale blocks.
+TEST_F(RavelDumpTest, ModulesInProgressAreDroppedWhenTheirDiiChanges) {
+  const uint16_t kBlock = 4066;
+  Bytes module = ModuleBytes(8000, 1);  // two blocks
+  std::vector<Bytes> sections = {
+      DiiSection(7, kBlock, {{1, 8000, 1}}),
+      DdbSection(7, 1, 1, 0, Block(module, kBlock, 0)),
+      DiiSection(7, kBlock, {{1, 8000, 2}}),  // version 2 replaces version 1
+      DdbSection(7, 1, 1, 1, Block(module, kBlock, 1)),
+  };
+  ToolRun run = Run({"--pid", "0x0200", "--summary", Write("dc.ts", Packets(0x0200, sections))});
+  ASSERT_EQ(0, run.status) << run.err;
+  EXPECT_NE(std::string::npos, run.out.find("    module 0x0001 version 1, 8000 bytes, 1 of 2 blocks\n")) << run.out;
+}
+
 TEST_F(RavelDumpTest, ModuleDirectoryThatCannotBeMadeFailsCleanly) {
   Bytes stream = Packets(0x0200, {DiiSection(7, 100, {{1, 10, 1}}), DdbSection(7, 1, 1, 0, ModuleBytes(10, 0))});
   std::string blocker = Write("file", Bytes(1, 0));
