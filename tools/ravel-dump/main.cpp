@@ -91,8 +91,8 @@ bool ReadSections(InputFile& input, Capture& capture, Stats& stats, InputSummary
   return true;
 }
 
-bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, InputSummary& summary,
-                         std::string& error) {
+bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, Stats& stats,
+                         InputSummary& summary, std::string& error) {
   PacketReader reader(input);
   if (!reader.Start(error)) return false;
   Progress progress(options.progress, input.Size());
@@ -106,6 +106,7 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   summary.skippedBytes = reader.SkippedBytes();
   summary.resyncs = reader.Resyncs();
   summary.bytes = reader.Offset();
+  if (!reader.Damage().empty()) stats.Problem(reader.Damage());
   if (!reader.Error().empty()) {
     error = reader.Error();
     return false;
@@ -148,7 +149,7 @@ int main(int argc, char** argv) {
     } else {
       demux.RestrictTo(options.pids);
     }
-    if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (!ReadTransportStream(input, options, demux, stats, inputSummary, error)) return Fail(error);
     if (options.pids.empty() && stats.pids[0].sections == 0) {
       stats.Problem("no PAT read: only the PIDs every receiver reads and DSM-CC PIDs were read; name others with --pid");
     }
