@@ -28,7 +28,9 @@ class RavelCPktEntry {
 };
 
 // Completed sections of one or two AddTSPacket calls. The buffers are malloc'ed
-// and belong to the record.
+// and belong to the record. Each owns iSectionSize bytes, or 3 + section_length
+// when that is more (bytes no packet supplied are zero), so that a parse of it
+// stays inside it whatever its lengths say; copies own as much.
 class RavelCSectionData {
  public:
   RavelCSectionData();
@@ -40,7 +42,7 @@ class RavelCSectionData {
   int iSectionSize[RAVEL_MAX_ASSEMBLED_SECTIONS];  // table_id to the end of the CRC
   int iSectionCount;
 
-  // Takes ownership of a malloc'ed section. A record already holding five
+  // Takes ownership of a malloc'ed section that owns the bytes said above. A record already holding five
   // sections cannot store more: the buffer is freed and the section dropped.
   void Append(unsigned char* section, int size);
 

@@ -11,6 +11,8 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
+class RavelCReadWindow;
+
 template <class TimeTable>
 void RavelTimeTable_Clear(TimeTable& table) {
   table.iTableId = 0;
@@ -27,15 +29,17 @@ void RavelTimeTable_Clear(TimeTable& table) {
 // Null clears the fields and gives -9. A foreign table_id is stored, traced
 // ("Table ID isn't for <name>! ..." at error level, from `sourcePath`) and
 // gives -8 with the other fields as they were. Otherwise the name is set and
-// the header and time are read: 0.
-template <class TimeTable>
+// the header and time are read: 0. They are read through `Window`, the read
+// window of the section (RavelCReadWindow, named at instantiation so that this
+// header does without its declaration): a short section reads zeros there.
+template <class TimeTable, class Window = RavelCReadWindow>
 int RavelTimeTable_ParseHeaderAndTime(TimeTable& table, unsigned char* section, unsigned char tableId,
                                       const char* name, const char* sourcePath) {
   if (section == 0) {
     RavelTimeTable_Clear(table);
     return kRavelErrNullSection;
   }
-  table.iTableId = section[0];
+  table.iTableId = Window::Read8(section);
   if (table.iTableId != tableId) {
     gszRavelDbgFilePath = sourcePath;
     gRavelDbgLineNum = __LINE__;
@@ -43,12 +47,12 @@ int RavelTimeTable_ParseHeaderAndTime(TimeTable& table, unsigned char* section, 
     return kRavelErrInvalidArgument;
   }
   table.SetTableName(name);
-  table.bSectionSyntaxIndicator = section[1] >> 7;  // x.......
-  table.iSectionLength = RavelRead12(section + 1);  // ....xxxx xxxxxxxx
-  RavelDateCode_DecodeMJD(RavelRead16(section + 3), table.iYear, table.iMonth, table.iDay);
-  table.iHour = RavelBcd(section[5]);
-  table.iMinute = RavelBcd(section[6]);
-  table.iSecond = RavelBcd(section[7]);
+  table.bSectionSyntaxIndicator = Window::Read8(section + 1) >> 7;  // x.......
+  table.iSectionLength = Window::Read12(section + 1);             // ....xxxx xxxxxxxx
+  RavelDateCode_DecodeMJD(Window::Read16(section + 3), table.iYear, table.iMonth, table.iDay);
+  table.iHour = RavelBcd(Window::Read8(section + 5));
+  table.iMinute = RavelBcd(Window::Read8(section + 6));
+  table.iSecond = RavelBcd(Window::Read8(section + 7));
   return kRavelOk;
 }
 

@@ -1,6 +1,6 @@
 #include "Ravel_CAdditionalGingaInfo.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -46,19 +46,20 @@ int RavelCAdditionalGingaInfo::ParseRawData(const unsigned char* raw) {
   Clear();
   if (raw == 0) return kRavelErrInvalidArgument;
   const unsigned char* position = raw;
-  iTransmissionFormat = position[0] >> 6;  // ttxxxxxx
+  const unsigned char flags = RavelCReadWindow::Read8(position);
+  iTransmissionFormat = flags >> 6;  // ttxxxxxx
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "iTransmissionFormat [0x%x]\n", iTransmissionFormat);
-  bApplicationIdentifierFlag = (position[0] >> 5) & 0x01;  // xxaxxxxx
+  bApplicationIdentifierFlag = (flags >> 5) & 0x01;  // xxaxxxxx
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "bApplicationIdentifierFlag [0x%x]\n", bApplicationIdentifierFlag);
-  iDocumentResolution = (position[0] >> 1) & 0x0F;  // xxxddddx
+  iDocumentResolution = (flags >> 1) & 0x0F;  // xxxddddx
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "iDocumentResolution [0x%x]\n", iDocumentResolution);
-  bIndependentFlag = position[0] & 0x01;  // xxxxxxxi
+  bIndependentFlag = flags & 0x01;  // xxxxxxxi
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "bIndependentFlag [%d]\n", bIndependentFlag);
   position += 1;
   if (bApplicationIdentifierFlag) {
-    iApplicationIdentifierOrgId = RavelRead32(position);
+    iApplicationIdentifierOrgId = RavelCReadWindow::Read32(position);
     RAVEL_TRACE(RAVEL_PARSER_WARNING, "iApplicationIdentifierOrgId [0x%08x]\n", iApplicationIdentifierOrgId);
-    iApplicationIdentifierAppId = RavelRead16(position + 4);
+    iApplicationIdentifierAppId = RavelCReadWindow::Read16(position + 4);
     RAVEL_TRACE(RAVEL_PARSER_WARNING, "iApplicationIdentifierAppId [0x%04x]\n", iApplicationIdentifierAppId);
     position += 6;
   }

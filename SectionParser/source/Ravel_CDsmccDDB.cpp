@@ -3,7 +3,7 @@
 #include <cstdlib>
 #include <cstring>
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -14,7 +14,7 @@ namespace {
 // A block of `length` bytes from malloc; a length of 0 still gets a buffer.
 unsigned char* CopyBlock(const unsigned char* source, int length) {
   unsigned char* block = static_cast<unsigned char*>(std::malloc(length > 0 ? static_cast<std::size_t>(length) : 1));
-  if (block != 0 && length > 0) std::memcpy(block, source, static_cast<std::size_t>(length));
+  if (block != 0) RavelCReadWindow::Copy(block, source, length);
   return block;
 }
 
@@ -55,6 +55,7 @@ void RavelCDsmccDDB::ReleaseBlock() {
 }
 
 int RavelCDsmccDDB::ParseRawData(unsigned char* data) {
+  RavelCReadWindow window(RavelCReadWindow::SectionOfMessage(data));
   ReleaseBlock();
   RavelCDsmccBase::ParseRawData(data);
   if (data == 0) {
@@ -65,10 +66,10 @@ int RavelCDsmccDDB::ParseRawData(unsigned char* data) {
     return kRavelErrInvalidArgument;
   }
   const unsigned char* body = data + 12 + iAdaptationLength;
-  iModuleId = RavelRead16(body);
-  iModuleVersion = body[2];
+  iModuleId = RavelCReadWindow::Read16(body);
+  iModuleVersion = RavelCReadWindow::Read8(body + 2);
   // body[3] is reserved.
-  iBlockNumber = RavelRead16(body + 4);
+  iBlockNumber = RavelCReadWindow::Read16(body + 4);
   iBlockDataLen = iMessageLength - iAdaptationLength - 6;
   if (iBlockDataLen > RAVEL_DSMCC_MAX_BLOCK_LENGTH) {
     RAVEL_TRACE(RAVEL_CAROUSEL_ERROR, "Invalid Block Data Length=[%d]\n", iBlockDataLen);

@@ -1,6 +1,6 @@
 #include "Ravel_CDsmccDII.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_DescriptorSlot.h"
@@ -85,16 +85,18 @@ int RavelCModuleInfo::ParseRawData(unsigned char* record) {
     iModuleInfoLength = 0;
     return kRavelErrInvalidArgument;
   }
-  iModuleId = RavelRead16(record);
-  iModuleSize = RavelRead32(record + 2);
-  iModuleVersion = record[6];
-  iModuleInfoLength = record[7];
+  iModuleId = RavelCReadWindow::Read16(record);
+  iModuleSize = RavelCReadWindow::Read32(record + 2);
+  iModuleVersion = RavelCReadWindow::Read8(record + 6);
+  iModuleInfoLength = RavelCReadWindow::Read8(record + 7);
   if (iModuleInfoLength == 0) return kRavelOk;
 
-  // The descriptor lengths are trusted; the walk stops once past the record.
+  // The descriptor lengths are trusted; the walk stops once past the record,
+  // or at the end of the section it is read from.
   unsigned char* at = record + 8;
-  unsigned char* end = at + iModuleInfoLength;
+  const unsigned char* end = RavelCReadWindow::Clamp(at, at + iModuleInfoLength);
   do {
+    if (RavelCReadWindow::Readable(at, 1) == 0) break;
     unsigned char tag = at[0];
     switch (tag) {
       case 0x01:
@@ -122,7 +124,7 @@ int RavelCModuleInfo::ParseRawData(unsigned char* record) {
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x%02x]\n", tag);
         break;
     }
-    at += at[1] + 2;
+    at += RavelCReadWindow::Read8(at + 1) + 2;
   } while (at < end);
   return kRavelOk;
 }
@@ -186,6 +188,7 @@ void RavelCDsmccDII::ClearDownloadParameters() {
 }
 
 int RavelCDsmccDII::ParseRawData(unsigned char* data) {
+  RavelCReadWindow window(RavelCReadWindow::SectionOfMessage(data));
   cModuleInfos.RemoveAll();
   RavelCDsmccBase::ParseRawData(data);
   if (data == 0) {
@@ -193,31 +196,33 @@ int RavelCDsmccDII::ParseRawData(unsigned char* data) {
     return kRavelErrInvalidArgument;
   }
   unsigned char* body = data + 12 + iAdaptationLength;
-  iDownloadId = RavelRead32(body);
-  iBlockSize = RavelRead16(body + 4);
-  iWindowSize = body[6];
-  iAckPeriod = body[7];
-  iTCDownloadWindow = RavelRead32(body + 8);
-  iTCDownloadScenario = RavelRead32(body + 12);
+  iDownloadId = RavelCReadWindow::Read32(body);
+  iBlockSize = RavelCReadWindow::Read16(body + 4);
+  iWindowSize = RavelCReadWindow::Read8(body + 6);
+  iAckPeriod = RavelCReadWindow::Read8(body + 7);
+  iTCDownloadWindow = RavelCReadWindow::Read32(body + 8);
+  iTCDownloadScenario = RavelCReadWindow::Read32(body + 12);
 
   // The compatibility descriptor is skipped by its length.
-  unsigned char* compatibilityEnd = body + 16 + RavelRead16(body + 16);
-  unsigned short numberOfModules = RavelRead16(compatibilityEnd + 2);
+  unsigned char* compatibilityEnd = body + 16 + RavelCReadWindow::Read16(body + 16);
+  unsigned short numberOfModules = RavelCReadWindow::Read16(compatibilityEnd + 2);
   unsigned char* record = compatibilityEnd + 4;
   for (unsigned short i = 0; i < numberOfModules; ++i) {
+    // A count that would carry the loop past the section stops at its end.
+    if (RavelCReadWindow::Readable(record, 1) == 0) break;
     RavelCModuleInfo* module = new RavelCModuleInfo(record);
     cModuleInfos.Append(module);
     record += 8 + module->iModuleInfoLength;
   }
 
   // Nothing of the private data is kept; its descriptors are only reported.
-  unsigned short privateDataLength = RavelRead16(record);
+  unsigned short privateDataLength = RavelCReadWindow::Read16(record);
   if (privateDataLength != 0) {
-    unsigned char* at = record + 2;
-    unsigned char* end = at + privateDataLength;
+    const unsigned char* at = record + 2;
+    const unsigned char* end = RavelCReadWindow::Clamp(at, at + privateDataLength);
     while (at < end) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "DSMCC DII: Unsupported Descriptor. Tag=[0x%02x]\n", at[0]);
-      at += at[1] + 2;
+      at += RavelCReadWindow::Read8(at + 1) + 2;
     }
   }
   return kRavelOk;

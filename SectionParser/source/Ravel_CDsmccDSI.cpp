@@ -1,6 +1,6 @@
 #include "Ravel_CDsmccDSI.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -33,13 +33,13 @@ int RavelCNASP::ParseRawData(unsigned char* data) {
     Clear();
     return kRavelErrInvalidArgument;
   }
-  iAFI = data[0];
-  iType = data[1];
-  iCarouselId = RavelRead32(data + 2);
-  iSpecifier = RavelRead32(data + 6);
-  iTransportStreamId = RavelRead16(data + 10);
-  iOriginalNetworkId = RavelRead16(data + 12);
-  iServiceId = RavelRead16(data + 14);
+  iAFI = RavelCReadWindow::Read8(data);
+  iType = RavelCReadWindow::Read8(data + 1);
+  iCarouselId = RavelCReadWindow::Read32(data + 2);
+  iSpecifier = RavelCReadWindow::Read32(data + 6);
+  iTransportStreamId = RavelCReadWindow::Read16(data + 10);
+  iOriginalNetworkId = RavelCReadWindow::Read16(data + 12);
+  iServiceId = RavelCReadWindow::Read16(data + 14);
   return kRavelOk;
 }
 
@@ -64,6 +64,7 @@ RavelCDsmccDSI::RavelCDsmccDSI(unsigned char* data)
 RavelCDsmccDSI::~RavelCDsmccDSI() {}
 
 int RavelCDsmccDSI::ParseRawData(unsigned char* data) {
+  RavelCReadWindow window(RavelCReadWindow::SectionOfMessage(data));
   RavelCDsmccBase::ParseRawData(data);
   RAVEL_TRACE(RAVEL_CAROUSEL_WARNING, "RavelCDsmccDSI::ParseRawData... \n");
   if (data == 0) return kRavelErrInvalidArgument;
@@ -72,7 +73,7 @@ int RavelCDsmccDSI::ParseRawData(unsigned char* data) {
   if (result != kRavelOk) return result;
   // The compatibility descriptor at serverId + 20 is taken to be empty (its
   // 16-bit length 0), so privateDataLength follows at serverId + 22.
-  iPrivateDataLength = RavelRead16(serverId + 22);
+  iPrivateDataLength = RavelCReadWindow::Read16(serverId + 22);
   RAVEL_TRACE(RAVEL_CAROUSEL_WARNING, "Private data length [%d]\n", iPrivateDataLength);
   pPrivateData = serverId + 24;
   return kRavelOk;

@@ -1,6 +1,6 @@
 #include "Ravel_CDsmccMsgBase.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -27,13 +27,14 @@ int RavelCDsmccBase::ParseRawData(unsigned char* data) {
     ClearHeader();
     return kRavelErrInvalidArgument;
   }
-  iProtocolDiscriminator = data[0];
-  iDsmccType = data[1];
-  iMessageId = RavelRead16(data + 2);
-  iTransactionId = RavelRead32(data + 4);
+  RavelCReadWindow window(RavelCReadWindow::SectionOfMessage(data));
+  iProtocolDiscriminator = RavelCReadWindow::Read8(data);
+  iDsmccType = RavelCReadWindow::Read8(data + 1);
+  iMessageId = RavelCReadWindow::Read16(data + 2);
+  iTransactionId = RavelCReadWindow::Read32(data + 4);
   // data[8] is reserved.
-  iAdaptationLength = data[9];
-  iMessageLength = RavelRead16(data + 10);
+  iAdaptationLength = RavelCReadWindow::Read8(data + 9);
+  iMessageLength = RavelCReadWindow::Read16(data + 10);
   if (iMessageId == RAVEL_DSMCC_MSG_DII || iMessageId == RAVEL_DSMCC_MSG_DDB || iMessageId == RAVEL_DSMCC_MSG_DSI) {
     return kRavelOk;
   }

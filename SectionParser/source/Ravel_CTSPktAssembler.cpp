@@ -5,6 +5,7 @@
 #include <string.h>
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_CTSPacket.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -25,11 +26,22 @@ inline int BytesToEnd(const unsigned char* packet, const unsigned char* at) {
   return offset < RAVEL_TS_PACKET_SIZE ? RAVEL_TS_PACKET_SIZE - static_cast<int>(offset) : 0;
 }
 
+// A section buffer whose `capacity` bytes are all set, counted with `size`
+// bytes, grown to the bytes its parse may read (RavelCReadWindow::OwnedSize)
+// with the bytes nobody supplied cleared.
+unsigned char* OwnedSectionBuffer(unsigned char* buffer, int capacity, int size) {
+  const int owned = RavelCReadWindow::OwnedSize(buffer, size);
+  if (owned <= capacity) return buffer;
+  buffer = static_cast<unsigned char*>(realloc(buffer, static_cast<size_t>(owned)));
+  memset(buffer + capacity, 0, static_cast<size_t>(owned - capacity));
+  return buffer;
+}
+
 // A section found whole inside one packet: one malloc'ed copy.
 inline void EmitSection(const unsigned char* section, int size, RavelCSectionData& out) {
   unsigned char* buffer = static_cast<unsigned char*>(malloc(static_cast<size_t>(size)));
   memcpy(buffer, section, static_cast<size_t>(size));
-  out.Append(buffer, size);
+  out.Append(OwnedSectionBuffer(buffer, size, size), size);
 }
 
 }  // namespace
@@ -127,8 +139,11 @@ void RavelCSectionData::CopyFrom(const RavelCSectionData& other) {
     iSectionSize[i] = size;
     pSection[i] = 0;
     if (other.pSection[i] != 0 && size > 0) {
-      pSection[i] = static_cast<unsigned char*>(malloc(static_cast<size_t>(size)));
-      memcpy(pSection[i], other.pSection[i], static_cast<size_t>(size));
+      // Only the counted bytes are sure to be the source's: a buffer a caller
+      // put there may end with them. The rest of the window reads as zero.
+      unsigned char* buffer = static_cast<unsigned char*>(malloc(static_cast<size_t>(size)));
+      memcpy(buffer, other.pSection[i], static_cast<size_t>(size));
+      pSection[i] = OwnedSectionBuffer(buffer, size, size);
     }
   }
 }
@@ -338,7 +353,9 @@ void RavelCTSPktStore::GetAssembleData(RavelCSectionData& out) {
     }
   }
   if (copied < capacity) memset(buffer + copied, 0, static_cast<size_t>(capacity - copied));
-  out.Append(buffer, iSectionLen);
+  // A section handed out with another section's size (see AddTSPacket) may
+  // declare more bytes than were collected: those read as zero.
+  out.Append(OwnedSectionBuffer(buffer, capacity, iSectionLen), iSectionLen);
   if (copied != iCurBufSize) {
     RAVEL_TRACE(RAVEL_PARSER_ERROR, "Data size not matched! bufPos=[%d], iCurBufSize=[%d], iSectionLen=[%d]\n", copied,
                 iCurBufSize, iSectionLen);

@@ -8,6 +8,7 @@
 #include "Ravel_CDescriptorGingaApp.h"
 #include "Ravel_CDescriptorGingaAppLoc.h"
 #include "Ravel_FixedText.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_Util.h"
@@ -92,6 +93,7 @@ RavelCAIT& RavelCAIT::operator+=(RavelCAIT& other) {
 }
 
 int RavelCAIT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   aApplicationList.iCount = 0;  // records hold no resources
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "RavelCAIT::ParseRawData... apRawData=[%p]\n", static_cast<void*>(section));
   // A null section fails here as well: the CRC check refuses it.
@@ -110,7 +112,8 @@ int RavelCAIT::ParseRawData(unsigned char* section) {
   // itself is then looked for behind the common descriptors. A section too short
   // for the two lengths reads them as 0.
   int headerLength = static_cast<int>(iSectionLength) - 9;
-  RavelCBitInputStream reader(section + 8, headerLength > 0 ? static_cast<unsigned int>(headerLength) : 0u, 0);
+  RavelCBitInputStream reader(section + 8, static_cast<unsigned int>(RavelCReadWindow::Readable(section + 8, headerLength)),
+                              0);
   unsigned char status = 0;
   reader.Skip(4);                                                  // rrrrxxxx
   unsigned short commonDescriptorsLength = reader.ReadShort(12, status);
@@ -118,12 +121,14 @@ int RavelCAIT::ParseRawData(unsigned char* section) {
   unsigned short applicationLoopLength = reader.ReadShort(12, status);
   if (applicationLoopLength < 1) return kRavelOk;
 
+  // The loops stop at the end of the section whatever their lengths say.
   unsigned char* position = section + 12 + commonDescriptorsLength;
-  unsigned char* loopEnd = position + applicationLoopLength;
+  const unsigned char* loopEnd = RavelCReadWindow::Clamp(position, position + applicationLoopLength);
   do {
+    if (RavelCReadWindow::Readable(position, 1) == 0) break;
     GingaAITApplicationType record;
     std::memset(&record, 0, sizeof(record));
-    RavelCBitInputStream entry(position, applicationLoopLength, 0);
+    RavelCBitInputStream entry(position, static_cast<unsigned int>(RavelCReadWindow::Readable(position, applicationLoopLength)), 0);
     record.iOrganizationId = entry.ReadInt(32, status);
     record.iApplicationId = entry.ReadShort(16, status);
     record.iApplicationControlCode = entry.ReadByte(8, status);
@@ -135,10 +140,11 @@ int RavelCAIT::ParseRawData(unsigned char* section) {
     unsigned short descriptorsLength = entry.ReadShort(12, status);  // xxxxllll llllllll
     position += kApplicationFixedSize;
     if (descriptorsLength >= 1) {
-      unsigned char* descriptorsEnd = position + descriptorsLength;
+      const unsigned char* descriptorsEnd = RavelCReadWindow::Clamp(position, position + descriptorsLength);
       do {
+        if (RavelCReadWindow::Readable(position, 1) == 0) break;
         processDescriptors(position, &record);
-        position += position[1] + 2;
+        position += RavelCReadWindow::Read8(position + 1) + 2;
       } while (position < descriptorsEnd);
     }
     aApplicationList.Append(record);

@@ -1,7 +1,7 @@
 #include "Ravel_CTableBIT.h"
 
-#include "Ravel_ByteOrder.h"
 #include "Ravel_RecordList.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_DescriptorSlot.h"
@@ -59,15 +59,15 @@ int RavelCBroadcasterDescriptor::ParseRawData(unsigned char* record) {
     iBroadcasterDescriptorsLength = 0;
     return kRavelErrInvalidArgument;
   }
-  iBroadcasterId = record[0];
-  iBroadcasterDescriptorsLength = RavelRead12(record + 1);  // ----xxxx xxxxxxxx
+  iBroadcasterId = RavelCReadWindow::Read8(record);
+  iBroadcasterDescriptorsLength = RavelCReadWindow::Read12(record + 1);  // ----xxxx xxxxxxxx
 
   // Only the descriptor at byte 3 is looked at, even when the descriptors length
   // is 0 and those bytes belong to the next record or to the CRC_32; the rest of
   // the broadcaster's descriptors is skipped unread by the table.
   unsigned char* descriptor = record + kBroadcasterFixedSize;
-  unsigned char tag = descriptor[0];
-  unsigned char length = descriptor[1];
+  unsigned char tag = RavelCReadWindow::Read8(descriptor);
+  unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
   if (tag == 0 || length == 0) {
     RAVEL_TRACE(RAVEL_PARSER_WARNING, "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n", tag,
                 length);
@@ -116,6 +116,7 @@ RavelCBIT& RavelCBIT::operator=(RavelCBIT& other) {
 RavelCBIT::~RavelCBIT() { RavelRecordList_DeleteAll(aBroadcasterDescriptor); }
 
 int RavelCBIT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   RavelRecordList_DeleteAll(aBroadcasterDescriptor);
   if (section == 0) return kRavelErrInvalidArgument;
   int result = CheckCrcAndParseHeader(section, kRavelTraceSourcePath, "BIT Section: CRC Error!\n");
@@ -125,16 +126,18 @@ int RavelCBIT::ParseRawData(unsigned char* section) {
     return kRavelErrInvalidArgument;
   }
   SetTableName("BIT");
-  bBroadcasterViewPropriety = (section[kFirstDescriptorsLengthAt] >> 4) & 0x01;  // ---x----
-  iFirstDescriptorsLength = RavelRead12(section + kFirstDescriptorsLengthAt);     // ----xxxx xxxxxxxx
+  bBroadcasterViewPropriety = (RavelCReadWindow::Read8(section + kFirstDescriptorsLengthAt) >> 4) & 0x01;  // ---x----
+  iFirstDescriptorsLength = RavelCReadWindow::Read12(section + kFirstDescriptorsLengthAt);  // ----xxxx xxxxxxxx
 
   // The first loop is walked for its descriptor headers only; nothing of it is kept.
+  // Both loops stop at the end of the section whatever their lengths say.
   int at = kFirstDescriptorsAt;
   if (iFirstDescriptorsLength != 0) {
-    int end = kFirstDescriptorsAt + iFirstDescriptorsLength;
+    int end = at + RavelCReadWindow::Readable(section + at, iFirstDescriptorsLength);
     do {
+      if (RavelCReadWindow::Readable(section + at, 1) == 0) break;
       unsigned char tag = section[at];
-      unsigned char length = section[at + 1];
+      unsigned char length = RavelCReadWindow::Read8(section + at + 1);
       if (tag == 0 || length == 0) {
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n",
                     tag, length);
@@ -150,8 +153,9 @@ int RavelCBIT::ParseRawData(unsigned char* section) {
   unsigned short broadcasterLoopLength =
       static_cast<unsigned short>(iSectionLength - kSectionLengthWithoutLoops - iFirstDescriptorsLength);
   if (broadcasterLoopLength == 0) return kRavelOk;
-  int end = at + broadcasterLoopLength;
+  int end = at + RavelCReadWindow::Readable(section + at, broadcasterLoopLength);
   do {
+    if (RavelCReadWindow::Readable(section + at, 1) == 0) break;
     RavelCBroadcasterDescriptor* broadcaster = new RavelCBroadcasterDescriptor(0);
     if (broadcaster->ParseRawData(section + at) != kRavelOk) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "BIT Info Parsing Fail! Maybe data has been corrupted!\n");

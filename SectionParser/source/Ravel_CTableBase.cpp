@@ -1,6 +1,7 @@
 #include "Ravel_CTableBase.h"
 
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_Util.h"
@@ -28,7 +29,9 @@ int RavelCTableBase::ParseRawData(unsigned char* section) {
     iLastSectionNumber = 0;
     return kRavelErrNullSection;
   }
-  RavelCBitInputStream reader(section, 8, 0);
+  // A section shorter than its 8 header bytes reads zeros for the rest.
+  RavelCReadWindow window(section);
+  RavelCBitInputStream reader(section, static_cast<unsigned int>(RavelCReadWindow::Readable(section, 8)), 0);
   unsigned char status = 0;
   iTableId = reader.ReadByte(8, status);
   bSectionSyntaxIndicator = reader.ReadBit(status);

@@ -10,6 +10,7 @@
 #include "Ravel_CDescriptorParentalRating.h"
 #include "Ravel_CDescriptorSeries.h"
 #include "Ravel_CDescriptorShortEvent.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_DescriptorSlot.h"
@@ -185,22 +186,25 @@ int RavelCEventInfo::ParseRawData(unsigned char* event) {
     ClearFields();
     return kRavelErrInvalidArgument;
   }
-  iEventId = RavelRead16(event);
+  iEventId = RavelCReadWindow::Read16(event);
   // The date rule gives the first of a month as day 31 or 32 of the month before.
   RavelDateCode_DecodeDateTime(event + 2, cStartTime);
-  iDurationHour = RavelBcd(event[7]);
-  iDurationMinute = RavelBcd(event[8]);
-  iDurationSecond = RavelBcd(event[9]);
-  iRunningStatus = static_cast<unsigned char>(event[10] >> 5);        // xxx.....
-  bFreeCAMode = static_cast<unsigned char>((event[10] >> 4) & 0x01);  // ...x....
-  iDescriptorsLoopLength = RavelRead12(event + 10);                   // ....xxxx xxxxxxxx
+  iDurationHour = RavelBcd(RavelCReadWindow::Read8(event + 7));
+  iDurationMinute = RavelBcd(RavelCReadWindow::Read8(event + 8));
+  iDurationSecond = RavelBcd(RavelCReadWindow::Read8(event + 9));
+  const unsigned char status = RavelCReadWindow::Read8(event + 10);
+  iRunningStatus = static_cast<unsigned char>(status >> 5);           // xxx.....
+  bFreeCAMode = static_cast<unsigned char>((status >> 4) & 0x01);     // ...x....
+  iDescriptorsLoopLength = RavelCReadWindow::Read12(event + 10);      // ....xxxx xxxxxxxx
   if (iDescriptorsLoopLength == 0) return kRavelOk;
 
+  // The loop stops at the end of the section whatever its length says.
   unsigned char* position = event + kEventFixedSize;
-  unsigned char* end = position + iDescriptorsLoopLength;
+  const unsigned char* end = RavelCReadWindow::Clamp(position, position + iDescriptorsLoopLength);
   do {
+    if (RavelCReadWindow::Readable(position, 1) == 0) break;
     unsigned char tag = position[0];
-    unsigned char length = position[1];
+    unsigned char length = RavelCReadWindow::Read8(position + 1);
     if (tag == 0 || length == 0) {
       // An empty descriptor is taken for corruption, although the standards allow it.
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n", tag,
@@ -343,6 +347,7 @@ RavelCEIT& RavelCEIT::operator+=(RavelCEIT& other) {
 }
 
 int RavelCEIT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   if (aEventInfo.iCount > 0) aEventInfo.RemoveAll();
   if (section == 0) {
     ClearFields();
@@ -360,10 +365,10 @@ int RavelCEIT::ParseRawData(unsigned char* section) {
   }
   iEITTableId = iTableId;
   SetTableName(EITTableName(iTableId));
-  iTransportStreamId = RavelRead16(section + 8);
-  iOriginalNetworkId = RavelRead16(section + 10);
-  iSegmentLastSectionNumber = section[12];
-  iLastTableId = section[13];
+  iTransportStreamId = RavelCReadWindow::Read16(section + 8);
+  iOriginalNetworkId = RavelCReadWindow::Read16(section + 10);
+  iSegmentLastSectionNumber = RavelCReadWindow::Read8(section + 12);
+  iLastTableId = RavelCReadWindow::Read8(section + 13);
 
   // Events are trusted to stay inside the section once its CRC has matched.
   unsigned char* position = section + kEventLoopStart;

@@ -1,7 +1,7 @@
 #include "Ravel_CTableNIT.h"
 
-#include "Ravel_ByteOrder.h"
 #include "Ravel_RecordList.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
@@ -89,19 +89,20 @@ int RavelCTSInfo::ParseRawData(unsigned char* entry) {
     iTransportDescriptorsLength = 0;
     return kRavelErrInvalidArgument;
   }
-  iTransportStreamId = RavelRead16(entry);
-  iOriginalNetworkId = RavelRead16(entry + 2);
-  iTransportDescriptorsLength = RavelRead12(entry + 4);  // ----xxxx xxxxxxxx
+  iTransportStreamId = RavelCReadWindow::Read16(entry);
+  iOriginalNetworkId = RavelCReadWindow::Read16(entry + 2);
+  iTransportDescriptorsLength = RavelCReadWindow::Read12(entry + 4);  // ----xxxx xxxxxxxx
   if (iTransportDescriptorsLength == 0) return kRavelOk;
 
   // The bytes consumed are counted in 16 bits, as the loop has always counted
   // them; with a 12-bit length and at most 257 bytes per descriptor the counter
-  // stops long before it could wrap.
+  // stops long before it could wrap. The loop also stops at the end of the section.
   unsigned short consumed = 0;
   unsigned char* descriptor = entry + kTSInfoFixedSize;
   do {
+    if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
     unsigned char tag = descriptor[0];
-    unsigned char length = descriptor[1];
+    unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
     if (tag == 0 || length == 0) {
       // Unlike the other tables' entries, a malformed descriptor fails the
       // transport stream, and with it the whole NIT.
@@ -191,6 +192,7 @@ void RavelCNIT::DeleteNetworkDescriptors() {
 }
 
 int RavelCNIT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   DeleteNetworkDescriptors();
   RavelRecordList_DeleteAll(aTSInfoList);
   if (section == 0) return kRavelErrInvalidArgument;
@@ -205,14 +207,17 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
     return kRavelErrInvalidArgument;
   }
 
-  unsigned short networkDescriptorsLength = RavelRead12(section + kNetworkDescriptorsLengthAt);  // ----xxxx xxxxxxxx
+  unsigned short networkDescriptorsLength =
+      RavelCReadWindow::Read12(section + kNetworkDescriptorsLengthAt);  // ----xxxx xxxxxxxx
+  // Both loops stop at the end of the section whatever their lengths say.
   int at = kNetworkDescriptorsAt;
   if (networkDescriptorsLength != 0) {
-    int end = kNetworkDescriptorsAt + networkDescriptorsLength;
+    int end = at + RavelCReadWindow::Readable(section + at, networkDescriptorsLength);
     do {
       unsigned char* descriptor = section + at;
+      if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
       unsigned char tag = descriptor[0];
-      unsigned char length = descriptor[1];
+      unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
       // Only the tag is tested here: a descriptor of length 0 goes to its class.
       if (tag == 0) {
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n",
@@ -246,11 +251,12 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
   // The transport stream loop follows wherever the network loop stopped, and
   // its own length, not section_length, bounds it. The end is counted from the
   // length field itself, two bytes before the first entry: the receivers' rule.
-  unsigned short transportStreamLoopLength = RavelRead12(section + at);  // ----xxxx xxxxxxxx
+  unsigned short transportStreamLoopLength = RavelCReadWindow::Read12(section + at);  // ----xxxx xxxxxxxx
   if (transportStreamLoopLength == 0) return kRavelOk;
-  const int end = at + transportStreamLoopLength;
+  const int end = at + RavelCReadWindow::Readable(section + at, transportStreamLoopLength);
   at += 2;
   do {
+    if (RavelCReadWindow::Readable(section + at, 1) == 0) break;
     RavelCTSInfo* transportStream = new RavelCTSInfo(0);
     if (transportStream->ParseRawData(section + at) != kRavelOk) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "NIT Info Parsing Fail! Maybe data has been corrupted!\n");

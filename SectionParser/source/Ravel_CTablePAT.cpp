@@ -2,6 +2,7 @@
 
 #include "Ravel_ByteOrder.h"
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -96,6 +97,7 @@ void RavelCPAT::InsertInProgramOrder(RavelCPMTInfo* program) {
 }
 
 int RavelCPAT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   // iNetworkPID survives a re-parse: a section without program_number 0 keeps it.
   DeletePrograms();
   if (section == 0) return kRavelErrInvalidArgument;

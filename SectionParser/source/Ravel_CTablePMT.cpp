@@ -1,6 +1,6 @@
 #include "Ravel_CTablePMT.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
@@ -85,17 +85,19 @@ int RavelCMapInfo::ParseRawData(unsigned char* entry) {
     iESInfoLength = 0;
     return kRavelErrInvalidArgument;
   }
-  iStreamType = entry[0];
-  iElementaryPID = RavelRead16(entry + 1) & 0x1FFF;  // ---xxxxx xxxxxxxx
-  iESInfoLength = RavelRead12(entry + 3);            // ----xxxx xxxxxxxx
+  iStreamType = RavelCReadWindow::Read8(entry);
+  iElementaryPID = RavelCReadWindow::Read16(entry + 1) & 0x1FFF;  // ---xxxxx xxxxxxxx
+  iESInfoLength = RavelCReadWindow::Read12(entry + 3);            // ----xxxx xxxxxxxx
   if (iESInfoLength == 0) return kRavelOk;
 
-  const int end = kStreamHeaderSize + iESInfoLength;
+  // The loop stops at the end of the section whatever its length says.
+  const int end = kStreamHeaderSize + RavelCReadWindow::Readable(entry + kStreamHeaderSize, iESInfoLength);
   int at = kStreamHeaderSize;
   do {
     unsigned char* descriptor = entry + at;
+    if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
     const unsigned char tag = descriptor[0];
-    const unsigned char length = descriptor[1];
+    const unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
     if (length == 0) {
       // Ends this stream's descriptors only; the stream itself is kept. A tag of
       // 0 with a length is merely unknown here.
@@ -108,7 +110,7 @@ int RavelCMapInfo::ParseRawData(unsigned char* entry) {
     switch (tag) {
       case kTagCA:
         // CA_system_ID 16 | reserved 3 | CA_PID 13
-        iCAPID = RavelRead16(descriptor + 4) & 0x1FFF;  // ---xxxxx xxxxxxxx
+        iCAPID = RavelCReadWindow::Read16(descriptor + 4) & 0x1FFF;  // ---xxxxx xxxxxxxx
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "PMT MapInfo CA PID =[0x%x]", iCAPID);
         break;
       case kTagStreamIdentifier:
@@ -185,6 +187,7 @@ void RavelCPMT::DeleteParentalRating() {
 }
 
 int RavelCPMT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   DeleteStreams();
   DeleteParentalRating();
   if (section == 0) {
@@ -205,18 +208,20 @@ int RavelCPMT::ParseRawData(unsigned char* section) {
     return kRavelErrInvalidArgument;
   }
   SetTableName("PMT");
-  iPCRPID = RavelRead16(section + 8) & 0x1FFF;  // ---xxxxx xxxxxxxx
-  iProgramInfoLength = RavelRead12(section + 10);  // ----xxxx xxxxxxxx
+  iPCRPID = RavelCReadWindow::Read16(section + 8) & 0x1FFF;  // ---xxxxx xxxxxxxx
+  iProgramInfoLength = RavelCReadWindow::Read12(section + 10);  // ----xxxx xxxxxxxx
 
   // The streams start at the first descriptor boundary at or past the end of
-  // the program info, so an overlong last descriptor moves them on.
+  // the program info, so an overlong last descriptor moves them on. The loop
+  // stops at the end of the section whatever its length says.
   int at = kProgramInfoStart;
   if (iProgramInfoLength != 0) {
-    const int end = kProgramInfoStart + iProgramInfoLength;
+    const int end = at + RavelCReadWindow::Readable(section + at, iProgramInfoLength);
     do {
       unsigned char* descriptor = section + at;
+      if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
       const unsigned char tag = descriptor[0];
-      const unsigned char length = descriptor[1];
+      const unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
       if (tag == 0 || length == 0) {
         // Unlike a stream's loop, a malformed program info loop fails the section.
         RAVEL_TRACE(RAVEL_PARSER_WARNING, "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n", tag,

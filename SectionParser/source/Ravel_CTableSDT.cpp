@@ -1,6 +1,6 @@
 #include "Ravel_CTableSDT.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_TableMerge.h"
 #include "Ravel_Trace.h"
@@ -81,21 +81,25 @@ int RavelCServiceDescription::ParseRawData(unsigned char* entry) {
     ClearScalars();
     return kRavelErrInvalidArgument;
   }
-  iServiceId = RavelRead16(entry);
-  iEITCompanyDefFlag = (entry[2] >> 2) & 0x07;  // ...xxx..
-  bEITScheduleFlag = (entry[2] >> 1) & 0x01;    // ......x.
-  bEITPresentFollowingFlag = entry[2] & 0x01;   // .......x
-  iRunningStatus = (entry[3] >> 5) & 0x07;      // xxx.....
-  bFreeCAMode = (entry[3] >> 4) & 0x01;         // ...x....
-  iDescriptorsLoopLength = RavelRead12(entry + 3);  // ....xxxx xxxxxxxx
+  iServiceId = RavelCReadWindow::Read16(entry);
+  const unsigned char flags = RavelCReadWindow::Read8(entry + 2);
+  const unsigned char status = RavelCReadWindow::Read8(entry + 3);
+  iEITCompanyDefFlag = (flags >> 2) & 0x07;  // ...xxx..
+  bEITScheduleFlag = (flags >> 1) & 0x01;    // ......x.
+  bEITPresentFollowingFlag = flags & 0x01;   // .......x
+  iRunningStatus = (status >> 5) & 0x07;     // xxx.....
+  bFreeCAMode = (status >> 4) & 0x01;        // ...x....
+  iDescriptorsLoopLength = RavelCReadWindow::Read12(entry + 3);  // ....xxxx xxxxxxxx
   if (iDescriptorsLoopLength == 0) return kRavelOk;
 
-  const int end = kServiceHeaderSize + iDescriptorsLoopLength;
+  // The loop stops at the end of the section whatever its length says.
+  const int end = kServiceHeaderSize + RavelCReadWindow::Readable(entry + kServiceHeaderSize, iDescriptorsLoopLength);
   int at = kServiceHeaderSize;
   do {
     unsigned char* descriptor = entry + at;
+    if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
     const unsigned char tag = descriptor[0];
-    const unsigned char length = descriptor[1];
+    const unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
     if (tag == 0 || length == 0) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "Invalid Descriptor Tag & Length!! descrTag=[0x%02x], descrLen=[%d]\n", tag,
                   length);
@@ -178,6 +182,7 @@ void RavelCSDT::DeleteServices() {
 }
 
 int RavelCSDT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   DeleteServices();
   if (section == 0) {
     iOriginalNetworkId = 0;
@@ -199,7 +204,7 @@ int RavelCSDT::ParseRawData(unsigned char* section) {
   }
   // A single byte access: the upper byte of original_network_id, the low byte
   // (byte 9) is not taken in.
-  iOriginalNetworkId = section[8];
+  iOriginalNetworkId = RavelCReadWindow::Read8(section + 8);
 
   const int end = iSectionLength - 1;  // the first CRC_32 byte
   int at = kServiceLoopStart;

@@ -1,6 +1,7 @@
 #include "Ravel_CTableStreamEventDescriptor.h"
 
 #include "Ravel_RecordList.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 #include "Ravel_Util.h"
@@ -41,6 +42,7 @@ void RavelCDsmccStreamEvent::ReleaseDescriptors() {
 }
 
 int RavelCDsmccStreamEvent::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   ReleaseDescriptors();
   if (section == 0) return kRavelErrInvalidArgument;
   // The header is read before the CRC check, so a corrupt section still shows it.

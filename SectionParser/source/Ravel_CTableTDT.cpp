@@ -1,5 +1,6 @@
 #include "Ravel_CTableTDT.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
@@ -40,6 +41,7 @@ int RavelCTDT::SetTableName(const char* name) {
 
 int RavelCTDT::ParseRawData(unsigned char* section) {
   // Nothing is checked against the length: the TDT carries no CRC_32.
+  RavelCReadWindow window(section);
   return RavelTimeTable_ParseHeaderAndTime(*this, section, kTDTTableId, "TDT", kRavelTraceSourcePath);
 }
 

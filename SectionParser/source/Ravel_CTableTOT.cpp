@@ -1,7 +1,7 @@
 #include "Ravel_CTableTOT.h"
 
-#include "Ravel_ByteOrder.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_TimeTable.h"
 #include "Ravel_Trace.h"
@@ -65,6 +65,7 @@ int RavelCTOT::SetTableName(const char* name) {
 }
 
 int RavelCTOT::ParseRawData(unsigned char* section) {
+  RavelCReadWindow window(section);
   delete pLocalTimeOffsetDescriptor;
   pLocalTimeOffsetDescriptor = 0;
   if (section == 0) iDescriptorsLoopLength = 0;
@@ -72,11 +73,13 @@ int RavelCTOT::ParseRawData(unsigned char* section) {
   if (result != kRavelOk) return result;
 
   // The CRC_32 is not verified: a corrupted TOT is taken as it stands.
-  iDescriptorsLoopLength = RavelRead12(section + 8);  // ....xxxx xxxxxxxx
+  iDescriptorsLoopLength = RavelCReadWindow::Read12(section + 8);  // ....xxxx xxxxxxxx
   if (iDescriptorsLoopLength == 0) return kRavelOk;
+  // The loop stops at the end of the section whatever its length says.
   unsigned char* position = section + kDescriptorLoopStart;
-  unsigned char* end = position + iDescriptorsLoopLength;
+  const unsigned char* end = RavelCReadWindow::Clamp(position, position + iDescriptorsLoopLength);
   do {
+    if (RavelCReadWindow::Readable(position, 1) == 0) break;
     unsigned char tag = position[0];
     if (tag == kTagLocalTimeOffset) {
       // Only the last one of the loop is kept.
@@ -86,7 +89,7 @@ int RavelCTOT::ParseRawData(unsigned char* section) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "TOT Parsing.. Unknown Descriptor Tag=[0x%02x]\n", tag);
     }
     // A zero length only steps over the tag and length bytes.
-    position += position[1] + 2;
+    position += RavelCReadWindow::Read8(position + 1) + 2;
   } while (position < end);
   return kRavelOk;
 }

@@ -1,6 +1,6 @@
 #include "Ravel_CTxType.h"
 
-#include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -43,11 +43,12 @@ int RavelCTxType::ParseRawData(unsigned char* raw) {
     iNumOfService = 0;
     return kRavelErrInvalidArgument;
   }
-  iTransmissionTypeInfo = raw[0];
-  iNumOfService = raw[1];
+  iTransmissionTypeInfo = RavelCReadWindow::Read8(raw);
+  iNumOfService = RavelCReadWindow::Read8(raw + 1);
   if (iNumOfService > 0) {
+    // The list keeps its count: identifiers beyond the section read as 0.
     pServiceIds = new unsigned short[iNumOfService];
-    for (int i = 0; i < iNumOfService; ++i) pServiceIds[i] = RavelRead16(raw + 2 + 2 * i);
+    for (int i = 0; i < iNumOfService; ++i) pServiceIds[i] = RavelCReadWindow::Read16(raw + 2 + 2 * i);
   }
   return kRavelOk;
 }
