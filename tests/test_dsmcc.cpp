@@ -37,6 +37,19 @@ Bytes Header(uint16_t messageId, uint32_t transactionId, uint8_t adaptationLengt
   return h;
 }
 
+// A message as a receiver hands it over: 8 bytes into its section (table_id
+// 0x3C for a DDB, 0x3B otherwise), which ends with the CRC_32 after it.
+Bytes InSection(const Bytes& message) {
+  sb::SectionOptions options;
+  options.tableId = (message[2] == 0x10 && message[3] == 0x03) ? 0x3C : 0x3B;
+  return sb::LongSection(options, message);
+}
+
+unsigned char* MessageOf(const Bytes& section) { return const_cast<unsigned char*>(section.data()) + 8; }
+
+// Bytes of the message: the section less its 8 header bytes and its CRC_32.
+size_t MessageSize(const Bytes& section) { return section.size() - 12; }
+
 Bytes ServerId(uint32_t carouselId, uint16_t tsid, uint16_t onid, uint16_t sid) {
   Bytes s{0x00, 0x01};  // AFI, type
   sb::Append(s, sb::U32(carouselId));
@@ -56,7 +69,7 @@ Bytes Dsi(uint8_t adaptationLength, const Bytes& privateData, uint16_t messageId
   Bytes message =
       Header(messageId, 0x80000002u, adaptationLength, static_cast<uint16_t>(adaptationLength + body.size()));
   sb::Append(message, body);
-  return message;
+  return InSection(message);
 }
 
 Bytes Ddb(uint16_t moduleId, uint8_t version, uint16_t block, const Bytes& data, uint8_t adaptationLength = 0) {
@@ -67,7 +80,7 @@ Bytes Ddb(uint16_t moduleId, uint8_t version, uint16_t block, const Bytes& data,
   message.push_back(0xFF);  // reserved
   sb::Append(message, sb::U16(block));
   sb::Append(message, data);
-  return message;
+  return InSection(message);
 }
 
 Bytes Pattern(size_t size, uint8_t seed) {
@@ -108,7 +121,7 @@ Bytes Dii(const std::vector<Module>& modules, const Bytes& privateData, uint8_t 
   sb::Append(body, privateData);
   Bytes message = Header(0x1002, 0x80000002u, adaptationLength, static_cast<uint16_t>(adaptationLength + body.size()));
   sb::Append(message, body);
-  return message;
+  return InSection(message);
 }
 
 std::string Format(const char* format, int a, int b, int c, int d) {
@@ -130,9 +143,9 @@ TEST(DsmccHeader, ReadsEveryMessageAndReportsUnknownIdsByTheirDsmccType) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.messageId);
-    Bytes message = Header(c.messageId, 0xFEDCBA98u, 2, 0x1234, c.dsmccType);
+    Bytes message = InSection(Header(c.messageId, 0xFEDCBA98u, 2, 0x1234, c.dsmccType));
     TraceRecorder recorder;
-    RavelCDsmccBase header(message.data());
+    RavelCDsmccBase header(MessageOf(message));
     EXPECT_EQ(c.trace, recorder.Lines());
     if (!c.trace.empty()) {
       EXPECT_EQ("SectionParser/source/Ravel_CDsmccMsgBase", recorder.Records()[0].file);
@@ -141,7 +154,7 @@ TEST(DsmccHeader, ReadsEveryMessageAndReportsUnknownIdsByTheirDsmccType) {
               (std::vector<unsigned int>{header.GetProtocolDiscriminator(), header.GetDsmccType(), header.GetMessageId(),
                                          header.GetTransactionId(), header.GetAdaptationLength(), header.GetMessageLength()}));
     recorder.Clear();
-    EXPECT_EQ(kRavelOk, header.ParseRawData(message.data()));
+    EXPECT_EQ(kRavelOk, header.ParseRawData(MessageOf(message)));
     EXPECT_EQ(c.trace, recorder.Lines());
 
     recorder.Clear();
@@ -185,7 +198,7 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
     SCOPED_TRACE(c.what);
     Bytes message = Dsi(c.adaptationLength, c.privateData, c.messageId);
     TraceRecorder recorder;
-    RavelCDsmccDSI dsi(message.data());
+    RavelCDsmccDSI dsi(MessageOf(message));
     EXPECT_EQ(c.trace, recorder.Lines());
     // The server id record is part of the DSI's source and reports from it.
     EXPECT_EQ("SectionParser/source/Ravel_CDsmccDSI", recorder.Records()[0].file);
@@ -196,7 +209,7 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
                                          nasp.GetTransportStreamId(), nasp.GetOriginalNetworkId(), nasp.GetServiceId()}));
     EXPECT_EQ(static_cast<int>(c.privateData.size()), dsi.GetPrivateDataLength());
     // Points into the message itself, after serverId, compatibility descriptor and length.
-    EXPECT_EQ(message.data() + 12 + c.adaptationLength + 24, dsi.GetPrivateData());
+    EXPECT_EQ(MessageOf(message) + 12 + c.adaptationLength + 24, dsi.GetPrivateData());
 
     recorder.Clear();
     dsi.Show();
@@ -204,7 +217,7 @@ TEST(DsmccDSI, TakesTheServerIdAfterTheAdaptationAndTracesTheEmptyNaspFirst) {
         {kCarouselDump, Format("DSMCC Header: protocolDiscriminator=[0x%02x], dsmccType=[0x%02x], messageID=[0x%04x]\n",
                                0x11, 0x03, c.messageId, 0)},
         {kCarouselDump, Format("DSMCC Header: transaction_id=[0x%08x], adaptationLength=[%d], messageLength=[%d]\n",
-                static_cast<int>(0x80000002u), c.adaptationLength, static_cast<int>(message.size()) - 12, 0)},
+                static_cast<int>(0x80000002u), c.adaptationLength, static_cast<int>(MessageSize(message)) - 12, 0)},
         {kCarouselDump, "\t\tNASP: AFI=[0x00], Type=[0x01], CaourselID=[0x0000abcd], iSpecifier=[0x00010203]\n"},
         {kCarouselDump,
          "\t\tNASP(Ginga Service Location): Transport Stream Id=[0x0421], Original Network ID=[0x0422], Service "
@@ -235,7 +248,8 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
     TraceLines trace;
   } cases[] = {
       {"empty block", 0, 0, kRavelOk, 0, {}}, {"after an adaptation header", 100, 4, kRavelOk, 100, {}},
-      {"the limit", 4096, 0, kRavelOk, 4096, {}},
+      {"the largest block a section carries", 4068, 0, kRavelOk, 4068, {}},
+      // Its section_length cannot count so many bytes: only the header is read.
       {"one over the limit", 4097, 8, kRavelErrCorruptSection, 0, {{kCarouselError, "Invalid Block Data Length=[4097]\n"}}},
   };
   for (Case& c : cases) {
@@ -244,7 +258,7 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
     Bytes message = Ddb(0x0102, 7, 9, data, c.adaptationLength);
     TraceRecorder recorder;
     RavelCDsmccDDB ddb(nullptr);
-    EXPECT_EQ(c.result, ddb.ParseRawData(message.data()));
+    EXPECT_EQ(c.result, ddb.ParseRawData(MessageOf(message)));
     EXPECT_EQ(c.trace, recorder.Lines());
     EXPECT_EQ(0x0102, ddb.GetModuleId());
     EXPECT_EQ(7, ddb.GetModuleVersion());
@@ -254,7 +268,7 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
       ASSERT_NE(nullptr, ddb.GetBlockData());
       EXPECT_EQ(data, Bytes(ddb.GetBlockData(), ddb.GetBlockData() + ddb.GetBlockDataLen()));
       // The block is a copy: the message may go away.
-      EXPECT_TRUE(data.empty() || ddb.GetBlockData() != message.data() + 18 + c.adaptationLength);
+      EXPECT_TRUE(data.empty() || ddb.GetBlockData() != MessageOf(message) + 18 + c.adaptationLength);
     } else {
       EXPECT_EQ(nullptr, ddb.GetBlockData());
     }
@@ -271,11 +285,11 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
 TEST(DsmccDDB, ParsesAgainCopiesDeeplyAndClearsOnNull) {
   Bytes first = Ddb(1, 1, 0, Pattern(50, 1));
   Bytes second = Ddb(2, 3, 4, Pattern(20, 9));
-  RavelCDsmccDDB ddb(first.data());
-  ASSERT_EQ(kRavelOk, ddb.ParseRawData(second.data()));
+  RavelCDsmccDDB ddb(MessageOf(first));
+  ASSERT_EQ(kRavelOk, ddb.ParseRawData(MessageOf(second)));
   EXPECT_EQ(2, ddb.GetModuleId());
   EXPECT_EQ(20, ddb.GetBlockDataLen());
-  EXPECT_EQ(0, std::memcmp(second.data() + 18, ddb.GetBlockData(), 20));
+  EXPECT_EQ(0, std::memcmp(MessageOf(second) + 18, ddb.GetBlockData(), 20));
 
   RavelCDsmccDDB copy(ddb);
   EXPECT_EQ(0x1003, copy.GetMessageId());
@@ -286,10 +300,10 @@ TEST(DsmccDDB, ParsesAgainCopiesDeeplyAndClearsOnNull) {
   EXPECT_NE(ddb.GetBlockData(), copy.GetBlockData());
   EXPECT_EQ(0, std::memcmp(ddb.GetBlockData(), copy.GetBlockData(), 20));
 
-  RavelCDsmccDDB assigned(first.data());
+  RavelCDsmccDDB assigned(MessageOf(first));
   assigned = ddb;
   EXPECT_EQ(4, assigned.GetBlockNumber());
-  EXPECT_EQ(0, std::memcmp(second.data() + 18, assigned.GetBlockData(), 20));
+  EXPECT_EQ(0, std::memcmp(MessageOf(second) + 18, assigned.GetBlockData(), 20));
   RavelCDsmccDDB refused(nullptr);
   assigned = refused;
   EXPECT_EQ(nullptr, assigned.GetBlockData());
@@ -321,8 +335,8 @@ TEST(DsmccDDB, OrdersBlocksOfOneModuleVersionOnly) {
     SCOPED_TRACE(c.what);
     Bytes ma = Ddb(c.a.module, c.a.version, c.a.block, Bytes{1});
     Bytes mb = Ddb(c.b.module, c.b.version, c.b.block, Bytes{1});
-    RavelCDsmccDDB a(ma.data());
-    RavelCDsmccDDB b(mb.data());
+    RavelCDsmccDDB a(MessageOf(ma));
+    RavelCDsmccDDB b(MessageOf(mb));
     TraceRecorder recorder;
     EXPECT_EQ(c.eq, (a == b) != 0);
     EXPECT_TRUE(recorder.Records().empty());  // equality never traces
@@ -375,7 +389,7 @@ TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
     Bytes message = Dii(c.modules, c.privateData, c.adaptationLength, c.compatibility);
     TraceRecorder recorder;
     RavelCDsmccDII dii(nullptr);
-    EXPECT_EQ(kRavelOk, dii.ParseRawData(message.data()));
+    EXPECT_EQ(kRavelOk, dii.ParseRawData(MessageOf(message)));
     EXPECT_EQ(c.trace, recorder.Lines());
     for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CDsmccDII", r.file);
     EXPECT_EQ((std::vector<unsigned int>{0x80000002u, 4066, 3, 4, 5, 0xFFFFFFFFu}),
@@ -393,7 +407,7 @@ TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
     }
   }
 
-  RavelCDsmccDII all(Dii({{7, 4066, 3, allKinds}}, Bytes()).data());
+  RavelCDsmccDII all(MessageOf(Dii({{7, 4066, 3, allKinds}}, Bytes())));
   RavelCModuleInfo* m = all.GetModuleInfo(0);
   ASSERT_NE(nullptr, m->GetTypeDescriptor());
   EXPECT_STREQ("text/xml", m->GetTypeDescriptor()->GetType());
@@ -403,14 +417,14 @@ TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
   EXPECT_EQ(4, m->GetCRC32Descriptor()->GetCRC32()[3]);
   EXPECT_EQ(30u, m->GetEstDownloadTimeDescriptor()->GetEstDownloadTime());
   EXPECT_EQ(0x1000u, m->GetCompressionTypeDescriptor()->GetOriginalSize());
-  RavelCDsmccDII names(Dii({{1, 1, 0, twoNames}}, Bytes()).data());
+  RavelCDsmccDII names(MessageOf(Dii({{1, 1, 0, twoNames}}, Bytes())));
   EXPECT_STREQ("second", names.GetModuleInfo(0)->GetNameDescriptor()->GetFileName());
   EXPECT_EQ(nullptr, names.GetModuleInfo(0)->GetTypeDescriptor());
 }
 
 TEST(DsmccDII, GettersRefuseBadIndexesAndUnknownIds) {
   Bytes message = Dii({{1, 10, 0, Bytes()}, {2, 20, 0, Bytes()}, {2, 30, 1, Bytes()}}, Bytes());
-  RavelCDsmccDII dii(message.data());
+  RavelCDsmccDII dii(MessageOf(message));
   TraceRecorder recorder;
   for (int index : {-1, 3, 1000}) {
     recorder.Clear();
@@ -429,11 +443,11 @@ TEST(DsmccDII, GettersRefuseBadIndexesAndUnknownIds) {
 TEST(DsmccDII, DumpsCopiesDeeplyAndParsesAgainFromScratch) {
   Bytes info = sb::Cat({sb::Descriptor(0x02, sb::Text("m.bin")), sb::Descriptor(0x07, sb::U32(9))});
   Bytes message = Dii({{0x0102, 754, 0x7D, info}}, Bytes());
-  RavelCDsmccDII dii(message.data());
+  RavelCDsmccDII dii(MessageOf(message));
   TraceLines expected{
       {kCarouselDump, "DSMCC Header: protocolDiscriminator=[0x11], dsmccType=[0x03], messageID=[0x1002]\n"},
       {kCarouselDump, "DSMCC Header: transaction_id=[0x80000002], adaptationLength=[0], messageLength=[" +
-                          std::to_string(message.size() - 12) + "]\n"},
+                          std::to_string(MessageSize(message) - 12) + "]\n"},
       {kCarouselDump, "downloadId=[0x80000002], blockSize=[4066], windowSize=[3], ackPeriod=[4]\n"},
       {kCarouselDump, "tCDownloadWindow=[0x00000005], tCDownloadScenario=[0xffffffff], numOfMOdules=[1]\n"},
       {kCarouselDump,
@@ -451,12 +465,12 @@ TEST(DsmccDII, DumpsCopiesDeeplyAndParsesAgainFromScratch) {
   ASSERT_EQ(1, copy.GetNumberOfModules());
   EXPECT_NE(dii.GetModuleInfo(0), copy.GetModuleInfo(0));
   EXPECT_NE(dii.GetModuleInfo(0)->GetNameDescriptor(), copy.GetModuleInfo(0)->GetNameDescriptor());
-  RavelCDsmccDII assigned(Dii({{5, 5, 5, Bytes()}, {6, 6, 6, Bytes()}}, Bytes()).data());
+  RavelCDsmccDII assigned(MessageOf(Dii({{5, 5, 5, Bytes()}, {6, 6, 6, Bytes()}}, Bytes())));
   assigned = dii;
   EXPECT_EQ(expected, ShowLines(assigned));
 
   // A second parse replaces the records; a null parse leaves none.
-  ASSERT_EQ(kRavelOk, dii.ParseRawData(Dii({{8, 1, 1, Bytes()}, {9, 2, 2, Bytes()}}, Bytes()).data()));
+  ASSERT_EQ(kRavelOk, dii.ParseRawData(MessageOf(Dii({{8, 1, 1, Bytes()}, {9, 2, 2, Bytes()}}, Bytes()))));
   ASSERT_EQ(2, dii.GetNumberOfModules());
   EXPECT_EQ(8, dii.GetModuleInfo(0)->GetModuleId());
   TraceRecorder recorder;
@@ -545,12 +559,7 @@ TEST(DsmccCapture, DiiListsTheThreeModulesThatTheDdbBlocksRebuild) {
   int diiCount = 0;
   std::map<int, RavelCPointerArray<RavelCDsmccDDB> > modules;
   for (const Bytes& section : sections) {
-    // The module info bytes are read as far as their descriptor lengths say, which
-    // in this object carousel reach past the section: the zeros keep those reads
-    // inside the buffer, as a receiver's section buffer would.
-    Bytes padded = section;
-    padded.resize(section.size() + 4096, 0x00);
-    unsigned char* message = padded.data() + 8;
+    unsigned char* message = MessageOf(section);
     if (section[0] == 0x3B && MessageIdOf(section) == 0x1002) {
       TraceRecorder recorder;
       std::unique_ptr<RavelCDsmccDII> parsed(new RavelCDsmccDII(nullptr));
