@@ -246,7 +246,10 @@ const std::vector<ClassCase>& Classes() {
   return classes;
 }
 
-Bytes Empty(uint8_t tag) { return Padded(RawDescriptor(tag, 0)); }
+// Zeros after a descriptor in its section: what parses reading past a short length take in.
+Bytes FollowedByZeros(const Bytes& descriptor) { return InSection(descriptor, Bytes(300, 0x00)); }
+
+Bytes Empty(uint8_t tag) { return FollowedByZeros(RawDescriptor(tag, 0)); }
 
 TraceLines BodyOf(RavelCDescriptorBase& d, const ClassCase& c) {
   TraceLines lines = ShowLines(d);
@@ -276,8 +279,8 @@ TEST(DescriptorPattern, NullAndForeignTagsAreRefusedWithTheClasssOwnTrace) {
       EXPECT_EQ(Dump(c.emptyBody), BodyOf(*empty, c));
     }
 
-    Bytes rich = Padded(c.rich);
-    std::unique_ptr<RavelCDescriptorBase> d(c.make(rich.data()));
+    Bytes rich = FollowedByZeros(c.rich);
+    std::unique_ptr<RavelCDescriptorBase> d(c.make(DescriptorIn(rich)));
     EXPECT_EQ(c.tag, d->GetDescriptorTag());
     EXPECT_EQ(c.rich[1], d->GetDescriptorLength());
     EXPECT_EQ(c.displayName, d->GetDescriptorName());
@@ -288,17 +291,17 @@ TEST(DescriptorPattern, NullAndForeignTagsAreRefusedWithTheClasssOwnTrace) {
     const TraceLines& afterRefusal = c.refusal == kKept ? richBody : BodyOf(*empty, c);
 
     Bytes foreign = rich;
-    foreign[0] = 0x99;
+    DescriptorIn(foreign)[0] = 0x99;
     for (bool constructed : {true, false}) {
       recorder.Clear();
       std::unique_ptr<RavelCDescriptorBase> built;
       int result = kRavelOk;
       if (constructed) {
-        built.reset(c.make(foreign.data()));
+        built.reset(c.make(DescriptorIn(foreign)));
       } else {
-        built.reset(c.make(rich.data()));
+        built.reset(c.make(DescriptorIn(rich)));
         recorder.Clear();
-        result = built->ParseRawData(foreign.data());
+        result = built->ParseRawData(DescriptorIn(foreign));
       }
       EXPECT_EQ(0x99, built->GetDescriptorTag());
       EXPECT_EQ(c.rich[1], built->GetDescriptorLength());
@@ -333,16 +336,16 @@ TEST(DescriptorPattern, ReparseLeavesNothingOfTheFirstParse) {
   TraceRecorder quiet;
   for (const ClassCase& c : Classes()) {
     SCOPED_TRACE(c.name);
-    Bytes rich = Padded(c.rich);
+    Bytes rich = FollowedByZeros(c.rich);
     Bytes empty = Empty(c.tag);
-    std::unique_ptr<RavelCDescriptorBase> freshRich(c.make(rich.data()));
-    std::unique_ptr<RavelCDescriptorBase> freshEmpty(c.make(empty.data()));
-    std::unique_ptr<RavelCDescriptorBase> d(c.make(rich.data()));
+    std::unique_ptr<RavelCDescriptorBase> freshRich(c.make(DescriptorIn(rich)));
+    std::unique_ptr<RavelCDescriptorBase> freshEmpty(c.make(DescriptorIn(empty)));
+    std::unique_ptr<RavelCDescriptorBase> d(c.make(DescriptorIn(rich)));
     // The same bytes twice: lists are rebuilt, not extended.
-    EXPECT_EQ(kRavelOk, d->ParseRawData(rich.data()));
+    EXPECT_EQ(kRavelOk, d->ParseRawData(DescriptorIn(rich)));
     EXPECT_EQ(ShowLines(*freshRich), ShowLines(*d));
     // Length 0 after a full descriptor: nothing of the first one is left.
-    EXPECT_EQ(kRavelOk, d->ParseRawData(empty.data()));
+    EXPECT_EQ(kRavelOk, d->ParseRawData(DescriptorIn(empty)));
     EXPECT_EQ(ShowLines(*freshEmpty), ShowLines(*d));
   }
 }
@@ -352,19 +355,19 @@ TEST(DescriptorPattern, CopiesOwnTheirDataAndOutliveTheSource) {
   for (const ClassCase& c : Classes()) {
     if (!c.copiesEverything) continue;
     SCOPED_TRACE(c.name);
-    Bytes rich = Padded(c.rich);
+    Bytes rich = FollowedByZeros(c.rich);
     Bytes other = Empty(c.tag);
-    RavelCDescriptorBase* source = c.make(rich.data());
+    RavelCDescriptorBase* source = c.make(DescriptorIn(rich));
     const TraceLines expected = ShowLines(*source);
     std::unique_ptr<RavelCDescriptorBase> copied(c.copy(source));
-    std::unique_ptr<RavelCDescriptorBase> assigned(c.make(other.data()));
+    std::unique_ptr<RavelCDescriptorBase> assigned(c.make(DescriptorIn(other)));
     c.assign(assigned.get(), source);
     c.assign(assigned.get(), assigned.get());  // self-assignment keeps the data
     std::unique_ptr<RavelCDescriptorBase> empty(c.make(nullptr));
-    std::unique_ptr<RavelCDescriptorBase> fromEmpty(c.make(rich.data()));
+    std::unique_ptr<RavelCDescriptorBase> fromEmpty(c.make(DescriptorIn(rich)));
     c.assign(fromEmpty.get(), empty.get());
     // Re-parsing and then destroying the source must not reach the copies.
-    source->ParseRawData(other.data());
+    source->ParseRawData(DescriptorIn(other));
     delete source;
     EXPECT_EQ(expected, ShowLines(*copied));
     EXPECT_EQ(expected, ShowLines(*assigned));
@@ -381,7 +384,7 @@ TEST(DescriptorFactory, FactoryAndCopierAcceptExactlyTheSameSeventeenTags) {
   for (unsigned int tag = 0; tag < 256; ++tag) {
     Bytes raw = Empty(static_cast<uint8_t>(tag));
     TraceRecorder recorder;
-    std::unique_ptr<RavelCDescriptorBase> d(RavelSM_GetDescriptor(raw.data()));
+    std::unique_ptr<RavelCDescriptorBase> d(RavelSM_GetDescriptor(DescriptorIn(raw)));
     if (expected.count(tag) == 0) {
       EXPECT_EQ(nullptr, d.get()) << tag;
       char text[64];

@@ -39,7 +39,7 @@ TEST(ShortEventDescriptor, ReadsLanguageNameAndDescription) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.name);
-    Bytes raw = Padded(sb::Descriptor(0x4D, c.body));
+    Bytes raw = sb::Descriptor(0x4D, c.body);
     RavelCShortEventDescriptor d(raw.data());
     ASSERT_NE(nullptr, d.GetEventName());
     ASSERT_NE(nullptr, d.GetText());
@@ -73,7 +73,7 @@ TEST(ExtendedEventDescriptor, WalksItemsAndKeepsTheTextFromItsLengthByte) {
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     Bytes descriptor = sb::Descriptor(0x4E, Cat({U8(0x13), Text("por"), c.body}));
-    Bytes raw = Padded(descriptor);
+    Bytes raw = descriptor;
     RavelCExtendedEventDescriptor d(raw.data());
     ASSERT_EQ(static_cast<int>(c.items.size()), d.GetNumOfItems());
     std::vector<std::string> show{Banner("Extended Event Descriptor"),
@@ -124,7 +124,7 @@ TEST(SeriesDescriptor, DecodesPackedFieldsAndSizesTheNameFromTheLength) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.length);
-    Bytes raw = Padded(RawDescriptor(0xD5, c.length, Cat({header, c.name})), 'Q');
+    Bytes raw = RawDescriptor(0xD5, c.length, Cat({header, c.name}));
     RavelCSeriesDescriptor d(raw.data());
     EXPECT_EQ(0xC079, d.GetExpireDate());  // the raw MJD
     EXPECT_EQ(c.stored == nullptr, d.GetSeriesName() == nullptr);
@@ -147,7 +147,7 @@ TEST(FixedLengthTexts, CopyLengthMinusOneBytesAndStayTerminated) {
     std::string storedPrefix;
   } cases[] = {
       // Copyright: 4 id bytes, then length - 1 bytes from byte 6, three more
-      // than the descriptor holds (the padding letters).
+      // than the descriptor holds (the section's next letters).
       {"copyright with info", 0x0D, 8, Cat({sb::U32(7), Text("ABCD")}), 7, "ABCDQQQ"},
       {"copyright length 1", 0x0D, 1, sb::U32(7), 0, ""}, {"copyright length 0", 0x0D, 0, sb::U32(7), 255, "QQQ"},
       {"region with three letters", 0xC6, 4, Cat({U8(2), Text("RJ1")}), 3, "RJ1"},
@@ -155,17 +155,17 @@ TEST(FixedLengthTexts, CopyLengthMinusOneBytesAndStayTerminated) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded(RawDescriptor(c.tag, c.length, c.body), 'Q');
+    Bytes section = InSection(RawDescriptor(c.tag, c.length, c.body), Bytes(300, 'Q'));
     RavelCCopyrightDescriptor copyright(nullptr);
     RavelCTargetRegionDescriptor region(nullptr);
     TraceRecorder recorder;
     const char* text = nullptr;
     if (c.tag == 0x0D) {
-      ASSERT_EQ(kRavelOk, copyright.ParseRawData(raw.data()));
+      ASSERT_EQ(kRavelOk, copyright.ParseRawData(DescriptorIn(section)));
       EXPECT_EQ(7u, copyright.GetCopyrightId());
       text = copyright.GetCopyrightInfo();
     } else {
-      ASSERT_EQ(kRavelOk, region.ParseRawData(raw.data()));
+      ASSERT_EQ(kRavelOk, region.ParseRawData(DescriptorIn(section)));
       EXPECT_EQ(2, region.GetRegionSpecType());
       text = region.GetRegionSpec();
     }
@@ -177,14 +177,14 @@ TEST(FixedLengthTexts, CopyLengthMinusOneBytesAndStayTerminated) {
 }
 
 TEST(FixedLengthTexts, ShowPrintsTheStoredText) {
-  Bytes copyrightRaw = Padded(RawDescriptor(0x0D, 7, Cat({sb::U32(0x80000001), Text("TV")})));
-  RavelCCopyrightDescriptor copyright(copyrightRaw.data());
+  Bytes copyrightSection = InSection(RawDescriptor(0x0D, 7, Cat({sb::U32(0x80000001), Text("TV")})), Bytes(300, 0x00));
+  RavelCCopyrightDescriptor copyright(DescriptorIn(copyrightSection));
   EXPECT_EQ(0x80000001u, copyright.GetCopyrightId());
   // The id is printed with %d, so ids above 0x7FFFFFFF come out negative.
   EXPECT_EQ(Dump({Banner("Copyright Descriptor", 21), BaseLine(0x0D, 7, "Copyright Descriptor"),
                   "\t Copyright id: -2147483647 \n", "\t Copyright info: TV \n"}),
             ShowLines(copyright));
-  Bytes regionRaw = Padded(sb::Descriptor(0xC6, Cat({U8(1), Text("SP-RJ")})));
+  Bytes regionRaw = sb::Descriptor(0xC6, Cat({U8(1), Text("SP-RJ")}));
   RavelCTargetRegionDescriptor region(regionRaw.data());
   EXPECT_EQ(Dump({Banner("Target Region Descriptor", 21), BaseLine(0xC6, 6, "Region Descriptor"),
                   "\t Region Spec Type: 1 \n", "\t Region Spec: SP-RJ \n"}),
@@ -203,7 +203,7 @@ TEST(ComponentDescriptor, ReadsBitFieldsAndTheCodeAsOneInteger) {
        "\tiStreamContent=[0xf], iComponentType=[0xff], iComponentTag=[0xff], ISO Language Code=[0xffffff]\n"},
   };
   for (const Case& c : cases) {
-    Bytes raw = Padded(sb::Descriptor(0x50, c.body));
+    Bytes raw = sb::Descriptor(0x50, c.body);
     RavelCComponentDescriptor d(raw.data());
     EXPECT_EQ(c.body[0] & 0x0F, d.GetStreamContent());
     EXPECT_EQ(Dump({Banner("Component Descriptor"), BaseLine(0x50, c.body.size(), "Component Descriptor"), c.line}),
@@ -221,13 +221,13 @@ TEST(AudioComponentDescriptor, ReadsEveryFieldAndTheSecondCodeOnlyWhenMultiLingu
       {0x7F, 0, 1, 3, 7, 0, ""},            // 0 1 11 111 1
       {0x80, 1, 0, 0, 0, 0x737061, "spa"},
   };
-  Bytes rich = Padded(sb::Descriptor(
-      0xC4, Cat({U8(0x02), U8(0x03), U8(0x11), U8(0x0F), U8(0x01), U8(0xEB), Text("porspa")})));
+  Bytes rich = sb::Descriptor(
+      0xC4, Cat({U8(0x02), U8(0x03), U8(0x11), U8(0x0F), U8(0x01), U8(0xEB), Text("porspa")}));
   for (const Case& c : cases) {
     SCOPED_TRACE(int(c.flags));
     Bytes descriptor =
         sb::Descriptor(0xC4, Cat({U8(0xF2), U8(0x03), U8(0x11), U8(0x0F), U8(0x01), U8(c.flags), Text("porspa")}));
-    Bytes raw = Padded(descriptor);
+    Bytes raw = descriptor;
     // A multi-lingual descriptor first, so that a single-language one must clear its second code.
     RavelCAudioComponentDescriptor d(rich.data());
     ASSERT_EQ(kRavelOk, d.ParseRawData(raw.data()));
@@ -260,7 +260,7 @@ TEST(ContentDescriptor, SplitsGenresAndTracesEachOne) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.descriptor.size());
-    Bytes raw = Padded(c.descriptor);
+    Bytes raw = c.descriptor;
     TraceRecorder recorder;
     RavelCContentDescriptor d(raw.data());
     EXPECT_EQ(At(kWarning, c.parseTrace), recorder.Lines());

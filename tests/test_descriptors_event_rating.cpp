@@ -18,7 +18,8 @@ using namespace th;
 
 namespace {
 
-Bytes Padded64(const Bytes& descriptor) { return Padded(descriptor, 0x00, 64); }
+// Zeros after a descriptor in its section: what a parse reading past its length takes in.
+Bytes FollowedByZeros(const Bytes& descriptor) { return InSection(descriptor, Bytes(64, 0x00)); }
 
 Bytes Rating(const char* country, uint8_t rating) { return sb::Cat({sb::Text(country), sb::U8(rating)}); }
 
@@ -54,7 +55,7 @@ TEST(ParentalRatingAge, FollowsTheStandardInForceAtParseTime) {
   for (const Case& c : cases) {
     SCOPED_TRACE(testing::Message() << "standard " << c.standard << " rating 0x" << std::hex << int(c.rating));
     StandardScope standard(c.standard);
-    Bytes raw = Padded64(sb::Descriptor(0x55, Rating("bra", c.rating)));
+    Bytes raw = sb::Descriptor(0x55, Rating("bra", c.rating));
     TraceRecorder recorder;
     RavelCParentalRatingDescriptor d(raw.data());
     ASSERT_EQ(1, d.GetNumOfParentalRatings());
@@ -80,7 +81,7 @@ TEST(ParentalRatingDescriptor, WalksFourByteEntriesAndShowsEachOne) {
        {"\t\tCountry Code=[BRA], Content=[0x02], Mimimum Age = [12] \n",
         "\t\tCountry Code=[ARG], Content=[0x00], Mimimum Age = [18] \n"}},
       // A length that is not a multiple of 4: the last entry starts inside the
-      // body and is read whole (here from the zero padding).
+      // body and is read whole (here from the zeros after it).
       {"length 5", RawDescriptor(0x55, 5, sb::Cat({Rating("BRA", 0x45), sb::U8(0)})), {"BRA", ""},
        {"\t\tCountry Code=[BRA], Content=[0x04], Mimimum Age = [16] \n",
         "\t\tCountry Code=[], Content=[0x00], Mimimum Age = [0] \n"}},
@@ -88,8 +89,8 @@ TEST(ParentalRatingDescriptor, WalksFourByteEntriesAndShowsEachOne) {
   StandardScope standard(RAVEL_STANDARD_BRAZIL);
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded64(c.descriptor);
-    RavelCParentalRatingDescriptor d(raw.data());
+    Bytes section = FollowedByZeros(c.descriptor);
+    RavelCParentalRatingDescriptor d(DescriptorIn(section));
     ASSERT_EQ(static_cast<int>(c.countries.size()), d.GetNumOfParentalRatings());
     std::vector<std::string> show{Banner("Parental Rating Descriptor", 21), BaseLine(0x55, c.descriptor[1], "Parental Rating Descriptor")};
     for (int i = 0; i < d.GetNumOfParentalRatings(); ++i) {
@@ -134,7 +135,7 @@ TEST(LocalTimeOffsetEntry, DecodesOffsetsAndTheTimeOfChangeByTheReceiversRules) 
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded64(sb::Descriptor(0x58, c.entry));
+    Bytes raw = sb::Descriptor(0x58, c.entry);
     RavelCLocalTimeOffsetDescriptor d(raw.data());
     ASSERT_EQ(1, d.GetNumOfLocalTimeOffsets());
     RavelCLocalTimeOffset* e = d.GetLocalTimeOffset(0);
@@ -187,7 +188,7 @@ TEST(LocalTimeOffsetDescriptor, WalksThirteenByteEntries) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded64(c.descriptor);
+    Bytes raw = c.descriptor;
     TraceRecorder recorder;
     RavelCLocalTimeOffsetDescriptor d(raw.data());
     EXPECT_TRUE(recorder.Records().empty());
@@ -200,9 +201,9 @@ TEST(LocalTimeOffsetDescriptor, WalksThirteenByteEntries) {
 
 TEST(LocalTimeOffsetDescriptor, LookupsMatchCountryIgnoringCaseThenRegion) {
   const Bytes change = sb::UtcTime(2013, 2, 17, 0, 0, 0);
-  Bytes raw = Padded64(sb::Descriptor(
+  Bytes raw = sb::Descriptor(
       0x58, sb::Cat({Offset("BRA", 1 << 2, 0x0300, change, 0x0200), Offset("JPN", 0, 0x0900, change, 0x0900),
-                     Offset("bra", 2 << 2, 0x0400, change, 0x0300)})));
+                     Offset("bra", 2 << 2, 0x0400, change, 0x0300)}));
   RavelCLocalTimeOffsetDescriptor d(raw.data());
   ASSERT_EQ(3, d.GetNumOfLocalTimeOffsets());
   RavelCLocalTimeOffset* first = d.GetLocalTimeOffset(0);
@@ -234,7 +235,7 @@ TEST(LocalTimeOffsetDescriptor, LookupsMatchCountryIgnoringCaseThenRegion) {
     EXPECT_EQ(c.expected, d.GetLocalTimeOffset(c.country, c.regionId));
   }
 
-  Bytes emptyRaw = Padded64(RawDescriptor(0x58, 0, {}));
+  Bytes emptyRaw = RawDescriptor(0x58, 0, {});
   RavelCLocalTimeOffsetDescriptor empty(emptyRaw.data());
   EXPECT_EQ(nullptr, empty.GetLocalTimeOffset("BRA"));
   EXPECT_EQ(nullptr, empty.GetLocalTimeOffset("BRA", 0));
@@ -276,7 +277,7 @@ TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodes) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes raw = Padded64(c.descriptor);
+    Bytes raw = c.descriptor;
     RavelCCountryAvailabilityDescriptor d(raw.data());
     EXPECT_EQ(c.flag, d.GetCountryAvailabilityFlag());
     ASSERT_EQ(static_cast<int>(c.codes.size()), d.GetNumOfCountryCodes());
@@ -291,7 +292,7 @@ TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodes) {
 }
 
 TEST(CountryAvailabilityDescriptor, CodeIndexOutOfRangePanicsAndYieldsNull) {
-  Bytes raw = Padded64(sb::Descriptor(0x49, sb::Cat({sb::U8(0x80), sb::Text("BRAARG")})));
+  Bytes raw = sb::Descriptor(0x49, sb::Cat({sb::U8(0x80), sb::Text("BRAARG")}));
   RavelCCountryAvailabilityDescriptor d(raw.data());
   for (int index : {-1, 2}) {
     TraceRecorder recorder;

@@ -275,7 +275,7 @@ TEST(PMTStreamLoop, StartsAfterTheProgramInfoAndRunsToTheFirstCrcByte) {
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes section = Padded(sb::LongSection(PmtOptions(), c.body), 0xFF, 0x50);  // what a stream may read past the section
+    Bytes section = sb::LongSection(PmtOptions(), c.body);
     TraceRecorder recorder;
     RavelCPMT pmt(section.data());
     EXPECT_EQ(c.streams, StreamsOf(pmt));
@@ -304,7 +304,7 @@ TEST(MapInfo, DescriptorLoopStopsAtLengthZeroAndLaterDescriptorsReplaceEarlierOn
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    Bytes entry = Padded(StreamEntry({0x06, 0x0113, c.descriptors}), 0xFF, 8);
+    Bytes entry = StreamEntry({0x06, 0x0113, c.descriptors});
     RavelCMapInfo info(nullptr);
     TraceRecorder recorder;
     EXPECT_EQ(kRavelOk, info.ParseRawData(entry.data()));

@@ -37,13 +37,15 @@ TEST(TableBaseHeader, EveryWireBitLandsInItsOwnField) {
   for (const Field& field : layout) {
     for (int place = field.width - 1; place >= 0; --place, ++bit) {
       SCOPED_TRACE("wire bit " + std::to_string(bit));
-      unsigned char section[8] = {0};
-      section[bit / 8] = static_cast<unsigned char>(0x80 >> (bit % 8));
+      // section_length 5: the 8 header bytes are the whole section.
+      unsigned char section[8] = {0x00, 0x00, 0x05};
+      section[bit / 8] ^= static_cast<unsigned char>(0x80 >> (bit % 8));
       RavelCTableBase table(nullptr);
       TraceRecorder recorder;
       EXPECT_EQ(kRavelOk, table.ParseRawData(section));
       std::vector<unsigned int> expected(9, 0);
-      if (field.member >= 0) expected[field.member] = 1u << place;
+      expected[3] = 5;
+      if (field.member >= 0) expected[field.member] ^= 1u << place;
       EXPECT_EQ(expected, HeaderOf(table));
       EXPECT_TRUE(recorder.Records().empty());
     }

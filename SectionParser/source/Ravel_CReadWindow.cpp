@@ -17,11 +17,20 @@ const int kDsmccMessageOffset = 8;        // a DSM-CC message follows the long s
 
 RavelCReadWindow::RavelCReadWindow(const unsigned char* section) : pOuterBegin(tWindowBegin), pOuterEnd(tWindowEnd) {
   if (section == 0) return;
-  const bool nested = tWindowBegin != 0 && section >= tWindowBegin && section < tWindowEnd;
   // section_length itself is read through the outer window, if there is one.
-  const unsigned char* end = section + kSectionHeaderBytes + (Read12(section + 1));
+  Open(section, section + kSectionHeaderBytes + (Read12(section + 1)));
+}
+
+RavelCReadWindow::RavelCReadWindow(const unsigned char* begin, const unsigned char* end)
+    : pOuterBegin(tWindowBegin), pOuterEnd(tWindowEnd) {
+  if (begin == 0) return;
+  Open(begin, end);
+}
+
+void RavelCReadWindow::Open(const unsigned char* begin, const unsigned char* end) {
+  const bool nested = tWindowBegin != 0 && begin >= tWindowBegin && begin < tWindowEnd;
   if (nested && end > tWindowEnd) end = tWindowEnd;
-  tWindowBegin = section;
+  tWindowBegin = begin;
   tWindowEnd = end;
 }
 
@@ -31,7 +40,10 @@ RavelCReadWindow::~RavelCReadWindow() {
 }
 
 const unsigned char* RavelCReadWindow::SectionOfMessage(const unsigned char* message) {
-  return message != 0 ? message - kDsmccMessageOffset : 0;
+  if (message == 0) return 0;
+  const bool heldAlone = tWindowBegin != 0 && message >= tWindowBegin && message < tWindowEnd &&
+                         message - tWindowBegin < kDsmccMessageOffset;
+  return heldAlone ? 0 : message - kDsmccMessageOffset;
 }
 
 int RavelCReadWindow::OwnedSize(const unsigned char* section, int size) {

@@ -97,13 +97,17 @@ inline Bytes RawDescriptor(uint8_t tag, uint8_t length, const Bytes& body = Byte
   return d;
 }
 
-// The bytes followed by `count` bytes of `fill`, for parsers that read past a
-// descriptor's end (several trust their length byte or read a fixed header).
-inline Bytes Padded(const Bytes& bytes, uint8_t fill = 0x00, size_t count = 300) {
-  Bytes padded = bytes;
-  padded.insert(padded.end(), count, fill);
-  return padded;
+// A descriptor as a table hands it to its parse: inside its section, followed
+// there by `following` (the section's later bytes, which a parse reading past a
+// short length takes in) and the CRC_32. The section is exact: nothing lies
+// beyond its last byte. DescriptorIn gives the descriptor's first byte.
+inline Bytes InSection(const Bytes& descriptor, const Bytes& following) {
+  sb::SectionOptions options;
+  options.tableId = 0x4E;
+  return sb::LongSection(options, sb::Cat({descriptor, following}));
 }
+
+inline unsigned char* DescriptorIn(Bytes& section) { return section.data() + 8; }
 
 // year, month, day, hour, minute, second.
 inline std::vector<int> DateOf(const RavelCDateTime& t) {

@@ -25,8 +25,12 @@ class RavelCReadWindow {
   // [section, section + 3 + section_length). Inside an open window that holds
   // `section`, the nearer of the two ends is kept. A null section opens nothing.
   explicit RavelCReadWindow(const unsigned char* section);
+  // Opens [begin, end) for bytes without a section header of their own (a
+  // DSM-CC message held alone), with the same rule inside an open window.
+  RavelCReadWindow(const unsigned char* begin, const unsigned char* end);
   // The window of a DSM-CC message: `message` lies 8 bytes into its section,
-  // whose header gives the end.
+  // whose header gives the end. Null (no window of its own: the open one
+  // applies) when an open window holds the message but not those 8 bytes.
   static const unsigned char* SectionOfMessage(const unsigned char* message);
   // Closes this window; the one it was opened in applies again.
   ~RavelCReadWindow();
@@ -53,6 +57,7 @@ class RavelCReadWindow {
  private:
   RavelCReadWindow(const RavelCReadWindow&);
   RavelCReadWindow& operator=(const RavelCReadWindow&);
+  void Open(const unsigned char* begin, const unsigned char* end);
 
   const unsigned char* pOuterBegin;
   const unsigned char* pOuterEnd;
