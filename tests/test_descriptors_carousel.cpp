@@ -59,9 +59,10 @@ TEST(InfoDescriptor, KeepsTheTextWithTwoZeroBytesAndCopiesItUpToTheFirstZero) {
   };
   for (Case& c : cases) {
     SCOPED_TRACE(c.what);
-    Bytes raw = sb::Descriptor(0x03, c.body);
-    raw.resize(16, 0x00);  // the language code is read from bytes 2 to 4 whatever the length
-    RavelCInfoDescriptor d(raw.data());
+    // The language code is read from bytes 2 to 4 whatever the length: zeros
+    // follow the descriptor in its section.
+    Bytes section = InSection(sb::Descriptor(0x03, c.body), Bytes(16, 0x00));
+    RavelCInfoDescriptor d(DescriptorIn(section));
     EXPECT_STREQ(c.language, d.GetLanguageCode());
     ASSERT_NE(nullptr, d.GetText());
     EXPECT_EQ(std::string(c.text.begin(), c.text.end()), std::string(d.GetText(), c.text.size()));

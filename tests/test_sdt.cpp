@@ -90,12 +90,13 @@ TEST(ServiceDescription, DecodesFlagsAndStatusFromTheirOwnBits) {
       {Bytes{0x48, 0x00, 0xFF, 0xF0, 0x00}, 0x4800, 7, 1, 1, 7, 1, 0},
       {Bytes{0x49, 0x80, 0xE5, 0x30, 0x00}, 0x4980, 1, 0, 1, 1, 1, 0},
       {Bytes{0xFF, 0xFF, 0x1E, 0x40, 0x00}, 0xFFFF, 7, 1, 0, 2, 0, 0},
-      {Bytes{0x12, 0x34, 0xE2, 0xFF, 0x03, 0xC1, 0x01, 0x84}, 0x1234, 0, 1, 0, 7, 1, 0xF03},
+      // A loop of 0xF03 bytes: one descriptor of 3 bytes, fifteen of 256.
+      {sb::Cat({Bytes{0x12, 0x34, 0xE2, 0xFF, 0x03, 0xC1, 0x01, 0x84}, Bytes(15 * 256, 0xFF)}), 0x1234, 0, 1, 0, 7, 1,
+       0xF03},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.id);
     Bytes entry = c.entry;
-    entry.resize(0x1000, 0xFF);  // the last case's loop length reaches far; 0xFF tags with length 0xFF
     RavelCServiceDescription service(nullptr);
     service.ParseRawData(entry.data());
     EXPECT_EQ(c.id, service.GetServiceId());
@@ -264,7 +265,6 @@ TEST(SDTServiceLoop, RunsFromByte11ToTheFirstCrcByte) {
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     Bytes section = sb::LongSection(SdtOptions(), c.body);
-    section.resize(section.size() + 0x40, 0xC2);  // what a service may read past the section
     RavelCSDT sdt(nullptr);
     EXPECT_EQ(kRavelOk, sdt.ParseRawData(section.data()));
     EXPECT_EQ(c.ids, ServiceIdsOf(sdt));
