@@ -2,7 +2,8 @@
 # Builds the receivers' path soak in a Release build without sanitizers
 # (build-soak) and runs it: streams mutated from the seeds of fuzz_receivers,
 # every section's CRC_32 recomputed, straight into the library as a receiver
-# hands them over. A crash writes the stream to build-soak/soak-crash-<n>.
+# hands them over, after a replay of the fuzz corpus (build-fuzz/corpus) in the
+# same build. A crash writes the stream to build-soak/soak-crash-<n>.
 #
 #   fuzz/soak.sh [STREAMS] [RANDOM_SEED]     default: 10000000 streams, seed 1
 #
@@ -16,7 +17,7 @@ seed="${2:-1}"
 
 cmake -S . -B build-soak -DCMAKE_BUILD_TYPE=Release -DRAVEL_BUILD_FUZZERS=ON -DRAVEL_BUILD_TESTS=OFF \
   -DRAVEL_BUILD_TOOLS=OFF >/dev/null
-cmake --build build-soak -j"${RAVEL_JOBS:-2}" --target fuzz_receivers_soak
+cmake --build build-soak -j"${RAVEL_JOBS:-2}" --target fuzz_receivers_soak fuzz_receivers_replay
 
 captures="${RAVEL_CAPTURES:-../shared/captures}"
 if [ ! -d build-soak/seeds/fuzz_receivers ]; then
@@ -25,6 +26,11 @@ if [ ! -d build-soak/seeds/fuzz_receivers ]; then
     exit 2
   fi
   python3 fuzz/make-seeds.py "$captures" build-soak/seeds >/dev/null
+fi
+
+# The corpus of the fuzz runs first, if there is one (fuzz/run.sh keeps it).
+if [ -d build-fuzz/corpus/fuzz_receivers ]; then
+  build-soak/fuzz/fuzz_receivers_replay build-fuzz/corpus/fuzz_receivers
 fi
 
 cd build-soak
