@@ -2,8 +2,15 @@
 # ravel-dump over damaged input, under AddressSanitizer, UndefinedBehaviorSanitizer
 # and LeakSanitizer (the build of scripts/test-sanitizers.sh): every shared
 # capture and the sample cut at random points, captures with random bytes
-# written over them, and files of random bytes. Each run must end cleanly:
-# status 0, or 1 with ravel-dump's own message; no sanitizer report, no hang.
+# written over them, captures with bytes of their sections damaged and each
+# damaged section's CRC_32 recomputed (so that the damage reaches the parse
+# operations), and files of random bytes. Each run must end cleanly: status 0,
+# or 1 with ravel-dump's own message; no sanitizer report, no hang. A run must
+# also keep the output of the part of its input that is intact:
+#   - a transport stream cut at any point prints exactly what its whole packets
+#     before the cut print, with the same status;
+#   - a capture with damaged sections that keep their CRC_32 is read to its end
+#     (status 0) while any section is left undamaged.
 #
 #   scripts/test-dump-robustness.sh [CUTS_PER_FILE]      default 30
 #
@@ -38,6 +45,11 @@ modes=("" "--summary" "--json" "--extract-modules $work/modules" "--extract-file
 below() { echo $(((RANDOM * 32768 + RANDOM) % $1)); }
 
 # Runs ravel-dump on $1 with the options that follow; $label names the case.
+# When $expect_out names a file, stdout must equal it and the status must be
+# $expect_rc; when $expect_rc alone is set, the status must be it. Leaves the
+# status in $last_rc and stdout in $work/out.
+expect_out=""
+expect_rc=""
 check() {
   local input=$1
   shift
@@ -45,13 +57,18 @@ check() {
   runs=$((runs + 1))
   # shellcheck disable=SC2068
   timeout 120 "$dump" --no-progress $@ "$input" >"$work/out" 2>"$work/err" || rc=$?
+  last_rc=$rc
   local why=""
   if grep -qE "Sanitizer|runtime error:" "$work/err"; then
     why="sanitizer report"
-  elif [ "$rc" -eq 1 ]; then
-    grep -q "^ravel-dump: " "$work/err" || why="status 1 without a message"
-  elif [ "$rc" -ne 0 ]; then
+  elif [ "$rc" -eq 1 ] && ! grep -q "^ravel-dump: " "$work/err"; then
+    why="status 1 without a message"
+  elif [ "$rc" -ne 0 ] && [ "$rc" -ne 1 ]; then
     why="status $rc"
+  elif [ -n "$expect_rc" ] && [ "$rc" -ne "$expect_rc" ]; then
+    why="status $rc where the intact part gives $expect_rc"
+  elif [ -n "$expect_out" ] && ! cmp -s "$work/out" "$expect_out"; then
+    why="the output of the intact part is lost or changed"
   fi
   if [ -n "$why" ]; then
     failures=$((failures + 1))
@@ -81,7 +98,16 @@ for f in "${files[@]}"; do
     [ "$point" -ge 0 ] || continue
     head -c "$point" "$f" >"$work/input"
     label="$(basename "$f") cut at $point"
-    check "$work/input" "$options ${modes[$((runs % ${#modes[@]}))]}"
+    mode="$options ${modes[$((runs % ${#modes[@]}))]}"
+    if [ -z "$options" ]; then
+      # The whole packets before the cut, read alone, give the expected output.
+      head -c $((point / 188 * 188)) "$f" >"$work/intact"
+      check "$work/intact" "$mode"
+      cp "$work/out" "$work/intact-out"
+      expect_out="$work/intact-out" expect_rc=$last_rc
+    fi
+    check "$work/input" "$mode"
+    expect_out="" expect_rc=""
   done
   # Random bytes written over the capture, in 1 to 64 places.
   for ((i = 0; i < cuts / 3 + 1; i++)); do
@@ -93,6 +119,15 @@ for f in "${files[@]}"; do
     done
     label="$(basename "$f") with $spots damaged spots"
     check "$work/input" "$options ${modes[$((runs % ${#modes[@]}))]}"
+  done
+  # Damaged sections that keep a valid CRC_32, in 1 to 64 of them.
+  for ((i = 0; i < cuts / 3 + 1; i++)); do
+    spots=$((1 + $(below 64)))
+    read -r damaged left < <(python3 scripts/damage-keeping-crc.py $options "$f" "$work/input" "$(below 1000000)" "$spots")
+    label="$(basename "$f") with $damaged sections damaged, CRC_32 kept"
+    [ "$left" -gt 0 ] && expect_rc=0
+    check "$work/input" "$options ${modes[$((runs % ${#modes[@]}))]}"
+    expect_rc=""
   done
 done
 

@@ -181,9 +181,6 @@ Bytes SamplePatStream() { return Packets(0x0000, {PatSection(0x1234, 3, {{1, 0x0
 
 TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
   Bytes good = SamplePatStream();
-  Bytes cut(good.begin(), good.end() - 100);
-  Bytes garbageAtEnd = good;
-  garbageAtEnd.insert(garbageAtEnd.end(), 300, 0x00);
   Bytes text(2000, 'x');
   Bytes sections = sb::Cat({PatSection(1, 0, {{1, 0x100}}), PatSection(1, 1, {{1, 0x100}})});
   Bytes cutSections(sections.begin(), sections.end() - 3);
@@ -199,9 +196,6 @@ TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
       {"directory", {"DIR"}, {}, false, {}, "is a directory"}, {"empty file", {"@"}, {}, true, {}, "empty input"},
       {"empty standard input", {"-"}, {}, false, {}, "standard input: empty input"},
       {"text file", {"@"}, text, true, {}, "not a transport stream"},
-      {"cut in a packet", {"@"}, cut, true, {}, "truncated"},
-      {"cut on standard input", {"-"}, {}, false, cut, "truncated"},
-      {"garbage at the end", {"@"}, garbageAtEnd, true, {}, "truncated"},
       {"sections cut", {"--sections", "@"}, cutSections, true, {}, "truncated"},
       {"not sections", {"--sections", "@"}, text, true, {}, "not a file of raw sections"},
       {"stream given as sections", {"--sections", "@"}, good, true, {}, "a transport stream, not raw sections"},
@@ -221,6 +215,40 @@ TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
     EXPECT_EQ(0u, run.err.find("ravel-dump: ")) << c.what << ": " << run.err;
     EXPECT_NE(std::string::npos, run.err.find(c.message)) << c.what << ": " << run.err;
     EXPECT_FALSE(fs::exists(Path("modules"))) << c.what;
+  }
+}
+
+TEST_F(RavelDumpTest, CutLastPacketIsReportedAndTheWholePacketsBeforeItAreRead) {
+  Bytes good = SamplePatStream();
+  Bytes intact(good.begin(), good.end() - 188);
+  Bytes cut(good.begin(), good.end() - 100);
+  Bytes garbageAtEnd = good;
+  garbageAtEnd.insert(garbageAtEnd.end(), 300, 0x00);
+  struct Case {
+    const char* what;
+    std::vector<std::string> args;  // "@" stands for the case's file
+    Bytes file;
+    Bytes input;
+    Bytes wholePackets;
+    const char* problem;
+  } cases[] = {
+      {.what = "cut in a packet", .args = {"@"}, .file = cut, .input = {}, .wholePackets = intact,
+       .problem = "the input ends inside a packet (88 of 188 bytes)"},
+      {.what = "cut on standard input", .args = {"-"}, .file = {}, .input = cut, .wholePackets = intact,
+       .problem = "the input ends inside a packet (88 of 188 bytes)"},
+      {.what = "garbage at the end", .args = {"@"}, .file = garbageAtEnd, .input = {}, .wholePackets = good,
+       .problem = "bytes that do not make a whole packet"},
+  };
+  for (const Case& c : cases) {
+    ToolRun reference = Run({Write("whole.ts", c.wholePackets)});
+    ASSERT_EQ(0, reference.status) << c.what << reference.err;
+    std::string file = Write("input.ts", c.file);
+    std::vector<std::string> args;
+    for (const std::string& a : c.args) args.push_back(a == "@" ? file : a);
+    ToolRun run = Run(args, c.input);
+    EXPECT_EQ(0, run.status) << c.what << run.err;
+    EXPECT_EQ(reference.out, run.out) << c.what;
+    EXPECT_NE(std::string::npos, run.err.find(c.problem)) << c.what << "\n" << run.err;
   }
 }
 

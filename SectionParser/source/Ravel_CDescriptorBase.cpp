@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorBase.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -29,8 +30,8 @@ int RavelCDescriptorBase::ParseRawData(unsigned char* raw) {
     iDescriptorLength = 0;
     return kRavelErrInvalidArgument;
   }
-  iDescriptorTag = raw[0];
-  iDescriptorLength = raw[1];
+  iDescriptorTag = RavelCReadWindow::Read8(raw);
+  iDescriptorLength = RavelCReadWindow::Read8(raw + 1);
   sDescriptorName = "Unknown Descriptor";
   return kRavelOk;
 }

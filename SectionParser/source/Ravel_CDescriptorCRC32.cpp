@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -30,7 +31,7 @@ int RavelCCRC32Descriptor::ParseRawData(unsigned char* raw) {
   std::memset(aCRC32, 0, sizeof(aCRC32));
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  std::memcpy(aCRC32, raw + 2, sizeof(aCRC32));
+  RavelCReadWindow::Copy(aCRC32, raw + 2, sizeof(aCRC32));
   return kRavelOk;
 }
 

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorComponent.h"
 
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -35,7 +36,7 @@ int RavelCComponentDescriptor::ParseRawData(unsigned char* raw) {
     return result;
   }
   unsigned char status = 0;
-  RavelCBitInputStream reader(raw + 2, iDescriptorLength, 0);
+  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   reader.Skip(4);                                      // xxxx....
   iStreamContent = reader.ReadByte(4, status);         // ....xxxx
   iComponentType = reader.ReadByte(8, status);

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorCompressionType.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -30,8 +31,8 @@ int RavelCCompressionTypeDescriptor::ParseRawData(unsigned char* raw) {
   iOriginalSize = 0;
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  iCompressionType = raw[2];
-  iOriginalSize = RavelRead32(raw + 3);
+  iCompressionType = RavelCReadWindow::Read8(raw + 2);
+  iOriginalSize = RavelCReadWindow::Read32(raw + 3);
   return kRavelOk;
 }
 

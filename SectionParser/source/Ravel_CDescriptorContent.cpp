@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -56,10 +57,10 @@ int RavelCContentDescriptor::ParseRawData(unsigned char* raw) {
   pGenre = new unsigned char[iGenreCount];
   pUserGenre = new unsigned char[iGenreCount];
   for (int i = 0; i < iGenreCount; ++i) {
-    pGenre[i] = raw[2 + 2 * i];
+    pGenre[i] = RavelCReadWindow::Read8(raw + 2 + 2 * i);
     // Every genre is reported at warning level for the field diagnostics.
     RAVEL_TRACE(RAVEL_PARSER_WARNING, "raw genre = 0x%x!\n", pGenre[i]);
-    pUserGenre[i] = raw[3 + 2 * i];
+    pUserGenre[i] = RavelCReadWindow::Read8(raw + 3 + 2 * i);
   }
   return kRavelOk;
 }

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorDataComponent.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -26,7 +27,7 @@ int RavelCDataComponentDescriptor::ParseRawData(unsigned char* raw) {
     iDataComponentId = 0;
     return result;
   }
-  iDataComponentId = RavelRead16(raw + 2);
+  iDataComponentId = RavelCReadWindow::Read16(raw + 2);
   return kRavelOk;
 }
 

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorEstDownloadTime.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -28,7 +29,7 @@ int RavelCEstDownloadTimeDescriptor::ParseRawData(unsigned char* raw) {
   iEstDownloadTime = 0;
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  iEstDownloadTime = RavelRead32(raw + 2);
+  iEstDownloadTime = RavelCReadWindow::Read32(raw + 2);
   return kRavelOk;
 }
 

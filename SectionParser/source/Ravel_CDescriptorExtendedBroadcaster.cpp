@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -41,22 +42,22 @@ int RavelCExtendedBroadcasterDescriptor::ParseRawData(unsigned char* raw) {
   if (result != kRavelOk) return result;
   // A descriptor of another broadcaster type keeps nothing of an earlier one.
   iTerrestrialBroadcasterId = 0;
-  iBroadcasterType = raw[2] >> 4;  // xxxx----
+  iBroadcasterType = RavelCReadWindow::Read8(raw + 2) >> 4;  // xxxx----
   if (iBroadcasterType != 1 && iBroadcasterType != 2) return kRavelOk;
 
   // Types 1 and 2 share the layout: for type 2 the id is the sound broadcaster's.
-  iTerrestrialBroadcasterId = RavelRead16(raw + 3);
-  iNumberOfAffiliationIds = raw[5] >> 4;   // xxxx----
-  iNumberOfBroadcasterIds = raw[5] & 0x0F;  // ----xxxx
+  iTerrestrialBroadcasterId = RavelCReadWindow::Read16(raw + 3);
+  iNumberOfAffiliationIds = RavelCReadWindow::Read8(raw + 5) >> 4;   // xxxx----
+  iNumberOfBroadcasterIds = RavelCReadWindow::Read8(raw + 5) & 0x0F;  // ----xxxx
   const unsigned char* at = raw + 6;
   // The affiliation ids are taken from every second byte, while the loop after
   // them starts one byte per id further on. Receivers rely on these values as
   // they are, so both steps stay. The 4-bit counts keep every index below 16.
-  for (int i = 0; i < iNumberOfAffiliationIds; ++i) aAffiliationIds[i] = at[2 * i];
+  for (int i = 0; i < iNumberOfAffiliationIds; ++i) aAffiliationIds[i] = RavelCReadWindow::Read8(at + 2 * i);
   at += iNumberOfAffiliationIds;
   for (int j = 0; j < iNumberOfBroadcasterIds; ++j) {
-    aOriginalNetworkIds[j] = RavelRead16(at + 3 * j);
-    aBroadcasterIds[j] = at[3 * j + 2];
+    aOriginalNetworkIds[j] = RavelCReadWindow::Read16(at + 3 * j);
+    aBroadcasterIds[j] = RavelCReadWindow::Read8(at + 3 * j + 2);
   }
   return kRavelOk;
 }

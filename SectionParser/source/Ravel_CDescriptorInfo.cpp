@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -59,7 +60,7 @@ int RavelCInfoDescriptor::ParseRawData(unsigned char* raw) {
   // A length below 3 holds no text: the buffer is then just the two 0 bytes.
   int textLength = iDescriptorLength >= 3 ? iDescriptorLength - 3 : 0;
   pText = new char[textLength + 2];
-  if (textLength > 0) std::memcpy(pText, raw + 5, static_cast<std::size_t>(textLength));
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(pText), raw + 5, textLength);
   pText[textLength] = '\0';
   pText[textLength + 1] = '\0';
   return kRavelOk;

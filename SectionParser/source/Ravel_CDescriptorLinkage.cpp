@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorLinkage.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -30,10 +31,10 @@ int RavelCLinkageDescriptor::ParseRawData(unsigned char* raw) {
     iLinkageType = 0;
     return result;
   }
-  iTransportStreamId = RavelRead16(raw + 2);
-  iOriginalNetworkId = RavelRead16(raw + 4);
-  iServiceId = RavelRead16(raw + 6);
-  iLinkageType = raw[8];
+  iTransportStreamId = RavelCReadWindow::Read16(raw + 2);
+  iOriginalNetworkId = RavelCReadWindow::Read16(raw + 4);
+  iServiceId = RavelCReadWindow::Read16(raw + 6);
+  iLinkageType = RavelCReadWindow::Read8(raw + 8);
   return kRavelOk;
 }
 

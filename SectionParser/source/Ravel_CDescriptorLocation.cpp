@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorLocation.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -25,7 +26,7 @@ int RavelCLocationDescriptor::ParseRawData(unsigned char* raw) {
   iLocationTag = 0;
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  iLocationTag = raw[2];
+  iLocationTag = RavelCReadWindow::Read8(raw + 2);
   return kRavelOk;
 }
 

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorModuleLink.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -29,8 +30,8 @@ int RavelCModuleLinkDescriptor::ParseRawData(unsigned char* raw) {
   iModuleId = 0;
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  iPosition = raw[2];
-  iModuleId = RavelRead16(raw + 3);
+  iPosition = RavelCReadWindow::Read8(raw + 2);
+  iModuleId = RavelCReadWindow::Read16(raw + 3);
   return kRavelOk;
 }
 

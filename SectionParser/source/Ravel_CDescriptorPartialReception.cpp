@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorPartialReception.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -36,7 +37,9 @@ int RavelCPartialReceptionDescriptor::ParseRawData(unsigned char* raw) {
   if (result != kRavelOk) return result;
   // Each 16-bit service_id is stored as its first byte only; the receivers that
   // use this list match on that byte, so it is kept so.
-  for (int at = 2; at < 2 + iDescriptorLength; at += 2) aServiceIds.Append(raw[at]);
+  // The list stops at the end of the section too.
+  const unsigned char* end = RavelCReadWindow::Clamp(raw + 2, raw + 2 + iDescriptorLength);
+  for (const unsigned char* at = raw + 2; at < end; at += 2) aServiceIds.Append(*at);
   return kRavelOk;
 }
 

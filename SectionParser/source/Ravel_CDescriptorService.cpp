@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorService.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -42,12 +43,12 @@ int RavelCServiceDescriptor::ParseRawData(unsigned char* raw) {
   Release();
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  iServiceType = raw[2];
+  iServiceType = RavelCReadWindow::Read8(raw + 2);
   const unsigned char* at = raw + 3;
-  int providerLength = at[0];
+  int providerLength = RavelCReadWindow::Read8(at);
   if (providerLength > 0) pServiceProviderName = RavelText_NewCText(at + 1, providerLength);
   at += 1 + providerLength;
-  int nameLength = at[0];
+  int nameLength = RavelCReadWindow::Read8(at);
   if (nameLength > 0) pServiceName = RavelText_NewCText(at + 1, nameLength);
   return kRavelOk;
 }

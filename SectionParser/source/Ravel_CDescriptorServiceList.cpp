@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorServiceList.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -61,8 +62,8 @@ int RavelCServiceListDescriptor::ParseRawData(unsigned char* raw) {
   pServiceTypes = new unsigned char[iServiceCount];
   const unsigned char* entry = raw + 2;
   for (int i = 0; i < iServiceCount; ++i, entry += 3) {
-    pServiceIds[i] = RavelRead16(entry);
-    pServiceTypes[i] = entry[2];
+    pServiceIds[i] = RavelCReadWindow::Read16(entry);
+    pServiceTypes[i] = RavelCReadWindow::Read8(entry + 2);
   }
   return kRavelOk;
 }

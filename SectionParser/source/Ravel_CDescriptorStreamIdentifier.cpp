@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorStreamIdentifier.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -25,7 +26,7 @@ int RavelCStreamIdentifierDescriptor::ParseRawData(unsigned char* raw) {
     iComponentTag = 0;
     return result;
   }
-  iComponentTag = raw[2];
+  iComponentTag = RavelCReadWindow::Read8(raw + 2);
   return kRavelOk;
 }
 

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorTSInformation.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -37,9 +38,10 @@ int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
   // descriptor as they were; only the name is released.
   if (result != kRavelOk) return result;
   ClearTxTypes();
-  iRemoteControlKeyId = raw[2];
-  int nameLength = raw[3] >> 2;              // xxxxxx--
-  iTransmissionTypeCount = raw[3] & 0x03;    // ------xx
+  iRemoteControlKeyId = RavelCReadWindow::Read8(raw + 2);
+  const unsigned char counts = RavelCReadWindow::Read8(raw + 3);
+  int nameLength = counts >> 2;              // xxxxxx--
+  iTransmissionTypeCount = counts & 0x03;    // ------xx
   RavelText_SetString(sTsName, raw + 4, nameLength);
   unsigned char* record = raw + 4 + nameLength;
   for (int i = 0; i < iTransmissionTypeCount; ++i) {

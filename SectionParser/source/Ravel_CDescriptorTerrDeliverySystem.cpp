@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorTerrDeliverySystem.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_Cfg.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -55,15 +56,16 @@ int RavelCTerrDeliverySystemDescriptor::ParseRawData(unsigned char* raw) {
   Release();
   int result = ParseHeader(raw, kKind);
   if (result != kRavelOk) return result;
-  iAreaCode = RavelRead16(raw + 2) >> 4;  // xxxxxxxx xxxx----
-  iGuardInterval = (raw[3] >> 2) & 0x03;  // ----xx--
-  iTransmissionMode = raw[3] & 0x03;      // ------xx
+  iAreaCode = RavelCReadWindow::Read16(raw + 2) >> 4;  // xxxxxxxx xxxx----
+  const unsigned char mode = RavelCReadWindow::Read8(raw + 3);
+  iGuardInterval = (mode >> 2) & 0x03;  // ----xx--
+  iTransmissionMode = mode & 0x03;      // ------xx
   // Signed on purpose: a descriptor without even the area code gives -1.
   int bodyLength = iDescriptorLength - 2;
   iFrequencyCount = bodyLength / 2;
   if (iFrequencyCount > 0) {
     pFrequencies = new unsigned short[iFrequencyCount];
-    for (int i = 0; i < iFrequencyCount; ++i) pFrequencies[i] = RavelRead16(raw + 4 + 2 * i);
+    for (int i = 0; i < iFrequencyCount; ++i) pFrequencies[i] = RavelCReadWindow::Read16(raw + 4 + 2 * i);
   }
   return kRavelOk;
 }

@@ -126,8 +126,9 @@ bool PacketReader::Resync() {
     if (left < syncOffset_ + kPacket) {
       skipped_ += left;
       pos_ = end_;
-      return Fail(input_.Name() + ": truncated: the input ends with " + std::to_string(left) +
-                  " bytes that do not make a whole packet");
+      damage_ = input_.Name() + ": truncated: the input ends with " + std::to_string(left) +
+                " bytes that do not make a whole packet";
+      return false;
     }
     if (buffer_[pos_ + syncOffset_] != kSync) continue;
     bool run = true;
@@ -145,8 +146,9 @@ const uint8_t* PacketReader::Next() {
       if (!error_.empty()) return nullptr;
       std::size_t left = end_ - pos_;
       if (left == 0) return nullptr;
-      Fail(input_.Name() + ": truncated: the input ends inside a packet (" + std::to_string(left) + " of " +
-           std::to_string(stride_) + " bytes)");
+      damage_ = input_.Name() + ": truncated: the input ends inside a packet (" + std::to_string(left) + " of " +
+                std::to_string(stride_) + " bytes)";
+      pos_ = end_;
       return nullptr;
     }
     if (buffer_[pos_ + syncOffset_] == kSync) {

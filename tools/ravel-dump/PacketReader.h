@@ -25,10 +25,12 @@ class PacketReader {
 
   // The next 188-byte packet (from its sync byte), valid until the next call;
   // null at the end of the input or on a failure (then Error() is set: a read
-  // error, or an input that ends inside a packet).
+  // error). An input that ends inside a packet ends after its last whole packet,
+  // with Damage() set.
   const uint8_t* Next();
 
   const std::string& Error() const { return error_; }
+  const std::string& Damage() const { return damage_; }
   int PacketSize() const { return stride_; }
   uint64_t Packets() const { return packets_; }
   uint64_t SkippedBytes() const { return skipped_; }
@@ -62,6 +64,7 @@ class PacketReader {
   uint64_t skipped_;
   uint64_t resyncs_;
   std::string error_;
+  std::string damage_;
 };
 
 // The whole input in memory (for a file of raw sections). False with a reason.

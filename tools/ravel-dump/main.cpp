@@ -96,8 +96,8 @@ bool ReadSections(InputFile& input, Capture& capture, Stats& stats, InputSummary
   return true;
 }
 
-bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, InputSummary& summary,
-                         std::string& error) {
+bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux, Stats& stats,
+                         InputSummary& summary, std::string& error) {
   PacketReader reader(input);
   if (!reader.Start(error)) return false;
   Progress progress(options.progress, input.Size());
@@ -112,6 +112,7 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   summary.skippedBytes = reader.SkippedBytes();
   summary.resyncs = reader.Resyncs();
   summary.bytes = reader.Offset();
+  if (!reader.Damage().empty()) stats.Problem(reader.Damage());
   // A stop request ends the input where it is, inside a packet or not.
   if (!reader.Error().empty() && !StopRequested()) {
     error = reader.Error();
@@ -168,7 +169,7 @@ int main(int argc, char** argv) {
     } else {
       demux.RestrictTo(options.pids);
     }
-    if (!ReadTransportStream(input, options, demux, inputSummary, error)) return Fail(error);
+    if (!ReadTransportStream(input, options, demux, stats, inputSummary, error)) return Fail(error);
     if (input.Udp() != nullptr && input.Udp()->IgnoredDatagrams() > 0) {
       stats.Problem(std::to_string(input.Udp()->IgnoredDatagrams()) + " of " +
                     std::to_string(input.Udp()->Datagrams()) +
