@@ -7,6 +7,7 @@
 #include <string>
 
 #include "Ravel_CArray.h"
+#include "Ravel_CDescriptorService.h"
 #include "Ravel_CDsmccMsgBase.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTablePMT.h"
@@ -55,6 +56,16 @@ TEST(TraceLocation, IsTheCallSiteOfTheTraceEvenThroughASharedHelper) {
        .file = "SectionParser/source/Ravel_CDsmccMsgBase",
        .extension = ".cpp",
        .marker = "\"Unknown DSMCC Type!"},
+      {.label = "the shared descriptor header parse, for the service descriptor",
+       .trigger =
+           [] {
+             Bytes descriptor = sb::Cat({sb::U8(0x49), sb::U8(0)});
+             RavelCServiceDescriptor service(descriptor.data());
+           },
+       .text = "This Descriptor isn't Service Descriptor!",
+       .file = "SectionParser/source/Ravel_CDescriptorService",
+       .extension = ".cpp",
+       .marker = "ParseHeader(raw, kKind, __LINE__)"},
       {.label = "the array template, from the line of the access check",
        .trigger =
            [] {

@@ -38,7 +38,7 @@ void RavelCApplicationDescriptor::Clear() {
 
 int RavelCApplicationDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   unsigned char status = 0;
@@ -56,7 +56,7 @@ int RavelCApplicationDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCApplicationDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask,
               "\t iApplicationProfile=%u, iVersionMajor=%u, iVersionMinor=%u, iVersionMicro %u, "
               "bServiceBoundFlag=%u, iVisibility=%u, iAppPriority=%u, iAppTransportLabel=%u \n",

@@ -37,7 +37,7 @@ void RavelCApplicationNameDescriptor::Clear() {
 
 int RavelCApplicationNameDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   unsigned char status = 0;
@@ -49,7 +49,7 @@ int RavelCApplicationNameDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCApplicationNameDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask, "\t iISOLanguageCode=%s, iApplicationName=%s", szISOLanguageCode,
               RavelFixedText_Print(szApplicationName).Get());
 }

@@ -54,7 +54,7 @@ void RavelCAudioComponentDescriptor::Clear() {
 }
 
 int RavelCAudioComponentDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     Clear();
     return result;
@@ -80,7 +80,7 @@ int RavelCAudioComponentDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCAudioComponentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP,
               "\tiStreamContent=[0x%x], iComponentType=[0x%x], iComponentTag=[0x%x],iStreamType=[0x%x], "
               "iSimulcastGroupTag=[0x%x], iESMultiLingualFlag=[0x%x], iMainComponentFlag=[0x%x], "

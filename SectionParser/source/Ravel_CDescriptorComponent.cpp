@@ -30,7 +30,7 @@ void RavelCComponentDescriptor::Clear() {
 }
 
 int RavelCComponentDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     Clear();
     return result;
@@ -46,7 +46,7 @@ int RavelCComponentDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCComponentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP,
               "\tiStreamContent=[0x%x], iComponentType=[0x%x], iComponentTag=[0x%x], ISO Language Code=[0x%x]\n",
               iStreamContent, iComponentType, iComponentTag, iISO639LanguageCode);

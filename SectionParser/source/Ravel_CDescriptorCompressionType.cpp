@@ -29,7 +29,7 @@ RavelCCompressionTypeDescriptor::~RavelCCompressionTypeDescriptor() {}
 int RavelCCompressionTypeDescriptor::ParseRawData(unsigned char* raw) {
   iCompressionType = 0;
   iOriginalSize = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iCompressionType = RavelCReadWindow::Read8(raw + 2);
   iOriginalSize = RavelCReadWindow::Read32(raw + 3);
@@ -37,7 +37,7 @@ int RavelCCompressionTypeDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCCompressionTypeDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiCompressionType=[%d], iOriginalSize=[%d]\n", iCompressionType,
               static_cast<int>(iOriginalSize));
 }

@@ -47,7 +47,7 @@ void RavelCContentDescriptor::Release() {
 
 int RavelCContentDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iGenreCount = iDescriptorLength >> 1;
   if (iDescriptorLength < 2) {
@@ -88,7 +88,7 @@ unsigned char RavelCContentDescriptor::GetUserGenre(int index) {
 }
 
 void RavelCContentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < iGenreCount && pGenre != 0; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tGenre[%d]=[0x%02x]", i, pGenre[i]);
   }

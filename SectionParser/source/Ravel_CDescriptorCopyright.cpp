@@ -42,7 +42,7 @@ void RavelCCopyrightDescriptor::Release() {
 
 int RavelCCopyrightDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iCopyrightId = RavelCReadWindow::Read32(raw + 2);
   // Counted in 8 bits: a length of 0 takes 255 bytes into a 256-byte buffer.
@@ -58,7 +58,7 @@ int RavelCCopyrightDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCCopyrightDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Copyright id: %d \n", static_cast<int>(iCopyrightId));
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Copyright info: %s \n", RavelTraceText(pCopyrightInfo));
 }

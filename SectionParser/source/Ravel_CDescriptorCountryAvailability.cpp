@@ -41,7 +41,7 @@ void RavelCCountryAvailabilityDescriptor::Release() {
 
 int RavelCCountryAvailabilityDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iCountryAvailabilityFlag = static_cast<unsigned char>(RavelCReadWindow::Read8(raw + 2) >> 7);  // x.......
   // Steps of 3 while the code starts inside the body (and the section); a code
@@ -56,7 +56,7 @@ int RavelCCountryAvailabilityDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCCountryAvailabilityDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Ability flag = %d\n", iCountryAvailabilityFlag);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Codes: \n");
   for (int i = 0; i < aCountryCodes.iCount; ++i) {

@@ -22,7 +22,7 @@ RavelCDataComponentDescriptor& RavelCDataComponentDescriptor::operator=(RavelCDa
 RavelCDataComponentDescriptor::~RavelCDataComponentDescriptor() {}
 
 int RavelCDataComponentDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     iDataComponentId = 0;
     return result;
@@ -32,6 +32,6 @@ int RavelCDataComponentDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCDataComponentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiDataComponentId=[0x%04x]\n", iDataComponentId);
 }

@@ -37,7 +37,7 @@ void RavelCExtendedBroadcasterDescriptor::Release() {
 
 int RavelCExtendedBroadcasterDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   // A refused descriptor keeps the type and the broadcaster id it had.
   if (result != kRavelOk) return result;
   // A descriptor of another broadcaster type keeps nothing of an earlier one.
@@ -63,7 +63,7 @@ int RavelCExtendedBroadcasterDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCExtendedBroadcasterDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiBroadcasterType=[0x%x], Affiliation ID Nums=[%d], Broadcaster ID Nums=[%d]\n",
               iBroadcasterType, iNumberOfAffiliationIds, iNumberOfBroadcasterIds);
   for (int i = 0; i < iNumberOfAffiliationIds && i < kMaxIds; ++i) {

@@ -71,7 +71,7 @@ void RavelCExtendedEventDescriptor::Release() {
 
 int RavelCExtendedEventDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   const unsigned char numbers = RavelCReadWindow::Read8(raw + 2);
   iDescriptorNumber = static_cast<unsigned char>(numbers >> 4);        // xxxx....
@@ -101,7 +101,7 @@ int RavelCExtendedEventDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCExtendedEventDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tDescriptorNumber=[%d]\n", iDescriptorNumber);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLastDescriptorNumber=[%d]\n", iLastDescriptorNumber);
   for (int i = 0; i < aItems.iCount; ++i) {

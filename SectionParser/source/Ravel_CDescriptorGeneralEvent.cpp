@@ -67,7 +67,7 @@ RavelCGeneralEventDescriptor::~RavelCGeneralEventDescriptor() { RavelText_FreeCT
 
 int RavelCGeneralEventDescriptor::ParseRawData(unsigned char* raw) {
   // A refused descriptor keeps everything of its earlier parse, private data included.
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_FreeCText(pPrivateData);
 
@@ -108,7 +108,7 @@ int RavelCGeneralEventDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCGeneralEventDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t EventMsgGroupID=[%d], TimeMode=[%d]\n", iEventMsgGroupId, iTimeMode);
   switch (iTimeMode) {
     case 1:

@@ -47,7 +47,7 @@ void RavelCGingaAppDataComponentDescriptor::Release() {
 
 int RavelCGingaAppDataComponentDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iDataComponentId = RavelCReadWindow::Read16(raw + 2);
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "ComponentId [0x%04x]\n", iDataComponentId);

@@ -36,7 +36,7 @@ void RavelCGingaAppLocDescriptor::Clear() {
 
 int RavelCGingaAppLocDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   // Every count is 8 bits wide, so no text exceeds its 255-byte field.
   const unsigned char* position = raw + 2;
@@ -55,7 +55,7 @@ int RavelCGingaAppLocDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCGingaAppLocDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask, "\t  sBaseDirectory = %s, sClassPath = %s, sInicialClassName = %s \n",
               RavelFixedText_Print(sBaseDirectory).Get(), RavelFixedText_Print(sClassPath).Get(),
               RavelFixedText_Print(sInicialClassName).Get());

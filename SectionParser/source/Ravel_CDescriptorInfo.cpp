@@ -53,7 +53,7 @@ int RavelCInfoDescriptor::ParseRawData(unsigned char* raw) {
   // The text of an earlier parse is released here too, so parsing again never leaks it.
   ReleaseText();
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetLanguageCode(szLanguageCode, raw + 2);
   // descriptor_length - 3 text bytes and two 0 bytes (descriptor_length - 1 in all).
@@ -67,6 +67,6 @@ int RavelCInfoDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCInfoDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiISO639LangCode=[%s], ipTextChar=[%s]\n", szLanguageCode, RavelTraceText(pText));
 }

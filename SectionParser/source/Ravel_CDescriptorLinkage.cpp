@@ -23,7 +23,7 @@ RavelCLinkageDescriptor& RavelCLinkageDescriptor::operator=(RavelCLinkageDescrip
 RavelCLinkageDescriptor::~RavelCLinkageDescriptor() {}
 
 int RavelCLinkageDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     iTransportStreamId = 0;
     iOriginalNetworkId = 0;
@@ -39,7 +39,7 @@ int RavelCLinkageDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCLinkageDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP,
               "\tTransportStreamId=[0x%04x], OrginalNetworkId=[0x%04x], ServiceId=[0x%04x], LinkageType=[0x%02x]\n",
               iTransportStreamId, iOriginalNetworkId, iServiceId, iLinkageType);

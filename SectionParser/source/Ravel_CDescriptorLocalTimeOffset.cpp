@@ -94,7 +94,7 @@ RavelCLocalTimeOffsetDescriptor::~RavelCLocalTimeOffsetDescriptor() { RavelRecor
 
 int RavelCLocalTimeOffsetDescriptor::ParseRawData(unsigned char* raw) {
   RavelRecordList_DeleteAll(aLocalTimeOffsets);
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   if (iDescriptorLength == 0) return kRavelOk;
   // Steps of 13 while the entry starts inside the body (and the section); a
@@ -130,7 +130,7 @@ RavelCLocalTimeOffset* RavelCLocalTimeOffsetDescriptor::GetLocalTimeOffset(const
 }
 
 void RavelCLocalTimeOffsetDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < aLocalTimeOffsets.iCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t##################### LocalTimeOffset [%d] #####################\n", i);
     aLocalTimeOffsets.ipArray[i]->Show();

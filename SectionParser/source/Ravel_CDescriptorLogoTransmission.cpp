@@ -89,7 +89,7 @@ int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
 
 int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   // A refused descriptor keeps the type, ids and version it had.
   if (result != kRavelOk) return result;
   // A descriptor of another transmission type keeps nothing of an earlier one.
@@ -116,7 +116,7 @@ int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCLogoTransmissionDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogoTransmission Type=[0x%02x]\n", iLogoTransmissionType);
   if (iLogoTransmissionType == 3) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogo Char String=[%s]\n", RavelTraceText(pLogoCharacters));

@@ -28,7 +28,7 @@ RavelCModuleLinkDescriptor::~RavelCModuleLinkDescriptor() {}
 int RavelCModuleLinkDescriptor::ParseRawData(unsigned char* raw) {
   iPosition = 0;
   iModuleId = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iPosition = RavelCReadWindow::Read8(raw + 2);
   iModuleId = RavelCReadWindow::Read16(raw + 3);
@@ -36,7 +36,7 @@ int RavelCModuleLinkDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCModuleLinkDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   // The module id is a number: printed in decimal under its usual label.
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiPosition=[%d], iModuleId=[%d]\n", iPosition, iModuleId);
 }

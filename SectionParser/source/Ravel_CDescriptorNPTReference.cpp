@@ -49,7 +49,7 @@ RavelCNPTReferenceDescriptor::~RavelCNPTReferenceDescriptor() {}
 
 int RavelCNPTReferenceDescriptor::ParseRawData(unsigned char* raw) {
   // Nothing owned to release; a refused descriptor keeps the fields it had.
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   const unsigned char flags = RavelCReadWindow::Read8(raw + 2);
   iPostDiscontinuityIndicator = flags >> 7;  // 1xxxxxxx
@@ -62,7 +62,7 @@ int RavelCNPTReferenceDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCNPTReferenceDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Post Discontinuity Indicator=[%d], Dsm_ContentID=[%d]\n",
               iPostDiscontinuityIndicator, iContentId);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t STC_Reference=[0x%02x 0x%02x 0x%02x 0x%02x 0x%02x]\n", aSTCReference[0],

@@ -77,7 +77,7 @@ RavelCParentalRatingDescriptor::~RavelCParentalRatingDescriptor() { RavelRecordL
 
 int RavelCParentalRatingDescriptor::ParseRawData(unsigned char* raw) {
   RavelRecordList_DeleteAll(aParentalRatings);
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   if (iDescriptorLength == 0) return kRavelOk;
   // Steps of 4 while the entry starts inside the body (and the section); a
@@ -92,7 +92,7 @@ int RavelCParentalRatingDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCParentalRatingDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < aParentalRatings.iCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t##################### ParentalRating [%d] #####################\n", i);
     aParentalRatings.ipArray[i]->Show();

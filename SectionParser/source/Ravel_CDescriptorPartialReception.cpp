@@ -33,7 +33,7 @@ RavelCPartialReceptionDescriptor::~RavelCPartialReceptionDescriptor() {}
 
 int RavelCPartialReceptionDescriptor::ParseRawData(unsigned char* raw) {
   aServiceIds.iCount = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   // Each 16-bit service_id is stored as its first byte only; the receivers that
   // use this list match on that byte, so it is kept so.
@@ -50,7 +50,7 @@ unsigned short RavelCPartialReceptionDescriptor::GetServiceId(int index) {
 }
 
 void RavelCPartialReceptionDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < aServiceIds.iCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Id [%d] = %d\n", i, aServiceIds.ipArray[i]);
   }

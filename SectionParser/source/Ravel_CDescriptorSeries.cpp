@@ -67,7 +67,7 @@ void RavelCSeriesDescriptor::Release() {
 
 int RavelCSeriesDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iSeriesId = RavelCReadWindow::Read16(raw + 2);
   const unsigned char flags = RavelCReadWindow::Read8(raw + 4);
@@ -83,7 +83,7 @@ int RavelCSeriesDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCSeriesDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tSeriesId=[%d]\n", iSeriesId);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tRepeatLabel=[%d]\n", iRepeatLabel);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tProgramPattern=[%d]\n", iProgramPattern);

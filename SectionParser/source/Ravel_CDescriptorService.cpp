@@ -41,7 +41,7 @@ void RavelCServiceDescriptor::Release() {
 
 int RavelCServiceDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iServiceType = RavelCReadWindow::Read8(raw + 2);
   const unsigned char* at = raw + 3;
@@ -54,7 +54,7 @@ int RavelCServiceDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCServiceDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Type=[0x%02x]\n", iServiceType);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Provider Name=[%s]\n", RavelTraceText(pServiceProviderName));
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Name=[%s]\n", RavelTraceText(pServiceName));

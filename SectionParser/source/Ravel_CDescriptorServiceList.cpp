@@ -50,7 +50,7 @@ void RavelCServiceListDescriptor::Release() {
 
 int RavelCServiceListDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   if (iDescriptorLength <= 2) {
     // Not even one 3-byte entry: an empty list is still a valid descriptor.
@@ -81,7 +81,7 @@ int RavelCServiceListDescriptor::GetServiceInfo(int index, unsigned short& servi
 }
 
 void RavelCServiceListDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService List Length=[%d]\n", iServiceCount);
   for (int i = 0; i < iServiceCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t\t[%d]th Service Info: Service ID=[0x%04x], Service Type=[0x%02x]\n", i,

@@ -44,7 +44,7 @@ void RavelCShortEventDescriptor::Release() {
 
 int RavelCShortEventDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetLanguageCode(szLanguageCode, raw + 2);
   const unsigned char* p = raw + 5;
@@ -57,7 +57,7 @@ int RavelCShortEventDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCShortEventDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLanguageCode=[%s]\n", szLanguageCode);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tEventName=[%s]\n", RavelTraceText(pEventName));
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tEventDescription=[%s]\n", RavelTraceText(pEventDescription));

@@ -21,7 +21,7 @@ RavelCStreamIdentifierDescriptor& RavelCStreamIdentifierDescriptor::operator=(Ra
 RavelCStreamIdentifierDescriptor::~RavelCStreamIdentifierDescriptor() {}
 
 int RavelCStreamIdentifierDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     iComponentTag = 0;
     return result;
@@ -31,6 +31,6 @@ int RavelCStreamIdentifierDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCStreamIdentifierDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tComponent Tag = [0x%02x]\n", iComponentTag);
 }

@@ -23,7 +23,7 @@ RavelCSystemManagementDescriptor& RavelCSystemManagementDescriptor::operator=(Ra
 RavelCSystemManagementDescriptor::~RavelCSystemManagementDescriptor() {}
 
 int RavelCSystemManagementDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   // The flag is read from the two lowest bits, overlapping the identifier; the
   // receivers compare against these values, so the reading stays as it is.
@@ -35,7 +35,7 @@ int RavelCSystemManagementDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCSystemManagementDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tBroadcasting Flag=[0x%02x], Broadcasting Id=[0x%02x], Additional Ids=[0x%02x]\n",
               iBroadcastingFlag, iBroadcastingIdentifier, iAdditionalBroadcastingIdentification);
 }

@@ -28,7 +28,7 @@ void RavelCTSInformationDescriptor::ClearTxTypes() {
 
 int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
   sTsName = "";
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (raw == 0) {
     iRemoteControlKeyId = 0;
     iTransmissionTypeCount = 0;
@@ -52,7 +52,7 @@ int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCTSInformationDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tRemote Control Key Id=[0x%02x], Ts Name=[%s], Tx Type Count=[%d]\n",
               iRemoteControlKeyId, sTsName.GetString(), iTransmissionTypeCount);
   for (int i = 0; i < iTransmissionTypeCount && i < kTxTypeSlots; ++i) cTxTypes[i].Show();

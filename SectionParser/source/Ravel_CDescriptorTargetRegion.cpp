@@ -41,7 +41,7 @@ void RavelCTargetRegionDescriptor::Release() {
 
 int RavelCTargetRegionDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iRegionSpecType = RavelCReadWindow::Read8(raw + 2);
   // Counted in 8 bits: a length of 0 takes 255 bytes into a 256-byte buffer.
@@ -56,7 +56,7 @@ int RavelCTargetRegionDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCTargetRegionDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Region Spec Type: %d \n", iRegionSpecType);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Region Spec: %s \n", RavelTraceText(pRegionSpec));
 }

@@ -54,7 +54,7 @@ void RavelCTerrDeliverySystemDescriptor::Release() {
 
 int RavelCTerrDeliverySystemDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iAreaCode = RavelCReadWindow::Read16(raw + 2) >> 4;  // xxxxxxxx xxxx----
   const unsigned char mode = RavelCReadWindow::Read8(raw + 3);
@@ -98,7 +98,7 @@ int RavelCTerrDeliverySystemDescriptor::GetRegionId() const {
 }
 
 void RavelCTerrDeliverySystemDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tArea Code=[0x%04x], Guard Interval=[0x%02x], Tx Mode=[0x%02x], Num Of Freq=[%d]\n",
               iAreaCode, iGuardInterval, iTransmissionMode, iFrequencyCount);
   for (int i = 0; i < iFrequencyCount; ++i) {
