@@ -67,8 +67,6 @@ bool InputFile::Peek(std::size_t size, std::vector<uint8_t>& head, std::string& 
 }
 
 long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error) {
-  // A stop request is the end of the input: what was read before it is used.
-  if (StopRequested()) return 0;
   std::size_t held = std::min(size, peeked_.size() - peekedPos_);
   if (held > 0) {
     std::memcpy(buffer, peeked_.data() + peekedPos_, held);
@@ -80,6 +78,8 @@ long long InputFile::Read(uint8_t* buffer, std::size_t size, std::string& error)
   }
   // A stream hands out what has arrived: the peeked bytes are enough for now.
   if (held > 0 && size_ < 0) return static_cast<long long>(held);
+  // A stop request is the end of the input: what was read before it is used.
+  if (StopRequested()) return static_cast<long long>(held);
   long long n = ReadFromFile(buffer + held, size - held, error);
   return n < 0 ? n : static_cast<long long>(held) + n;
 }
