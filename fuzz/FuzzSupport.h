@@ -9,7 +9,9 @@
 #include <cstdint>
 #include <vector>
 
+#include "Ravel_CDsmccMsgBase.h"
 #include "Ravel_CSafeSection.h"
+#include "Ravel_CTableBase.h"
 #include "Ravel_PGL.h"
 #include "Ravel_Util.h"
 
