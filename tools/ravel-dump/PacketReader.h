@@ -51,6 +51,8 @@ class PacketReader {
   bool Fill(std::size_t need);
   bool Resync();
   bool Fail(const std::string& error);
+  // The input has ended: an error when it ends inside a packet.
+  void NoteTruncation();
 
   InputFile& input_;
   std::vector<uint8_t> buffer_;

@@ -130,17 +130,40 @@ TableRegistry::Place TableRegistry::Locate(int pid, const uint8_t* section,
   return place;
 }
 
+void TableRegistry::Count(TableEntry& table, StoredSection& stored) {
+  ++arrivals_;
+  table.lastSeen = arrivals_;
+  ++stored.seen;
+}
+
 bool TableRegistry::CountRepeat(int pid, const uint8_t* section, std::size_t size) {
+  // A section is at most 4096 bytes and a PID (kNoPid included) fits in 14
+  // bits: PID, size and CRC_32 make one key.
+  const bool keyed = RavelCSafeSection::CarriesCrc(section) && size >= 4;
+  const uint64_t key = keyed ? (static_cast<uint64_t>(pid + 1) << 45) | (static_cast<uint64_t>(size) << 32) |
+                                   RavelRead32(section + size - 4)
+                             : 0;
+  if (keyed) {
+    auto known = repeats_.find(key);
+    if (known != repeats_.end()) {
+      StoredSection& stored = *known->second.stored;
+      if (stored.Size() == size && std::memcmp(stored.Bytes(), section, size) == 0) {
+        Count(*known->second.table, stored);
+        return true;
+      }
+    }
+  }
   Place place = Locate(pid, section, size);
   if (!place.same) return false;
-  ++arrivals_;
-  place.table->lastSeen = arrivals_;
-  ++place.table->sections[place.number].seen;
+  StoredSection& stored = place.table->sections[place.number];
+  Count(*place.table, stored);
+  if (keyed) repeats_[key] = Repeat{place.table, &stored};
   return true;
 }
 
 StoredSection& TableRegistry::Add(int pid, TableKind kind, std::unique_ptr<RavelCSafeSection> parsed,
                                   RavelSafeResult result) {
+  if (!repeats_.empty()) repeats_.clear();
   ++arrivals_;
   Place place = Locate(pid, parsed->GetData(), static_cast<std::size_t>(parsed->GetDataSize()));
   TableEntry* table = place.table;

@@ -94,6 +94,16 @@ class TableRegistry {
   };
   std::unordered_map<Key, std::size_t, KeyHash> latest_;
   uint64_t arrivals_ = 0;
+
+  // Where a repeat was counted, by PID, size and CRC_32: the same bytes again
+  // find the same place with one look-up, until a section is added (which may
+  // start a new table for them).
+  struct Repeat {
+    TableEntry* table;
+    StoredSection* stored;
+  };
+  std::unordered_map<uint64_t, Repeat> repeats_;
+  void Count(TableEntry& table, StoredSection& stored);
 };
 
 // 64-bit FNV-1a of a byte run: the identity of a section's contents.
