@@ -48,9 +48,12 @@ TEST(TraceLocation, IsTheCallSiteOfTheTraceEvenThroughASharedHelper) {
       {.label = "a class's own trace",
        .trigger =
            [] {
-             Bytes header = sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1), sb::U8(0xFF), sb::U8(0),
-                                     sb::U16(0)});
-             RavelCDsmccBase message(header.data());
+             // The message lies 8 bytes into its carousel section, as a receiver hands it.
+             sb::SectionOptions options;
+             options.tableId = 0x3B;
+             Bytes section = sb::LongSection(options, sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1),
+                                                                sb::U8(0xFF), sb::U8(0), sb::U16(0)}));
+             RavelCDsmccBase message(section.data() + 8);
            },
        .text = "Unknown DSMCC Type!",
        .file = "SectionParser/source/Ravel_CDsmccMsgBase",
