@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "BroadcastText.h"
@@ -154,6 +155,53 @@ struct ObjectCarouselSummary {
   std::vector<std::string> problems;
 };
 
+// A service of any transport stream, from the latest SDT (actual or other)
+// that describes it. The original network id is the one the section carries;
+// the library's reading is kept beside it where it differs.
+struct SdtService {
+  int originalNetworkId = 0;
+  int libraryOriginalNetworkId = 0;
+  int transportStreamId = 0;
+  bool actual = false;
+  int id = 0;
+  int type = -1;
+  std::string name;
+  std::string provider;
+};
+
+// One event of the programme guide (see Epg.h).
+struct EpgRating {
+  std::string country;
+  int raw = 0;        // the rating byte as broadcast
+  std::string label;  // as the country's standard defines it: "L", "14", "min 12", or "" (unknown)
+};
+
+struct EpgGenre {
+  int level1 = 0, level2 = 0;  // content nibbles
+  std::string name;            // of level 1, in the standard's genre table
+};
+
+struct EpgEvent {
+  int tableId = 0;
+  int originalNetworkId = 0, transportStreamId = 0, serviceId = 0;
+  int eventId = 0;
+  DateTime start;
+  Duration duration;
+  int runningStatus = 0;
+  bool freeCaMode = false;
+  std::string language;  // of the short event
+  std::string name, text;
+  // Every extended event descriptor joined in descriptor_number order: the
+  // items (an item without a description goes on the one before) and the text.
+  std::vector<std::pair<std::string, std::string>> items;
+  std::string extendedText;
+  std::vector<EpgRating> ratings;
+  std::vector<EpgGenre> genres;
+
+  bool Actual() const { return tableId == 0x4E || (tableId >= 0x50 && tableId <= 0x5F); }
+  bool Schedule() const { return tableId >= 0x50; }
+};
+
 struct Summary {
   std::string standard;        // "brazil" or "japan"
   std::string standardReason;  // why: detected signs, or --standard
@@ -166,10 +214,15 @@ struct Summary {
   std::vector<ApplicationSummary> applications;
   std::vector<CarouselSummary> carousels;
   std::vector<ObjectCarouselSummary> objectCarousels;
+  std::vector<SdtService> allServices;
+  std::vector<EpgEvent> epg;
 };
 
 void PrintSummaryText(const Summary& summary, std::FILE* out);
 std::string SummaryJson(const Summary& summary);
+// The programme guide per service and day (--epg).
+void PrintEpgText(const Summary& summary, std::FILE* out);
+std::size_t EpgServiceCount(const std::vector<EpgEvent>& events);
 
 // Names of codes, for the text summary.
 const char* ServiceTypeName(int type);

@@ -1,6 +1,8 @@
 // The summary, from the latest version of each table read, through the
 // objects the library made of its sections when they arrived.
 #include <cstring>
+#include <map>
+#include <tuple>
 
 #include "Output.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
@@ -22,6 +24,7 @@
 #include "Ravel_CTableSDT.h"
 #include "Ravel_CTableTDT.h"
 #include "Ravel_CTableTOT.h"
+#include "Epg.h"
 #include "StandardDetection.h"
 
 namespace ravel_dump {
@@ -169,6 +172,41 @@ void AddSdt(const TableRegistry& registry, Summary& summary) {
       }
     }
   });
+}
+
+// The services of every transport stream: the latest version of each SDT,
+// actual and other, by its stream and network.
+void AddAllServices(const TableRegistry& registry, Summary& summary) {
+  std::map<std::tuple<int, int, int>, const TableEntry*> latest;
+  for (const auto& entry : registry.Tables()) {
+    if (entry->kind != kRavelKindSDT || entry->sections.empty()) continue;
+    const StoredSection& first = entry->sections.begin()->second;
+    if (first.Size() < 10) continue;
+    const TableEntry*& kept =
+        latest[std::make_tuple((first.Bytes()[8] << 8) | first.Bytes()[9], entry->extension, entry->tableId)];
+    if (kept == nullptr || entry->lastSeen > kept->lastSeen) kept = entry.get();
+  }
+  for (const auto& kv : latest) {
+    for (const auto& section : kv.second->sections) {
+      if (!section.second.Parsed()) continue;
+      RavelCSDT& sdt = Held<RavelCSDT>(section.second);
+      for (int i = 0; i < sdt.aServiceList.iCount; ++i) {
+        const RavelCServiceDescription* description = sdt.aServiceList.ipArray[i];
+        SdtService service;
+        service.originalNetworkId = std::get<0>(kv.first);
+        service.libraryOriginalNetworkId = sdt.GetOriginalNetworkId();
+        service.transportStreamId = std::get<1>(kv.first);
+        service.actual = !RavelCSafeSection::DescribesOtherStream(std::get<2>(kv.first));
+        service.id = description->iServiceId;
+        if (description->pService != nullptr) {
+          service.type = description->pService->iServiceType;
+          service.name = Text(description->pService->pServiceName);
+          service.provider = Text(description->pService->pServiceProviderName);
+        }
+        summary.allServices.push_back(service);
+      }
+    }
+  }
 }
 
 // The NIT of this network: its name and transport streams.
@@ -336,6 +374,8 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddEvents(registry, summary);
   AddTime(registry, summary);
   AddApplications(registry, summary);
+  AddAllServices(registry, summary);
+  summary.epg = BuildEpg(registry, RavelCfg_GetStandard() != RAVEL_STANDARD_JAPAN);
   summary.carousels = carousel.Summarize();
   return summary;
 }

@@ -4,6 +4,8 @@
 #include "ByteText.h"
 #include "Summary.h"
 #include "TimeBase.h"
+#include "Epg.h"
+#include "Xmltv.h"
 
 namespace ravel_dump {
 namespace {
@@ -166,6 +168,19 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     }
   }
 
+  std::fprintf(out, "Services of every transport stream (%zu, from the SDT actual and other):\n", s.allServices.size());
+  for (const SdtService& service : s.allServices) {
+    std::string line = Format("  network 0x%04x TS 0x%04x service 0x%04x%s", service.originalNetworkId,
+                              service.transportStreamId, service.id, service.actual ? " (this stream)" : "");
+    if (service.originalNetworkId != service.libraryOriginalNetworkId) {
+      line += Format(" [library reads network 0x%04x]", service.libraryOriginalNetworkId);
+    }
+    if (service.type >= 0) line += Format(" %s (0x%02x)", ServiceTypeName(service.type), service.type);
+    if (!service.name.empty()) line += " " + Quoted(service.name, s.textCoding);
+    std::fprintf(out, "%s\n", line.c_str());
+  }
+  std::fprintf(out, "Programme guide: %zu events of %zu services (shown by --epg)\n", s.epg.size(), EpgServiceCount(s.epg));
+
   if (s.time.valid) {
     std::fprintf(out, "Time: %s (%s)\n", When(s.time.time).c_str(), s.time.source.c_str());
     for (const LocalOffset& o : s.time.offsets) {
@@ -226,6 +241,58 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
       std::fprintf(out, "%s\n", line.c_str());
     }
     for (const std::string& problem : c.problems) std::fprintf(out, "  problem: %s\n", problem.c_str());
+  }
+}
+
+std::size_t EpgServiceCount(const std::vector<EpgEvent>& events) {
+  std::size_t count = 0;
+  for (std::size_t i = 0; i < events.size(); ++i) {
+    const EpgEvent& a = events[i];
+    count += i == 0 || a.originalNetworkId != events[i - 1].originalNetworkId ||
+             a.transportStreamId != events[i - 1].transportStreamId || a.serviceId != events[i - 1].serviceId;
+  }
+  return count;
+}
+
+void PrintEpgText(const Summary& s, std::FILE* out) {
+  std::fprintf(out, "Programme guide: %zu events of %zu services (times in UTC%s)\n", s.epg.size(),
+               EpgServiceCount(s.epg), UtcOffsetText(s.utcOffsetMinutes).c_str());
+  const EpgEvent* previous = nullptr;
+  for (const EpgEvent& e : s.epg) {
+    bool newService = previous == nullptr || previous->originalNetworkId != e.originalNetworkId ||
+                      previous->transportStreamId != e.transportStreamId || previous->serviceId != e.serviceId;
+    if (newService) {
+      std::string name = ServiceNameOf(s, e.originalNetworkId, e.transportStreamId, e.serviceId);
+      std::fprintf(out, "Service 0x%04x%s of TS 0x%04x, network 0x%04x (%s)\n", e.serviceId,
+                   name.empty() ? "" : (" " + Quoted(name, s.textCoding)).c_str(), e.transportStreamId,
+                   e.originalNetworkId, e.Actual() ? "this stream" : "other stream");
+    }
+    if (newService || previous->start.year != e.start.year || previous->start.month != e.start.month ||
+        previous->start.day != e.start.day) {
+      std::fprintf(out, "  %s\n", e.start.valid ? Format("%04d-%02d-%02d", e.start.year, e.start.month, e.start.day).c_str()
+                                                 : "(no start time)");
+    }
+    previous = &e;
+    DateTime end = EventEnd(e);
+    std::string line = e.start.valid ? Format("    %02d:%02d-%02d:%02d", e.start.hour, e.start.minute, end.hour, end.minute)
+                                     : std::string("    --:-----:--");
+    line += " " + (e.name.empty() ? std::string("(no name)") : Quoted(e.name, s.textCoding));
+    line += Format(" (event 0x%04x, table 0x%02x)", e.eventId, e.tableId);
+    for (const EpgGenre& genre : e.genres) {
+      line += Format(" genre 0x%x%x", genre.level1, genre.level2);
+      if (!genre.name.empty()) line += " " + genre.name;
+    }
+    for (const EpgRating& rating : e.ratings) {
+      line += " rating " + EscapeBytes(rating.country) + " " + (rating.label.empty() ? "?" : rating.label) +
+              Format(" (0x%02x)", rating.raw);
+    }
+    std::fprintf(out, "%s\n", line.c_str());
+    if (!e.text.empty()) std::fprintf(out, "      %s\n", OneLineText(e.text, s.textCoding).c_str());
+    for (const auto& item : e.items) {
+      std::fprintf(out, "      %s: %s\n", OneLineText(item.first, s.textCoding).c_str(),
+                   OneLineText(item.second, s.textCoding).c_str());
+    }
+    if (!e.extendedText.empty()) std::fprintf(out, "      %s\n", OneLineText(e.extendedText, s.textCoding).c_str());
   }
 }
 

@@ -21,6 +21,7 @@
 #include "StopSignal.h"
 #include "TimeBase.h"
 #include "TraceOutput.h"
+#include "Xmltv.h"
 
 namespace {
 
@@ -191,6 +192,7 @@ int main(int argc, char** argv) {
   // write them leaves no half output behind.
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
+                     options.mode == OutputMode::kEpg || !options.xmltvFile.empty() ||
                      !options.extractDirectory.empty() || !options.filesDirectory.empty();
   if (wantSummary) {
     summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
@@ -218,6 +220,9 @@ int main(int argc, char** argv) {
       }
     }
   }
+  if (!options.xmltvFile.empty() && !WriteXmltv(options.xmltvFile, summary, error)) {
+    return Fail(error);
+  }
   switch (options.mode) {
     case OutputMode::kDump:
       DumpTables(capture.Registry(), options.tables, trace, stdout);
@@ -227,6 +232,9 @@ int main(int argc, char** argv) {
       break;
     case OutputMode::kJson:
       std::fputs(SummaryJson(summary).c_str(), stdout);
+      break;
+    case OutputMode::kEpg:
+      PrintEpgText(summary, stdout);
       break;
     case OutputMode::kNone:
       for (const CarouselSummary& carousel : summary.carousels) {
