@@ -169,6 +169,31 @@ struct SdtService {
   std::string provider;
 };
 
+// A table the library has no class for, by the name its table_id has.
+struct UnclassedTableSummary {
+  std::string name;  // "" for a table_id no standard assigns
+  int tableId = 0;
+  int pid = -1;
+  int extension = 0;
+  int version = 0;
+  std::size_t sections = 0;
+  std::size_t bytes = 0;  // of its distinct sections
+  uint64_t timesSeen = 0;
+};
+
+// The final report's figures, for the JSON.
+struct KindFigures {
+  std::string kind;
+  uint64_t sections = 0, distinct = 0, tables = 0, crcFailures = 0, malformed = 0, parseFailures = 0;
+};
+struct ReportFigures {
+  bool rawSections = false;
+  uint64_t bytes = 0, packets = 0, skippedBytes = 0, resyncs = 0;
+  uint64_t sectionsAssembled = 0, crcFailures = 0, lengthMismatches = 0, malformed = 0, panics = 0, sectionsCut = 0;
+  std::vector<KindFigures> kinds;
+  std::vector<std::string> problems;
+};
+
 // One event of the programme guide (see Epg.h).
 struct EpgRating {
   std::string country;
@@ -215,10 +240,15 @@ struct Summary {
   std::vector<CarouselSummary> carousels;
   std::vector<ObjectCarouselSummary> objectCarousels;
   std::vector<SdtService> allServices;
+  std::vector<UnclassedTableSummary> tablesWithoutClass;
+  ReportFigures report;
   std::vector<EpgEvent> epg;
 };
 
 void PrintSummaryText(const Summary& summary, std::FILE* out);
+// The JSON's layout is described by ravel-dump.schema.json; its version
+// changes with every change of that layout.
+const int kSummarySchemaVersion = 1;
 std::string SummaryJson(const Summary& summary);
 // The programme guide per service and day (--epg).
 void PrintEpgText(const Summary& summary, std::FILE* out);

@@ -26,6 +26,7 @@
 #include "Ravel_CTableTOT.h"
 #include "Epg.h"
 #include "StandardDetection.h"
+#include "TableNames.h"
 
 namespace ravel_dump {
 namespace {
@@ -361,7 +362,56 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
   }
 }
 
+// Tables the library has no class for, by name, with their size and counts.
+void AddTablesWithoutClass(const TableRegistry& registry, Summary& summary) {
+  for (const auto& entry : registry.Tables()) {
+    if (!WithoutClass(*entry)) continue;
+    UnclassedTableSummary table;
+    table.name = TableIdName(entry->tableId);
+    table.tableId = entry->tableId;
+    table.pid = entry->pid;
+    table.extension = entry->extension;
+    table.version = entry->version;
+    table.sections = entry->sections.size();
+    for (const auto& kv : entry->sections) table.bytes += kv.second.Size();
+    table.timesSeen = entry->TimesSeen();
+    summary.tablesWithoutClass.push_back(table);
+  }
+}
+
 }  // namespace
+
+ReportFigures FiguresOf(const InputSummary& input, const Stats& stats, const TableRegistry& registry) {
+  ReportFigures figures;
+  figures.rawSections = input.sections;
+  figures.bytes = input.bytes;
+  figures.packets = input.packets;
+  figures.skippedBytes = input.skippedBytes;
+  figures.resyncs = input.resyncs;
+  figures.sectionsAssembled = stats.sectionsAssembled;
+  figures.crcFailures = stats.crcFailures;
+  figures.lengthMismatches = stats.lengthMismatches;
+  figures.malformed = stats.malformed;
+  figures.panics = stats.panics;
+  figures.sectionsCut = stats.sectionsCut;
+  uint64_t tables[kRavelKindCount] = {};
+  for (const auto& table : registry.Tables()) ++tables[table->kind];
+  for (int k = 0; k < kRavelKindCount; ++k) {
+    const KindStats& s = stats.kinds[k];
+    if (s.sections == 0 && s.crcFailures == 0 && s.malformed == 0 && tables[k] == 0) continue;
+    KindFigures kind;
+    kind.kind = RavelCSafeSection::GetKindName(static_cast<TableKind>(k));
+    kind.sections = s.sections;
+    kind.distinct = s.distinct;
+    kind.tables = tables[k];
+    kind.crcFailures = s.crcFailures;
+    kind.malformed = s.malformed;
+    kind.parseFailures = s.parseFailures;
+    figures.kinds.push_back(kind);
+  }
+  figures.problems = stats.problems;
+  return figures;
+}
 
 Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace) {
   TraceOutput::QuietScope quiet(trace);
@@ -375,6 +425,7 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddTime(registry, summary);
   AddApplications(registry, summary);
   AddAllServices(registry, summary);
+  AddTablesWithoutClass(registry, summary);
   summary.epg = BuildEpg(registry, RavelCfg_GetStandard() != RAVEL_STANDARD_JAPAN);
   summary.carousels = carousel.Summarize();
   return summary;

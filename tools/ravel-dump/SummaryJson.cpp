@@ -6,6 +6,7 @@
 #include <nlohmann/json.hpp>
 
 #include "ByteText.h"
+#include "Epg.h"
 #include "Summary.h"
 #include "TimeBase.h"
 
@@ -40,6 +41,65 @@ json Event(const EventSummary& e, const Summary& s) {
               {"name", Text(e.name, s.textCoding)},
               {"text", Text(e.text, s.textCoding)},
               {"ratings", ratings}};
+}
+
+json OrNull(const std::string& text) { return text.empty() ? json(nullptr) : json(text); }
+
+json EpgEventJson(const EpgEvent& e, const Summary& s) {
+  json items = json::array();
+  for (const auto& item : e.items)
+    items.push_back({{"description", Text(item.first, s.textCoding)}, {"item", Text(item.second, s.textCoding)}});
+  json ratings = json::array();
+  for (const EpgRating& r : e.ratings)
+    ratings.push_back({{"country", Bytes(r.country)}, {"raw", r.raw}, {"label", OrNull(r.label)}});
+  json genres = json::array();
+  for (const EpgGenre& g : e.genres)
+    genres.push_back({{"level1", g.level1}, {"level2", g.level2}, {"name", OrNull(g.name)}});
+  return json{{"table_id", e.tableId},
+              {"original_network_id", e.originalNetworkId},
+              {"transport_stream_id", e.transportStreamId},
+              {"service_id", e.serviceId},
+              {"actual", e.Actual()},
+              {"schedule", e.Schedule()},
+              {"event_id", e.eventId},
+              {"start", OrNull(Iso8601(e.start, s.utcOffsetMinutes))},
+              {"stop", OrNull(Iso8601(EventEnd(e), s.utcOffsetMinutes))},
+              {"duration_seconds", e.duration.hours * 3600 + e.duration.minutes * 60 + e.duration.seconds},
+              {"running_status", e.runningStatus},
+              {"free_ca_mode", e.freeCaMode},
+              {"language", Bytes(e.language)},
+              {"name", Text(e.name, s.textCoding)},
+              {"text", Text(e.text, s.textCoding)},
+              {"items", items},
+              {"extended_text", Text(e.extendedText, s.textCoding)},
+              {"ratings", ratings},
+              {"genres", genres}};
+}
+
+json ReportJson(const ReportFigures& r) {
+  json kinds = json::array();
+  for (const KindFigures& k : r.kinds) {
+    kinds.push_back({{"kind", k.kind},
+                     {"sections", k.sections},
+                     {"distinct", k.distinct},
+                     {"tables", k.tables},
+                     {"crc_failures", k.crcFailures},
+                     {"malformed", k.malformed},
+                     {"parse_failures", k.parseFailures}});
+  }
+  return json{{"input", r.rawSections ? "sections" : "transport stream"},
+              {"bytes", r.bytes},
+              {"packets", r.packets},
+              {"skipped_bytes", r.skippedBytes},
+              {"resyncs", r.resyncs},
+              {"sections_assembled", r.sectionsAssembled},
+              {"crc_failures", r.crcFailures},
+              {"length_mismatches", r.lengthMismatches},
+              {"malformed", r.malformed},
+              {"library_panics", r.panics},
+              {"sections_cut", r.sectionsCut},
+              {"kinds", kinds},
+              {"problems", r.problems}};
 }
 
 }  // namespace
@@ -152,7 +212,37 @@ std::string SummaryJson(const Summary& s) {
     objectCarousels.push_back({{"pid", Pid(c.pid)}, {"entries", entries}, {"problems", c.problems}});
   }
 
-  json document = {{"standard", s.standard},
+  json allServices = json::array();
+  for (const SdtService& service : s.allServices) {
+    allServices.push_back({{"original_network_id", service.originalNetworkId},
+                           {"library_original_network_id", service.libraryOriginalNetworkId == service.originalNetworkId
+                                                                ? json(nullptr)
+                                                                : json(service.libraryOriginalNetworkId)},
+                           {"transport_stream_id", service.transportStreamId},
+                           {"actual", service.actual},
+                           {"id", service.id},
+                           {"type", service.type < 0 ? json(nullptr) : json(service.type)},
+                           {"name", Text(service.name, s.textCoding)},
+                           {"provider", Text(service.provider, s.textCoding)}});
+  }
+
+  json epg = json::array();
+  for (const EpgEvent& e : s.epg) epg.push_back(EpgEventJson(e, s));
+
+  json unclassed = json::array();
+  for (const UnclassedTableSummary& t : s.tablesWithoutClass) {
+    unclassed.push_back({{"name", OrNull(t.name)},
+                         {"table_id", t.tableId},
+                         {"pid", Pid(t.pid)},
+                         {"id", t.extension},
+                         {"version", t.version},
+                         {"sections", t.sections},
+                         {"bytes", t.bytes},
+                         {"times_seen", t.timesSeen}});
+  }
+
+  json document = {{"schema_version", kSummarySchemaVersion},
+                   {"standard", s.standard},
                    {"standard_reason", s.standardReason},
                    {"time_base", UtcOffsetText(s.utcOffsetMinutes)},
                    {"transport_stream_id", s.transportStreamId < 0 ? json(nullptr) : json(s.transportStreamId)},
@@ -161,7 +251,11 @@ std::string SummaryJson(const Summary& s) {
                    {"time", time},
                    {"applications", applications},
                    {"carousels", carousels},
-                   {"object_carousels", objectCarousels}};
+                   {"object_carousels", objectCarousels},
+                   {"all_services", allServices},
+                   {"epg", epg},
+                   {"tables_without_class", unclassed},
+                   {"report", ReportJson(s.report)}};
   return document.dump(2) + "\n";
 }
 

@@ -180,6 +180,13 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     std::fprintf(out, "%s\n", line.c_str());
   }
   std::fprintf(out, "Programme guide: %zu events of %zu services (shown by --epg)\n", s.epg.size(), EpgServiceCount(s.epg));
+  std::fprintf(out, "Tables without a class in the library (%zu):\n", s.tablesWithoutClass.size());
+  for (const UnclassedTableSummary& t : s.tablesWithoutClass) {
+    std::string where = t.pid < 0 ? std::string() : " on PID " + Pid(t.pid);
+    std::fprintf(out, "  %s%s: table_id 0x%02x, id 0x%04x, version %d, %zu sections, %zu bytes, seen %llu times\n",
+                 t.name.empty() ? "other" : t.name.c_str(), where.c_str(), t.tableId, t.extension, t.version, t.sections,
+                 t.bytes, static_cast<unsigned long long>(t.timesSeen));
+  }
 
   if (s.time.valid) {
     std::fprintf(out, "Time: %s (%s)\n", When(s.time.time).c_str(), s.time.source.c_str());

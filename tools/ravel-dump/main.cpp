@@ -220,6 +220,7 @@ int main(int argc, char** argv) {
       }
     }
   }
+  summary.report = FiguresOf(inputSummary, stats, capture.Registry());
   if (!options.xmltvFile.empty() && !WriteXmltv(options.xmltvFile, summary, error)) {
     return Fail(error);
   }
