@@ -73,7 +73,8 @@ struct TransportStreamSummary {
   int guardInterval = -1;
   int transmissionMode = -1;
   std::vector<unsigned int> frequencies;  // in the descriptor's units (1/7 MHz)
-  std::vector<int> partialReception;      // service ids as the library keeps them
+  std::vector<int> partialReception;         // service ids as broadcast
+  std::vector<int> libraryPartialReception;  // as the library keeps them
   std::vector<std::pair<int, int>> serviceList;  // id, type
 };
 

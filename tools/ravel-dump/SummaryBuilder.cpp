@@ -210,6 +210,47 @@ void AddAllServices(const TableRegistry& registry, Summary& summary) {
   }
 }
 
+// Calls `use(tsid, onid, tag, body, length)` for each descriptor of the
+// transport stream loop of a NIT section, read from its bytes; a loop that
+// overruns the section ends the walk.
+template <class Use>
+void EachTsDescriptor(const uint8_t* s, std::size_t size, Use use) {
+  const std::size_t end = size >= 4 ? size - 4 : 0;
+  std::size_t at = 8;
+  if (at + 2 > end) return;
+  at += 2 + (((s[at] & 0x0F) << 8) | s[at + 1]);
+  if (at + 2 > end) return;
+  at += 2;
+  while (at + 6 <= end) {
+    const int tsid = (s[at] << 8) | s[at + 1];
+    const int onid = (s[at + 2] << 8) | s[at + 3];
+    const std::size_t loopEnd = at + 6 + (((s[at + 4] & 0x0F) << 8) | s[at + 5]);
+    if (loopEnd > end) return;
+    for (std::size_t d = at + 6; d + 2 <= loopEnd && d + 2 + s[d + 1] <= loopEnd; d += 2 + s[d + 1]) {
+      use(tsid, onid, s[d], s + d + 2, static_cast<std::size_t>(s[d + 1]));
+    }
+    at = loopEnd;
+  }
+}
+
+// The partial reception descriptor's service ids as broadcast (16 bits each),
+// beside the library's reading.
+void AddPartialReception(const TableEntry& table, NetworkSummary& network) {
+  const uint8_t kPartialReceptionTag = 0xFB;
+  for (const auto& kv : table.sections) {
+    EachTsDescriptor(kv.second.Bytes(), kv.second.Size(),
+                     [&](int tsid, int onid, uint8_t tag, const uint8_t* body, std::size_t length) {
+                       if (tag != kPartialReceptionTag) return;
+                       for (TransportStreamSummary& ts : network.streams) {
+                         if (ts.id != tsid || ts.originalNetworkId != onid || !ts.partialReception.empty()) continue;
+                         for (std::size_t i = 0; i + 2 <= length; i += 2) {
+                           ts.partialReception.push_back((body[i] << 8) | body[i + 1]);
+                         }
+                       }
+                     });
+  }
+}
+
 // The NIT of this network: its name and transport streams.
 void AddNit(const TableRegistry& registry, Summary& summary) {
   const TableEntry* table = Latest(registry, kRavelKindNIT, [](const TableEntry& t) { return !RavelCSafeSection::DescribesOtherStream(t.tableId); });
@@ -237,7 +278,9 @@ void AddNit(const TableRegistry& registry, Summary& summary) {
         }
       }
       if (const RavelCPartialReceptionDescriptor* partial = info->pPartialReception) {
-        for (int s = 0; s < partial->aServiceIds.iCount; ++s) ts.partialReception.push_back(partial->aServiceIds.ipArray[s]);
+        for (int s = 0; s < partial->aServiceIds.iCount; ++s) {
+          ts.libraryPartialReception.push_back(partial->aServiceIds.ipArray[s]);
+        }
       }
       if (const RavelCServiceListDescriptor* list = info->pServiceList) {
         for (int s = 0; s < list->iServiceCount && list->pServiceIds != nullptr; ++s) {
@@ -247,6 +290,7 @@ void AddNit(const TableRegistry& registry, Summary& summary) {
       network.streams.push_back(ts);
     }
   });
+  AddPartialReception(*table, network);
 }
 
 EventSummary MakeEvent(RavelCEventInfo& info) {

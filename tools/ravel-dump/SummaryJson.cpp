@@ -120,6 +120,9 @@ std::string SummaryJson(const Summary& s) {
                          {"transmission_mode", ts.transmissionMode < 0 ? json(nullptr) : json(ts.transmissionMode)},
                          {"frequencies", ts.frequencies},
                          {"partial_reception", ts.partialReception},
+                         {"library_partial_reception", ts.libraryPartialReception == ts.partialReception
+                                                           ? json(nullptr)
+                                                           : json(ts.libraryPartialReception)},
                          {"services", services}});
     }
     network = {{"id", s.network.id}, {"name", Text(s.network.name, s.textCoding)}, {"transport_streams", streams}};

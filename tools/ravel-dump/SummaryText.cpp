@@ -128,9 +128,14 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
       for (unsigned int f : ts.frequencies) line += Format(" %.3f MHz (%u)", f / 7.0, f);
       std::fprintf(out, "%s\n", line.c_str());
     }
-    if (!ts.partialReception.empty()) {
+    if (!ts.partialReception.empty() || !ts.libraryPartialReception.empty()) {
       line = "    partial reception:";
-      for (int id : ts.partialReception) line += Format(" 0x%02x", id);
+      for (int id : ts.partialReception) line += Format(" 0x%04x", id);
+      if (ts.partialReception != ts.libraryPartialReception) {
+        line += " [library reads";
+        for (int id : ts.libraryPartialReception) line += Format(" 0x%02x", id);
+        line += "]";
+      }
       std::fprintf(out, "%s\n", line.c_str());
     }
     if (!ts.serviceList.empty()) {
