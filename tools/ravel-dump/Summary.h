@@ -24,10 +24,14 @@ struct Duration {
   int hours = 0, minutes = 0, seconds = 0;
 };
 
+// A rating as broadcast and as the standard defines it, with the library's
+// reading (content, minimumAge).
 struct Rating {
   std::string country;
   int content = 0;
   int minimumAge = 0;
+  int raw = -1;       // the rating byte, -1 where the guide has not read it
+  std::string label;  // "L", "10" ... in Brazil, the minimum age elsewhere; "" when undefined
 };
 
 struct EventSummary {

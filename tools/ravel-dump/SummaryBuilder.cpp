@@ -320,6 +320,18 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
   return event;
 }
 
+// The rating bytes as broadcast, from the guide's reading of the same event.
+void AddBroadcastRatings(const std::vector<EpgEvent>& epg, int tableId, int serviceId, EventSummary& event) {
+  for (const EpgEvent& e : epg) {
+    if (e.tableId != tableId || e.serviceId != serviceId || e.eventId != event.eventId) continue;
+    for (std::size_t i = 0; i < event.ratings.size() && i < e.ratings.size(); ++i) {
+      event.ratings[i].raw = e.ratings[i].raw;
+      event.ratings[i].label = e.ratings[i].label;
+    }
+    return;
+  }
+}
+
 // Present (section 0) and following (section 1) events of each service, from
 // the EIT present/following of the actual stream.
 void AddEvents(const TableRegistry& registry, Summary& summary) {
@@ -333,6 +345,7 @@ void AddEvents(const TableRegistry& registry, Summary& summary) {
       RavelCEIT& eit = Held<RavelCEIT>(kv.second);
       if (eit.aEventInfo.iCount == 0) continue;
       EventSummary event = MakeEvent(*eit.aEventInfo.ipArray[0]);
+      AddBroadcastRatings(summary.epg, table->tableId, service.id, event);
       (kv.first == 0 ? service.present : service.following) = event;
     }
   }
@@ -465,12 +478,12 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddSdt(registry, summary);
   AddPmts(registry, summary);
   AddNit(registry, summary);
+  summary.epg = BuildEpg(registry, RavelCfg_GetStandard() != RAVEL_STANDARD_JAPAN);
   AddEvents(registry, summary);
   AddTime(registry, summary);
   AddApplications(registry, summary);
   AddAllServices(registry, summary);
   AddTablesWithoutClass(registry, summary);
-  summary.epg = BuildEpg(registry, RavelCfg_GetStandard() != RAVEL_STANDARD_JAPAN);
   summary.carousels = carousel.Summarize();
   return summary;
 }

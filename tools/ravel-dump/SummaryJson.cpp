@@ -25,13 +25,19 @@ json When(const DateTime& t, int utcOffsetMinutes) {
               {"minute", t.minute}, {"second", t.second}, {"iso8601", Iso8601(t, utcOffsetMinutes)}};
 }
 
+json OrNull(const std::string& text) { return text.empty() ? json(nullptr) : json(text); }
+
 json Pid(int pid) { return pid < 0 ? json(nullptr) : json(pid); }
 
 json Event(const EventSummary& e, const Summary& s) {
   if (!e.valid) return nullptr;
   json ratings = json::array();
   for (const Rating& r : e.ratings)
-    ratings.push_back({{"country", Bytes(r.country)}, {"content", r.content}, {"minimum_age", r.minimumAge}});
+    ratings.push_back({{"country", Bytes(r.country)},
+                       {"raw", r.raw < 0 ? json(nullptr) : json(r.raw)},
+                       {"label", OrNull(r.label)},
+                       {"content", r.content},
+                       {"minimum_age", r.minimumAge}});
   return json{{"event_id", e.eventId},
               {"start", When(e.start, s.utcOffsetMinutes)},
               {"duration", {{"hours", e.duration.hours}, {"minutes", e.duration.minutes},
@@ -42,8 +48,6 @@ json Event(const EventSummary& e, const Summary& s) {
               {"text", Text(e.text, s.textCoding)},
               {"ratings", ratings}};
 }
-
-json OrNull(const std::string& text) { return text.empty() ? json(nullptr) : json(text); }
 
 json EpgEventJson(const EpgEvent& e, const Summary& s) {
   json items = json::array();

@@ -45,7 +45,13 @@ void PrintEvent(std::FILE* out, const char* label, const EventSummary& event, Te
                             event.duration.hours, event.duration.minutes, event.duration.seconds);
   line += event.name.empty() ? std::string("(no name)") : Quoted(event.name, coding);
   for (const Rating& rating : event.ratings) {
-    line += " rating " + EscapeBytes(rating.country) + Format(" age %d", rating.minimumAge);
+    line += " rating " + EscapeBytes(rating.country);
+    if (rating.raw < 0) {
+      line += Format(" age %d", rating.minimumAge);
+    } else {
+      line += " " + (rating.label.empty() ? std::string("undefined") : rating.label) + Format(" (0x%02x)", rating.raw);
+      if (rating.label != std::to_string(rating.minimumAge)) line += Format(" [library: age %d]", rating.minimumAge);
+    }
     if (rating.content != 0) line += Format(" content 0x%x", rating.content);
   }
   std::fprintf(out, "%s (event 0x%04x)\n", line.c_str(), event.eventId);
