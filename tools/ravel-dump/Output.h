@@ -23,6 +23,9 @@ void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceO
 // carousel modules.
 Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace);
 
+// Every distinct descriptor of the DSM-CC stream descriptor sections read.
+std::vector<StreamDescriptorSummary> BuildStreamDescriptors(const TableRegistry& registry);
+
 // The figures of the final report, for the outputs that carry them.
 ReportFigures FiguresOf(const InputSummary& input, const Stats& stats, const TableRegistry& registry);
 

@@ -174,6 +174,22 @@ struct SdtService {
   std::string provider;
 };
 
+// A descriptor of a DSM-CC stream descriptor section (table_id 0x3D): a
+// stream event with its id, NPT and private data, or an NPT reference.
+struct StreamDescriptorSummary {
+  int pid = -1;
+  int extension = 0;  // table_id_extension (the event id for stream events)
+  int version = 0;
+  int tag = 0;
+  std::string name;
+  int eventId = -1;
+  long long npt = -1;  // the event's NPT, or the NPT reference
+  long long stc = -1;  // STC reference of an NPT reference
+  int scaleNumerator = 0, scaleDenominator = 0;
+  std::string privateData;  // bytes as broadcast
+  std::size_t length = 0;
+};
+
 // A table the library has no class for, by the name its table_id has.
 struct UnclassedTableSummary {
   std::string name;  // "" for a table_id no standard assigns
@@ -245,6 +261,7 @@ struct Summary {
   std::vector<CarouselSummary> carousels;
   std::vector<ObjectCarouselSummary> objectCarousels;
   std::vector<SdtService> allServices;
+  std::vector<StreamDescriptorSummary> streamDescriptors;
   std::vector<UnclassedTableSummary> tablesWithoutClass;
   ReportFigures report;
   std::vector<EpgEvent> epg;

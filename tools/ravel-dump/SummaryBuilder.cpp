@@ -484,6 +484,7 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddApplications(registry, summary);
   AddAllServices(registry, summary);
   AddTablesWithoutClass(registry, summary);
+  summary.streamDescriptors = BuildStreamDescriptors(registry);
   summary.carousels = carousel.Summarize();
   return summary;
 }

@@ -233,6 +233,22 @@ std::string SummaryJson(const Summary& s) {
                            {"provider", Text(service.provider, s.textCoding)}});
   }
 
+  json streamDescriptors = json::array();
+  for (const StreamDescriptorSummary& d : s.streamDescriptors) {
+    json entry = {{"pid", Pid(d.pid)}, {"id", d.extension}, {"version", d.version},
+                  {"tag", d.tag},      {"name", d.name},      {"length", d.length}};
+    if (d.eventId >= 0) {
+      entry["event_id"] = d.eventId;
+      entry["npt"] = d.npt;
+      entry["private_data"] = Bytes(d.privateData);
+    } else if (d.stc >= 0) {
+      entry["stc_reference"] = d.stc;
+      entry["npt_reference"] = d.npt;
+      entry["scale"] = {{"numerator", d.scaleNumerator}, {"denominator", d.scaleDenominator}};
+    }
+    streamDescriptors.push_back(entry);
+  }
+
   json epg = json::array();
   for (const EpgEvent& e : s.epg) epg.push_back(EpgEventJson(e, s));
 
@@ -260,6 +276,7 @@ std::string SummaryJson(const Summary& s) {
                    {"carousels", carousels},
                    {"object_carousels", objectCarousels},
                    {"all_services", allServices},
+                   {"stream_descriptors", streamDescriptors},
                    {"epg", epg},
                    {"tables_without_class", unclassed},
                    {"report", ReportJson(s.report)}};

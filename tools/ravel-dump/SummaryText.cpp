@@ -191,6 +191,18 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     std::fprintf(out, "%s\n", line.c_str());
   }
   std::fprintf(out, "Programme guide: %zu events of %zu services (shown by --epg)\n", s.epg.size(), EpgServiceCount(s.epg));
+  std::fprintf(out, "Stream descriptors (%zu):\n", s.streamDescriptors.size());
+  for (const StreamDescriptorSummary& d : s.streamDescriptors) {
+    std::string line = Format("  PID %s id 0x%04x version %d: %s (tag 0x%02x, %zu bytes)", Pid(d.pid).c_str(),
+                              d.extension, d.version, d.name.c_str(), d.tag, d.length);
+    if (d.eventId >= 0) {
+      line += Format(" event 0x%04x at NPT %lld, private data ", d.eventId, d.npt) +
+              Quoted(d.privateData, TextCoding::kAsBroadcast);
+    } else if (d.stc >= 0) {
+      line += Format(" STC %lld = NPT %lld, scale %d/%d", d.stc, d.npt, d.scaleNumerator, d.scaleDenominator);
+    }
+    std::fprintf(out, "%s\n", line.c_str());
+  }
   std::fprintf(out, "Tables without a class in the library (%zu):\n", s.tablesWithoutClass.size());
   for (const UnclassedTableSummary& t : s.tablesWithoutClass) {
     std::string where = t.pid < 0 ? std::string() : " on PID " + Pid(t.pid);
