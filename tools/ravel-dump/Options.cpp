@@ -137,10 +137,6 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     if (chosen == "summary") options.mode = OutputMode::kSummary;
     if (chosen == "json") options.mode = OutputMode::kJson;
     if (chosen == "epg") options.mode = OutputMode::kEpg;
-    if (!chosen.empty() && result.count("table")) {
-      error = "--table chooses the tables of the dump; --" + chosen + " shows every table read (use --pid to read fewer)";
-      return ParseOutcome::kUsageError;
-    }
     if (result.count("xmltv")) {
       options.xmltvFile = result["xmltv"].as<std::string>();
       if (options.xmltvFile.empty()) {
@@ -194,6 +190,12 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       }
     }
     if (result.count("table")) {
+      if (options.mode != OutputMode::kDump) {
+        error = "--table chooses the tables of the dump, which " +
+                (chosen.empty() ? std::string("is not printed here") : "--" + chosen + " replaces") +
+                " (use --pid to read fewer tables)";
+        return ParseOutcome::kUsageError;
+      }
       for (const std::string& word : SplitList(result["table"].as<std::vector<std::string>>())) {
         if (!options.tables.Parse(word, error)) return ParseOutcome::kUsageError;
       }

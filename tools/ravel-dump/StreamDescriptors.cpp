@@ -23,6 +23,7 @@ const char* DescriptorName(int tag) {
     case 0x18: return "NPT endpoint";
     case 0x19: return "stream mode";
     case 0x1A: return "stream event";
+    case 0x40: return "general event";
     default: return "descriptor";
   }
 }

@@ -190,6 +190,19 @@ struct StreamDescriptorSummary {
   std::size_t length = 0;
 };
 
+// The BIT (ISDB broadcasters), the latest version of each network's.
+struct BroadcasterSummary {
+  int id = 0;
+  std::vector<std::pair<int, int>> descriptors;  // tag, length
+};
+struct BitSummary {
+  int originalNetworkId = 0;
+  int version = 0;
+  bool viewPropriety = false;
+  std::vector<std::pair<int, int>> descriptors;  // first loop: tag, length
+  std::vector<BroadcasterSummary> broadcasters;
+};
+
 // A table the library has no class for, by the name its table_id has.
 struct UnclassedTableSummary {
   std::string name;  // "" for a table_id no standard assigns
@@ -261,6 +274,7 @@ struct Summary {
   std::vector<CarouselSummary> carousels;
   std::vector<ObjectCarouselSummary> objectCarousels;
   std::vector<SdtService> allServices;
+  std::vector<BitSummary> bits;
   std::vector<StreamDescriptorSummary> streamDescriptors;
   std::vector<UnclassedTableSummary> tablesWithoutClass;
   ReportFigures report;

@@ -116,8 +116,12 @@ void AddPat(const TableRegistry& registry, Summary& summary) {
   });
 }
 
-// Each service's PMT: the PIDs the receiver would play.
+// Each service's PMT: the PIDs the receiver would play. A PMT the PAT does
+// not list is on the air all the same: its program is listed too.
 void AddPmts(const TableRegistry& registry, Summary& summary) {
+  for (const auto& entry : registry.Tables()) {
+    if (entry->kind == kRavelKindPMT) ServiceOf(summary.services, entry->extension);
+  }
   for (ServiceSummary& service : summary.services) {
     const TableEntry* table = Latest(registry, kRavelKindPMT, [&](const TableEntry& t) {
       return t.extension == service.id && (service.pmtPid < 0 || t.pid == service.pmtPid || t.pid == kNoPid);
@@ -419,6 +423,48 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
   }
 }
 
+// Descriptors of a loop as (tag, length), up to where one overruns it.
+std::vector<std::pair<int, int>> DescriptorList(const uint8_t* p, std::size_t n) {
+  std::vector<std::pair<int, int>> list;
+  for (std::size_t at = 0; at + 2 <= n && at + 2 + p[at + 1] <= n; at += 2 + p[at + 1]) list.push_back({p[at], p[at + 1]});
+  return list;
+}
+
+// The BIT of each network, read from its sections' bytes.
+void AddBits(const TableRegistry& registry, Summary& summary) {
+  std::map<int, const TableEntry*> latest;
+  for (const auto& entry : registry.Tables()) {
+    if (entry->kind != kRavelKindBIT) continue;
+    const TableEntry*& kept = latest[entry->extension];
+    if (kept == nullptr || entry->lastSeen > kept->lastSeen) kept = entry.get();
+  }
+  for (const auto& kv : latest) {
+    BitSummary bit;
+    bit.originalNetworkId = kv.first;
+    bit.version = kv.second->version;
+    for (const auto& section : kv.second->sections) {
+      const uint8_t* s = section.second.Bytes();
+      const std::size_t end = section.second.Size() >= 14 ? section.second.Size() - 4 : 0;
+      if (end < 10) continue;
+      bit.viewPropriety = (s[8] & 0x10) != 0;
+      std::size_t at = 10 + (((s[8] & 0x0F) << 8) | s[9]);
+      if (at > end) continue;
+      std::vector<std::pair<int, int>> first = DescriptorList(s + 10, at - 10);
+      bit.descriptors.insert(bit.descriptors.end(), first.begin(), first.end());
+      while (at + 3 <= end) {
+        const std::size_t loopEnd = at + 3 + (((s[at + 1] & 0x0F) << 8) | s[at + 2]);
+        if (loopEnd > end) break;
+        BroadcasterSummary broadcaster;
+        broadcaster.id = s[at];
+        broadcaster.descriptors = DescriptorList(s + at + 3, loopEnd - at - 3);
+        bit.broadcasters.push_back(broadcaster);
+        at = loopEnd;
+      }
+    }
+    summary.bits.push_back(bit);
+  }
+}
+
 // Tables the library has no class for, by name, with their size and counts.
 void AddTablesWithoutClass(const TableRegistry& registry, Summary& summary) {
   for (const auto& entry : registry.Tables()) {
@@ -484,6 +530,7 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddApplications(registry, summary);
   AddAllServices(registry, summary);
   AddTablesWithoutClass(registry, summary);
+  AddBits(registry, summary);
   summary.streamDescriptors = BuildStreamDescriptors(registry);
   summary.carousels = carousel.Summarize();
   return summary;

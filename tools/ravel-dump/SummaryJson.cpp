@@ -80,6 +80,12 @@ json EpgEventJson(const EpgEvent& e, const Summary& s) {
               {"genres", genres}};
 }
 
+json DescriptorsJson(const std::vector<std::pair<int, int>>& descriptors) {
+  json list = json::array();
+  for (const auto& d : descriptors) list.push_back({{"tag", d.first}, {"length", d.second}});
+  return list;
+}
+
 json ReportJson(const ReportFigures& r) {
   json kinds = json::array();
   for (const KindFigures& k : r.kinds) {
@@ -249,6 +255,18 @@ std::string SummaryJson(const Summary& s) {
     streamDescriptors.push_back(entry);
   }
 
+  json bits = json::array();
+  for (const BitSummary& bit : s.bits) {
+    json broadcasters = json::array();
+    for (const BroadcasterSummary& b : bit.broadcasters)
+      broadcasters.push_back({{"id", b.id}, {"descriptors", DescriptorsJson(b.descriptors)}});
+    bits.push_back({{"original_network_id", bit.originalNetworkId},
+                    {"version", bit.version},
+                    {"broadcaster_view_propriety", bit.viewPropriety},
+                    {"descriptors", DescriptorsJson(bit.descriptors)},
+                    {"broadcasters", broadcasters}});
+  }
+
   json epg = json::array();
   for (const EpgEvent& e : s.epg) epg.push_back(EpgEventJson(e, s));
 
@@ -276,6 +294,7 @@ std::string SummaryJson(const Summary& s) {
                    {"carousels", carousels},
                    {"object_carousels", objectCarousels},
                    {"all_services", allServices},
+                   {"bits", bits},
                    {"stream_descriptors", streamDescriptors},
                    {"epg", epg},
                    {"tables_without_class", unclassed},

@@ -191,6 +191,17 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
     std::fprintf(out, "%s\n", line.c_str());
   }
   std::fprintf(out, "Programme guide: %zu events of %zu services (shown by --epg)\n", s.epg.size(), EpgServiceCount(s.epg));
+  for (const BitSummary& bit : s.bits) {
+    std::string line = Format("BIT of network 0x%04x version %d, broadcaster view propriety %d", bit.originalNetworkId,
+                              bit.version, bit.viewPropriety ? 1 : 0);
+    for (const auto& d : bit.descriptors) line += Format(", descriptor 0x%02x (%d bytes)", d.first, d.second);
+    std::fprintf(out, "%s\n", line.c_str());
+    for (const BroadcasterSummary& broadcaster : bit.broadcasters) {
+      line = Format("  broadcaster 0x%02x", broadcaster.id);
+      for (const auto& d : broadcaster.descriptors) line += Format(", descriptor 0x%02x (%d bytes)", d.first, d.second);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+  }
   std::fprintf(out, "Stream descriptors (%zu):\n", s.streamDescriptors.size());
   for (const StreamDescriptorSummary& d : s.streamDescriptors) {
     std::string line = Format("  PID %s id 0x%04x version %d: %s (tag 0x%02x, %zu bytes)", Pid(d.pid).c_str(),
