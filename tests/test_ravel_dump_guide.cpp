@@ -84,6 +84,47 @@ TEST_F(RavelDumpGuideTest, GuideHoldsEveryEventOfPresentFollowingAndScheduleActu
                                              "    12:42-12:55 \"Météo 2\" (event 0x0019, table 0x4f)"));
 }
 
+// An EIT schedule section the library's EIT class refuses (0x51) carries one
+// event whose extended event descriptors arrive out of order, an item going
+// on in the next descriptor without a description.
+TEST_F(RavelDumpGuideTest, ScheduleSectionsTheLibraryRefusesJoinTheirExtendedEventDescriptors) {
+  auto extended = [](uint8_t number, uint8_t last, const Bytes& items, const std::string& text) {
+    Bytes body = {static_cast<uint8_t>(number << 4 | last), 'p', 'o', 'r', static_cast<uint8_t>(items.size())};
+    sb::Append(body, items);
+    body.push_back(static_cast<uint8_t>(text.size()));
+    body.insert(body.end(), text.begin(), text.end());
+    Bytes descriptor = {0x4E, static_cast<uint8_t>(body.size())};
+    sb::Append(descriptor, body);
+    return descriptor;
+  };
+  Bytes descriptors = {0x4D, 9, 'p', 'o', 'r', 3, 'F', 'i', 'm', 1, 'x'};
+  sb::Append(descriptors, extended(1, 1, {0, 3, 'i', 's', 't'}, "B"));             // the item goes on
+  sb::Append(descriptors, extended(0, 1, {4, 'C', 'a', 's', 't', 2, 'A', 'l'}, "A"));
+  Bytes body = {0x00, 0x01, 0x00, 0x02, 0x08, 0x51};  // stream, network, segment_last, last_table_id
+  // Event 0x0042 on 2024-05-14 (MJD 60444) 20:00:00 for 01:30:00, running.
+  Bytes event = {0x00, 0x42, 0xEC, 0x1C, 0x20, 0x00, 0x00, 0x01, 0x30, 0x00, 0x80,
+                 static_cast<uint8_t>(descriptors.size())};
+  sb::Append(body, event);
+  sb::Append(body, descriptors);
+  sb::SectionOptions o;
+  o.tableId = 0x51;
+  o.tableIdExtension = 0x0641;
+  const std::string file = Write("eit.sections", sb::LongSection(o, body));
+  ToolRun run = Run({"-q", "--json", "--standard", "brazil", file});
+  ASSERT_EQ(0, run.status) << run.err;
+  const json epg = json::parse(run.out)["epg"];
+  ASSERT_EQ(1u, epg.size()) << run.out;
+  ExpectMembers({{"table_id", 0x51},
+                 {"service_id", 0x0641},
+                 {"event_id", 0x42},
+                 {"name", "Fim"},
+                 {"start", "2024-05-14T20:00:00-03:00"},
+                 {"stop", "2024-05-14T21:30:00-03:00"},
+                 {"items", json::array({{{"description", "Cast"}, {"item", "Alist"}}})},
+                 {"extended_text", "AB"}},
+                epg[0]);
+}
+
 TEST_F(RavelDumpGuideTest, XmltvGuidePassesTheXmltvValidator) {
   const std::string capture = captures::Path("dvb-epg.ts");
   if (capture.empty()) GTEST_SKIP() << "shared capture dvb-epg.ts absent";
