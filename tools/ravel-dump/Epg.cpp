@@ -5,6 +5,8 @@
 #include <set>
 #include <tuple>
 
+#include "SectionBytes.h"
+
 namespace ravel_dump {
 namespace {
 
@@ -120,15 +122,10 @@ void JoinExtended(std::vector<ExtendedPart>& parts, EpgEvent& event) {
 
 void ReadDescriptors(const uint8_t* p, std::size_t n, bool brazil, EpgEvent& event) {
   std::vector<ExtendedPart> extended;
-  std::size_t at = 0;
-  while (at + 2 <= n && at + 2 + p[at + 1] <= n) {
-    const uint8_t tag = p[at];
-    const uint8_t* body = p + at + 2;
-    const std::size_t length = p[at + 1];
-    at += 2 + length;
+  EachDescriptor(p, n, [&](uint8_t tag, const uint8_t* body, std::size_t length) {
     if (tag == 0x4D && length >= 5) {  // short event
       std::size_t nameLength = body[3];
-      if (4 + nameLength + 1 > length || 5 + nameLength + body[4 + nameLength] > length) continue;
+      if (4 + nameLength + 1 > length || 5 + nameLength + body[4 + nameLength] > length) return;
       event.language = Bytes(body, 3);
       event.name = Bytes(body + 4, nameLength);
       event.text = Bytes(body + 5 + nameLength, body[4 + nameLength]);
@@ -152,7 +149,7 @@ void ReadDescriptors(const uint8_t* p, std::size_t n, bool brazil, EpgEvent& eve
         event.genres.push_back(genre);
       }
     }
-  }
+  });
   JoinExtended(extended, event);
 }
 
@@ -198,16 +195,13 @@ DateTime EventEnd(const EpgEvent& event) {
 std::vector<EpgEvent> BuildEpg(const TableRegistry& registry, bool brazil) {
   // The latest version of each sub-table: table_id, service, stream, network.
   typedef std::tuple<int, int, int, int> SubTable;
-  std::map<SubTable, const TableEntry*> latest;
-  for (const auto& entry : registry.Tables()) {
-    if (!IsEit(entry->tableId) || entry->sections.empty()) continue;
-    const StoredSection& first = entry->sections.begin()->second;
-    if (first.Size() < kEitHeaderSize) continue;
+  std::map<SubTable, const TableEntry*> latest = LatestTables<SubTable>(registry, [](const TableEntry& t, SubTable& key) {
+    const StoredSection& first = t.sections.begin()->second;
+    if (!IsEit(t.tableId) || first.Size() < kEitHeaderSize) return false;
     const uint8_t* s = first.Bytes();
-    SubTable key(entry->tableId, entry->extension, (s[8] << 8) | s[9], (s[10] << 8) | s[11]);
-    const TableEntry*& kept = latest[key];
-    if (kept == nullptr || entry->lastSeen > kept->lastSeen) kept = entry.get();
-  }
+    key = SubTable(t.tableId, t.extension, (s[8] << 8) | s[9], (s[10] << 8) | s[11]);
+    return true;
+  });
   // Present/following first (the map orders by table_id): an event also in a
   // schedule is kept as present/following gives it.
   std::vector<EpgEvent> events;

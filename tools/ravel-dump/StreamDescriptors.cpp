@@ -5,6 +5,7 @@
 #include <tuple>
 
 #include "Output.h"
+#include "SectionBytes.h"
 
 namespace ravel_dump {
 namespace {
@@ -54,19 +55,21 @@ StreamDescriptorSummary Read(const TableEntry& table, int tag, const uint8_t* bo
 std::vector<StreamDescriptorSummary> BuildStreamDescriptors(const TableRegistry& registry) {
   std::vector<StreamDescriptorSummary> found;
   // Stream events are sent again and again: each distinct one once.
-  std::set<std::tuple<int, int, int, std::string>> seen;
+  std::set<std::tuple<int, int, int, int, std::string>> seen;
   for (const auto& entry : registry.Tables()) {
     if (entry->kind != kRavelKindStreamEvents) continue;
     for (const auto& kv : entry->sections) {
       const uint8_t* s = kv.second.Bytes();
       const std::size_t end = kv.second.Size() >= kHeaderSize + kTrailerSize ? kv.second.Size() - kTrailerSize : 0;
-      for (std::size_t at = kHeaderSize; at + 2 <= end && at + 2 + s[at + 1] <= end; at += 2 + s[at + 1]) {
-        std::string bytes(reinterpret_cast<const char*>(s + at), 2 + s[at + 1]);
-        if (!seen.insert(std::make_tuple(entry->pid, entry->extension, static_cast<int>(entry->version), bytes)).second) {
-          continue;
-        }
-        found.push_back(Read(*entry, s[at], s + at + 2, s[at + 1]));
-      }
+      if (end <= kHeaderSize) continue;
+      EachDescriptor(s + kHeaderSize, end - kHeaderSize,
+                     [&](uint8_t tag, const uint8_t* body, std::size_t length) {
+                       std::string bytes(reinterpret_cast<const char*>(body), length);
+                       if (seen.insert(std::make_tuple(entry->pid, entry->extension, static_cast<int>(entry->version),
+                                                       static_cast<int>(tag), bytes)).second) {
+                         found.push_back(Read(*entry, tag, body, length));
+                       }
+                     });
     }
   }
   return found;

@@ -25,6 +25,7 @@
 #include "Ravel_CTableTDT.h"
 #include "Ravel_CTableTOT.h"
 #include "Epg.h"
+#include "SectionBytes.h"
 #include "StandardDetection.h"
 #include "TableNames.h"
 
@@ -182,15 +183,13 @@ void AddSdt(const TableRegistry& registry, Summary& summary) {
 // The services of every transport stream: the latest version of each SDT,
 // actual and other, by its stream and network.
 void AddAllServices(const TableRegistry& registry, Summary& summary) {
-  std::map<std::tuple<int, int, int>, const TableEntry*> latest;
-  for (const auto& entry : registry.Tables()) {
-    if (entry->kind != kRavelKindSDT || entry->sections.empty()) continue;
-    const StoredSection& first = entry->sections.begin()->second;
-    if (first.Size() < 10) continue;
-    const TableEntry*& kept =
-        latest[std::make_tuple((first.Bytes()[8] << 8) | first.Bytes()[9], entry->extension, entry->tableId)];
-    if (kept == nullptr || entry->lastSeen > kept->lastSeen) kept = entry.get();
-  }
+  typedef std::tuple<int, int, int> SdtKey;  // network, stream, table_id
+  std::map<SdtKey, const TableEntry*> latest = LatestTables<SdtKey>(registry, [](const TableEntry& t, SdtKey& key) {
+    const StoredSection& first = t.sections.begin()->second;
+    if (t.kind != kRavelKindSDT || first.Size() < 10) return false;
+    key = SdtKey((first.Bytes()[8] << 8) | first.Bytes()[9], t.extension, t.tableId);
+    return true;
+  });
   for (const auto& kv : latest) {
     for (const auto& section : kv.second->sections) {
       if (!section.second.Parsed()) continue;
@@ -230,9 +229,9 @@ void EachTsDescriptor(const uint8_t* s, std::size_t size, Use use) {
     const int onid = (s[at + 2] << 8) | s[at + 3];
     const std::size_t loopEnd = at + 6 + (((s[at + 4] & 0x0F) << 8) | s[at + 5]);
     if (loopEnd > end) return;
-    for (std::size_t d = at + 6; d + 2 <= loopEnd && d + 2 + s[d + 1] <= loopEnd; d += 2 + s[d + 1]) {
-      use(tsid, onid, s[d], s + d + 2, static_cast<std::size_t>(s[d + 1]));
-    }
+    EachDescriptor(s + at + 6, loopEnd - at - 6, [&](uint8_t tag, const uint8_t* body, std::size_t length) {
+      use(tsid, onid, tag, body, length);
+    });
     at = loopEnd;
   }
 }
@@ -426,18 +425,18 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
 // Descriptors of a loop as (tag, length), up to where one overruns it.
 std::vector<std::pair<int, int>> DescriptorList(const uint8_t* p, std::size_t n) {
   std::vector<std::pair<int, int>> list;
-  for (std::size_t at = 0; at + 2 <= n && at + 2 + p[at + 1] <= n; at += 2 + p[at + 1]) list.push_back({p[at], p[at + 1]});
+  EachDescriptor(p, n, [&](uint8_t tag, const uint8_t*, std::size_t length) {
+    list.push_back({tag, static_cast<int>(length)});
+  });
   return list;
 }
 
 // The BIT of each network, read from its sections' bytes.
 void AddBits(const TableRegistry& registry, Summary& summary) {
-  std::map<int, const TableEntry*> latest;
-  for (const auto& entry : registry.Tables()) {
-    if (entry->kind != kRavelKindBIT) continue;
-    const TableEntry*& kept = latest[entry->extension];
-    if (kept == nullptr || entry->lastSeen > kept->lastSeen) kept = entry.get();
-  }
+  std::map<int, const TableEntry*> latest = LatestTables<int>(registry, [](const TableEntry& t, int& network) {
+    network = t.extension;
+    return t.kind == kRavelKindBIT;
+  });
   for (const auto& kv : latest) {
     BitSummary bit;
     bit.originalNetworkId = kv.first;
