@@ -38,7 +38,8 @@ export UBSAN_OPTIONS="halt_on_error=1:print_stacktrace=1:exitcode=87${UBSAN_OPTI
 
 runs=0
 failures=0
-modes=("" "--summary" "--json" "--extract-modules $work/modules" "--extract-files $work/files" "--standard japan"
+modes=("" "--summary" "--json" "--epg" "--xmltv $work/guide.xml" "--extract-modules $work/modules"
+  "--extract-files $work/files" "--standard japan"
   "--trace all")
 
 # A random number below $1 (up to 2^30).

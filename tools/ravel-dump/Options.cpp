@@ -60,7 +60,10 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
   // clang-format off
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
-      ("j,json", "Print the summary as JSON")
+      ("j,json", "Print the summary as JSON (its schema: ravel-dump.schema.json)")
+      ("epg", "Print the programme guide: every event of the EIT present/following and schedule, "
+       "actual and other, per service and day")
+      ("xmltv", "Write the programme guide to FILE as XMLTV", cxxopts::value<std::string>(), "FILE")
       ("x,extract-modules", "Rebuild the carousel modules and write each complete one to DIR, inflated when "
        "its DII says it is compressed",
        cxxopts::value<std::string>(), "DIR")
@@ -120,15 +123,35 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     }
     options.input = result.count("input") ? result["input"].as<std::string>() : "-";
     options.sections = result.count("sections") > 0;
-    if (result.count("summary")) options.mode = OutputMode::kSummary;
-    if (result.count("json")) options.mode = OutputMode::kJson;
+    // One output on stdout: two asked for at once are refused, not one picked.
+    const char* const kOutputs[] = {"summary", "json", "epg"};
+    std::string chosen;
+    for (const char* output : kOutputs) {
+      if (!result.count(output)) continue;
+      if (!chosen.empty()) {
+        error = "--" + chosen + " and --" + output + " each choose what is printed: give one";
+        return ParseOutcome::kUsageError;
+      }
+      chosen = output;
+    }
+    if (chosen == "summary") options.mode = OutputMode::kSummary;
+    if (chosen == "json") options.mode = OutputMode::kJson;
+    if (chosen == "epg") options.mode = OutputMode::kEpg;
+    if (result.count("xmltv")) {
+      options.xmltvFile = result["xmltv"].as<std::string>();
+      if (options.xmltvFile.empty()) {
+        error = "--xmltv needs a file";
+        return ParseOutcome::kUsageError;
+      }
+      if (chosen.empty()) options.mode = OutputMode::kNone;
+    }
     if (result.count("extract-modules")) {
       options.extractDirectory = result["extract-modules"].as<std::string>();
       if (options.extractDirectory.empty()) {
         error = "--extract-modules needs a directory";
         return ParseOutcome::kUsageError;
       }
-      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+      if (chosen.empty()) options.mode = OutputMode::kNone;
     }
     options.rawText = result.count("raw-text") > 0;
     if (result.count("extract-files")) {
@@ -137,7 +160,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
         error = "--extract-files needs a directory";
         return ParseOutcome::kUsageError;
       }
-      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+      if (chosen.empty()) options.mode = OutputMode::kNone;
     }
     if (result.count("standard")) {
       std::string name = result["standard"].as<std::string>();
@@ -167,6 +190,12 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       }
     }
     if (result.count("table")) {
+      if (options.mode != OutputMode::kDump) {
+        error = "--table chooses the tables of the dump, which " +
+                (chosen.empty() ? std::string("is not printed here") : "--" + chosen + " replaces") +
+                " (use --pid to read fewer tables)";
+        return ParseOutcome::kUsageError;
+      }
       for (const std::string& word : SplitList(result["table"].as<std::vector<std::string>>())) {
         if (!options.tables.Parse(word, error)) return ParseOutcome::kUsageError;
       }

@@ -21,6 +21,7 @@
 #include "StopSignal.h"
 #include "TimeBase.h"
 #include "TraceOutput.h"
+#include "Xmltv.h"
 
 namespace {
 
@@ -192,6 +193,7 @@ int main(int argc, char** argv) {
   // write them leaves no half output behind.
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
+                     options.mode == OutputMode::kEpg || !options.xmltvFile.empty() ||
                      !options.extractDirectory.empty() || !options.filesDirectory.empty();
   if (wantSummary) {
     summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
@@ -219,6 +221,10 @@ int main(int argc, char** argv) {
       }
     }
   }
+  summary.report = FiguresOf(inputSummary, stats, capture.Registry());
+  if (!options.xmltvFile.empty() && !WriteXmltv(options.xmltvFile, summary, error)) {
+    return Fail(error);
+  }
   switch (options.mode) {
     case OutputMode::kDump:
       DumpTables(capture.Registry(), options.tables, trace, stdout);
@@ -228,6 +234,9 @@ int main(int argc, char** argv) {
       break;
     case OutputMode::kJson:
       std::fputs(SummaryJson(summary).c_str(), stdout);
+      break;
+    case OutputMode::kEpg:
+      PrintEpgText(summary, stdout);
       break;
     case OutputMode::kNone:
       for (const CarouselSummary& carousel : summary.carousels) {
