@@ -9,6 +9,9 @@
 #include <cstdint>
 #include <vector>
 
+#include "Ravel_CDsmccMsgBase.h"
+#include "Ravel_CSafeSection.h"
+#include "Ravel_CTableBase.h"
 #include "Ravel_PGL.h"
 #include "Ravel_Util.h"
 
@@ -23,6 +26,22 @@ inline void SilenceTraces() {
   if (!silenced) {
     RavelPGL_SetTraceHook(&IgnoreTrace, 0);
     silenced = true;
+  }
+}
+
+// The bytes through the safe layer; what it accepts is shown, copied and the
+// copy shown, so that copies and dumps are fuzzed too.
+inline void ParseSafely(const unsigned char* bytes, int count) {
+  RavelCSafeSection safe;
+  if (safe.Parse(bytes, count) != kRavelSafeOk) return;
+  safe.Show();
+  if (RavelCTableBase* table = safe.CopyTable()) {
+    table->Show();
+    delete table;
+  }
+  if (RavelCDsmccBase* message = safe.CopyMessage()) {
+    message->Show();
+    delete message;
   }
 }
 

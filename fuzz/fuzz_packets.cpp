@@ -19,19 +19,7 @@ namespace {
 const size_t kPacketSize = 188;
 
 void ParseSections(const RavelCSectionData& out) {
-  for (int i = 0; i < out.iSectionCount; ++i) {
-    RavelCSafeSection safe;
-    if (safe.Parse(out.pSection[i], out.iSectionSize[i]) != kRavelSafeOk) continue;
-    safe.Show();
-    if (RavelCTableBase* table = safe.CopyTable()) {
-      table->Show();
-      delete table;
-    }
-    if (RavelCDsmccBase* message = safe.CopyMessage()) {
-      message->Show();
-      delete message;
-    }
-  }
+  for (int i = 0; i < out.iSectionCount; ++i) fuzz::ParseSafely(out.pSection[i], out.iSectionSize[i]);
 }
 
 }  // namespace

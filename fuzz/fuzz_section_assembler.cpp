@@ -20,17 +20,7 @@ const size_t kPacketSize = 188;
 
 void ParseWholeSection(void*, unsigned char* section, int size) {
   if (size < 3 || size != RavelSectionSize(section)) std::abort();
-  RavelCSafeSection safe;
-  if (safe.Parse(section, size) != kRavelSafeOk) return;
-  safe.Show();
-  if (RavelCTableBase* table = safe.CopyTable()) {
-    table->Show();
-    delete table;
-  }
-  if (RavelCDsmccBase* message = safe.CopyMessage()) {
-    message->Show();
-    delete message;
-  }
+  fuzz::ParseSafely(section, size);
 }
 
 }  // namespace

@@ -12,16 +12,6 @@
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   fuzz::SilenceTraces();
   std::vector<unsigned char> section = fuzz::Section(data, size);
-  RavelCSafeSection safe;
-  if (safe.Parse(section.data(), static_cast<int>(section.size())) != kRavelSafeOk) return 0;
-  safe.Show();
-  if (RavelCTableBase* table = safe.CopyTable()) {
-    table->Show();
-    delete table;
-  }
-  if (RavelCDsmccBase* message = safe.CopyMessage()) {
-    message->Show();
-    delete message;
-  }
+  fuzz::ParseSafely(section.data(), static_cast<int>(section.size()));
   return 0;
 }

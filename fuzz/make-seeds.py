@@ -4,7 +4,7 @@
 Usage: fuzz/make-seeds.py CAPTURES_DIR OUT_DIR
 
 Writes OUT_DIR/<target>/<sha1> files: sections by table, DSM-CC messages, runs
-of packets of one PID and the descriptors found in the tables' loops, each with
+of packets of one PID or of several and the descriptors found in the tables' loops, each with
 the leading byte the target reads first (repairs, class choice). The corpora
 are made again on demand and never committed.
 """
@@ -64,6 +64,33 @@ def sections_of(packets):
             pending += p[at:]
         take()
     return sections
+
+
+def packetize(sections, pid):
+    """Transport packets of one PID carrying these sections, each starting a packet."""
+    packets, counter = [], 0
+    for s in sections:
+        payload = b"\x00" + s
+        first = True
+        while payload:
+            piece, payload = payload[:PACKET - 4], payload[PACKET - 4:]
+            header = bytes([0x47, (0x40 if first else 0) | (pid >> 8), pid & 0xFF, 0x10 | counter])
+            packets.append(header + piece + b"\xff" * (PACKET - 4 - len(piece)))
+            counter, first = (counter + 1) & 0x0F, False
+    return packets
+
+
+def runs_from_section_starts(packets, length, count):
+    """Up to `count` runs of `length` packets, each starting where a section starts."""
+    starts = [i for i, p in enumerate(packets) if p[1] & 0x40]
+    runs, last = [], -length
+    for i in starts:
+        if i >= last + length:
+            runs.append(b"".join(packets[i:i + length]))
+            last = i
+            if len(runs) == count:
+                break
+    return runs
 
 
 def split_sections(contents):
@@ -191,6 +218,12 @@ for _t in [0x4E, 0x4F] + list(range(0x50, 0x70)):
 # data blocks and event sections.
 LIMIT_PER_KIND = 24
 
+# The receivers' path: runs of packets long enough to complete the sections
+# that start in them, a few per PID; raw section files are carried on one PID.
+RECEIVER_RUN = 32
+RECEIVER_RUNS_PER_PID = 6
+RAW_SECTIONS_PID = 0x0100
+
 
 def main():
     if len(sys.argv) != 3:
@@ -203,7 +236,11 @@ def main():
         with open(path, "rb") as f:
             contents = f.read()
         if name.endswith(".sections"):
-            sections += split_sections(contents)
+            found = split_sections(contents)
+            sections += found
+            packets = packetize(found, RAW_SECTIONS_PID)
+            for run in range(0, len(packets), RECEIVER_RUN):
+                corpus.add("fuzz_receivers", b"".join(packets[run:run + RECEIVER_RUN]))
         elif name.endswith(".ts"):
             for pid, packets in sorted(packets_by_pid(contents).items()):
                 # Runs of 16 packets, a few per PID, for the packet targets.
@@ -211,6 +248,11 @@ def main():
                     for target in ("fuzz_packets", "fuzz_section_assembler"):
                         corpus.add(target, b"".join(packets[run:run + 16]))
                 sections += sections_of(packets)
+                for run in runs_from_section_starts(packets, RECEIVER_RUN, RECEIVER_RUNS_PER_PID):
+                    corpus.add("fuzz_receivers", run)
+            # Packets of several PIDs as they come, for the stores side by side.
+            for at in range(0, min(len(contents), 4 * RECEIVER_RUN * PACKET), RECEIVER_RUN * PACKET):
+                corpus.add("fuzz_receivers", contents[at:at + RECEIVER_RUN * PACKET])
 
     kinds = {}
     descriptors = {}

@@ -32,7 +32,10 @@ if [ $# -gt 0 ]; then
   targets=("$@")
 else
   targets=()
-  for t in build-fuzz/fuzz/fuzz_*; do [ -x "$t" ] && targets+=("$(basename "$t")"); done
+  for t in build-fuzz/fuzz/fuzz_*; do
+    case "$t" in *_replay | *_soak) continue ;; esac  # programs that run without libFuzzer
+    [ -x "$t" ] && targets+=("$(basename "$t")")
+  done
 fi
 
 export ASAN_OPTIONS="detect_leaks=1${ASAN_OPTIONS:+:$ASAN_OPTIONS}"

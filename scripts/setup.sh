@@ -3,6 +3,9 @@
 set -euo pipefail
 
 packages=(cmake g++ make pkgconf libgtest-dev libgmock-dev nlohmann-json3-dev libcxxopts-dev libaribb24-dev zlib1g-dev)
+# The tests check ravel-dump's JSON against its schema and its XMLTV guide
+# with the XMLTV project's validator.
+packages+=(python3-jsonschema xmltv-util)
 [ "${RAVEL_WITH_BENCH:-0}" = 1 ] && packages+=(libbenchmark-dev libdvbpsi-dev time)
 [ "${RAVEL_WITH_SANITIZERS:-0}" = 1 ] && packages+=(clang libclang-rt-14-dev)
 [ "${RAVEL_WITH_CROSS:-0}" = 1 ] && packages+=(g++-arm-linux-gnueabihf g++-aarch64-linux-gnu qemu-user)

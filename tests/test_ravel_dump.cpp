@@ -257,6 +257,40 @@ TEST_F(RavelDumpTest, DamageKeepsTheIntactPart) {
   }
 }
 
+TEST_F(RavelDumpTest, CutLastPacketIsReportedAndTheWholePacketsBeforeItAreRead) {
+  Bytes good = SamplePatStream();
+  Bytes intact(good.begin(), good.end() - 188);
+  Bytes cut(good.begin(), good.end() - 100);
+  Bytes garbageAtEnd = good;
+  garbageAtEnd.insert(garbageAtEnd.end(), 300, 0x00);
+  struct Case {
+    const char* what;
+    std::vector<std::string> args;  // "@" stands for the case's file
+    Bytes file;
+    Bytes input;
+    Bytes wholePackets;
+    const char* problem;
+  } cases[] = {
+      {.what = "cut in a packet", .args = {"@"}, .file = cut, .input = {}, .wholePackets = intact,
+       .problem = "the input ends inside a packet (88 of 188 bytes)"},
+      {.what = "cut on standard input", .args = {"-"}, .file = {}, .input = cut, .wholePackets = intact,
+       .problem = "the input ends inside a packet (88 of 188 bytes)"},
+      {.what = "garbage at the end", .args = {"@"}, .file = garbageAtEnd, .input = {}, .wholePackets = good,
+       .problem = "bytes that do not make a whole packet"},
+  };
+  for (const Case& c : cases) {
+    ToolRun reference = Run({Write("whole.ts", c.wholePackets)});
+    ASSERT_EQ(0, reference.status) << c.what << reference.err;
+    std::string file = Write("input.ts", c.file);
+    std::vector<std::string> args;
+    for (const std::string& a : c.args) args.push_back(a == "@" ? file : a);
+    ToolRun run = Run(args, c.input);
+    EXPECT_EQ(0, run.status) << c.what << run.err;
+    EXPECT_EQ(reference.out, run.out) << c.what;
+    EXPECT_NE(std::string::npos, run.err.find(c.problem)) << c.what << "\n" << run.err;
+  }
+}
+
 TEST_F(RavelDumpTest, UnreadableFileIsReportedAsSuch) {
   if (geteuid() == 0) GTEST_SKIP() << "permissions do not apply to root";
   std::string file = Write("locked.ts", SamplePatStream());
@@ -278,6 +312,13 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
       {{"--pid", "0x10,zz", file}, "bad PID 'zz'"}, {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
       {{"--trace", "loud", file}, "unknown trace level 'loud'"},
       {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"}, {{file, file}, "only one capture"},
+      {{"--summary", "--json", file}, "--summary and --json each choose what is printed"},
+      {{"--json", "--epg", file}, "--json and --epg each choose what is printed"},
+      {{"--summary", "--jsonl", file}, "--summary and --jsonl each choose what is printed"},
+      {{"--jsonl", "--json", file}, "--json and --jsonl each choose what is printed"},
+      {{"--jsonl", "--epg", file}, "--jsonl and --epg each choose what is printed"},
+      {{"--json", "--table", "pat", file}, "--table chooses the tables of the dump"},
+      {{"--xmltv", "", file}, "--xmltv needs a file"},
   };
   for (const Case& c : cases) {
     ToolRun run = Run(c.args);
@@ -796,7 +837,7 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
       "  TS 0x0640 of network 0x0640 \"Teste\", remote control key 5\n"
       "    area code 0x2a5, guard interval 1/16, mode 3\n"
       "    frequencies: 509.000 MHz (3563) 515.000 MHz (3605)\n"
-      "    partial reception: 0x06\n"
+      "    partial reception: 0x0642 [library reads 0x06]\n"
       "Services (2):\n"
       "  Service 0x0641 digital TV (0x01) \"Canal\" provider \"Emissora\"\n"
       "    PMT 0x0100, PCR -, video -, audio -, captions -\n"
@@ -807,8 +848,16 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
       "      stream 0x06 PES private data on 0x0113, component tag 0x87\n"
       "      stream 0x05 private sections on 0x0114, component tag 0x88\n"
       "      stream 0x0d DSM-CC sections on 0x0115, component tag 0x89\n"
-      "    present:   2013-05-10 12:00:00 for 01:30:00 \"Jornal\" rating BRA age 12 content 0x2 (event 0x0001)\n"
-      "    following: 2013-05-10 13:30:00 for 00:45:00 \"Novela\" rating BRA age 16 (event 0x0002)\n"
+      "    present:   2013-05-10 12:00:00 for 01:30:00 \"Jornal\" rating BRA 12 (0x23) content 0x2 (event 0x0001)\n"
+      "    following: 2013-05-10 13:30:00 for 00:45:00 \"Novela\" rating BRA 16 (0x05) (event 0x0002)\n"
+      "Services of every transport stream (2, from the SDT actual and other):\n"
+      "  network 0x0640 TS 0x0640 service 0x0641 (this stream) [library reads network 0x0006] digital TV (0x01) "
+      "\"Canal\"\n"
+      "  network 0x0640 TS 0x0640 service 0x0642 (this stream) [library reads network 0x0006] data (0xc0) "
+      "\"Canal 1seg\"\n"
+      "Programme guide: 2 events of 1 services (shown by --epg)\n"
+      "Stream descriptors (0):\n"
+      "Tables without a class in the library (0):\n"
       "Time: 2013-05-10 12:34:56 (TOT)\n"
       "  local time offset BRA region 1: -03:00, changes 2013-10-20 00:00:00 to -02:00\n"
       "Ginga applications (1):\n"
@@ -824,11 +873,13 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
   EXPECT_NE(std::string::npos, run.err.find("  0x0115          2          0        0         2  data carousel\n"))
       << run.err;
 
-  // The broadcast standard decides how the ratings read (ARIB: rating + 3 years).
+  // The library reads ratings by the standard setting (ARIB: rating + 3 years);
+  // the rating byte reads by its country's standard, the library's age beside it.
   ToolRun japan = Run({"--standard", "japan", "--raw-text", "--summary", file});
   EXPECT_NE(std::string::npos, japan.out.find("Standard: japan (--standard)\n"));
-  EXPECT_NE(std::string::npos, japan.out.find("\"Jornal\" rating BRA age 0 (event 0x0001)"));
-  EXPECT_NE(std::string::npos, japan.out.find("\"Novela\" rating BRA age 8 (event 0x0002)"));
+  EXPECT_NE(std::string::npos, japan.out.find("\"Jornal\" rating BRA 12 (0x23) [library: age 0] (event 0x0001)"))
+      << japan.out;
+  EXPECT_NE(std::string::npos, japan.out.find("\"Novela\" rating BRA 16 (0x05) [library: age 8] (event 0x0002)"));
 }
 
 TEST_F(RavelDumpTest, DumpShowsEachTableOnceInFirstSeenOrder) {

@@ -4,11 +4,14 @@
 // inside the buffer; under the sanitizers any read beyond it is a failure.
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <memory>
 #include <string>
 #include <vector>
 
 #include "Captures.h"
+#include "Ravel_CDescriptorExtendedEvent.h"
+#include "Ravel_CDescriptorShortEvent.h"
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CTSPktAssembler.h"
@@ -134,5 +137,68 @@ TEST(ReceiversPath, SectionHandedOutWithTheSizeOfTheOneBeforeFailsItsCrcInsideIt
     RavelCEIT eit(nullptr);
     EXPECT_EQ(kRavelErrCorruptSection, eit.ParseRawData(section));
     EXPECT_EQ(std::vector<std::string>{"EIT Section: CRC Error!\n"}, recorder.TextsAt(th::kWarning));
+  }
+}
+
+namespace {
+
+// An EIT present/following section with one event whose descriptor loop is
+// `descriptors`, as broadcast: its lengths may run past the section.
+Bytes EitWithEventDescriptors(const Bytes& descriptors) {
+  Bytes event = sb::Cat({sb::U16(0x2000), sb::UtcTime(2020, 5, 4, 20, 0, 0), Bytes{0x01, 0x00, 0x00},
+                         sb::Length12(static_cast<unsigned int>(descriptors.size()), 0x8), descriptors});
+  sb::SectionOptions options;
+  options.tableId = 0x4E;
+  return sb::LongSection(options, sb::Cat({sb::U16(0x0421), sb::U16(0x0422), sb::U8(0), sb::U8(0x4E), event}));
+}
+
+// The text a descriptor keeps from `count` bytes at `at` in `section`: bytes
+// beyond the section read as 0, so the text ends at the first of them.
+std::string TextAt(const Bytes& section, const Bytes::const_iterator& at, size_t count) {
+  Bytes text(at, at + std::min<size_t>(count, static_cast<size_t>(section.end() - at)));
+  return std::string(text.begin(), std::find(text.begin(), text.end(), 0));
+}
+
+}  // namespace
+
+TEST(ReceiversPath, DescriptorsRunningPastTheirSectionReadZerosThereAndStopTheirLoops) {
+  const Bytes name = sb::Text("Jornal");  // the last bytes of the descriptor in the section
+  struct Case {
+    const char* what;
+    Bytes descriptors;  // the last one declares more than the section holds
+    size_t declaredText;
+    const char* (*keptText)(RavelCEventInfo& event);   // the text that starts with `name`
+    const char* (*textAfter)(RavelCEventInfo& event);  // the next text, whose length lies beyond
+  } cases[] = {
+      {/*what=*/"short event: event_name_length 200",
+       /*descriptors=*/sb::Cat({Bytes{0x4D, 0xF0}, sb::Text("por"), sb::U8(200), name}),
+       /*declaredText=*/200,
+       /*keptText=*/[](RavelCEventInfo& e) { return e.pShortEventDescriptor->GetEventName(); },
+       /*textAfter=*/[](RavelCEventInfo& e) { return e.pShortEventDescriptor->GetEventDescription(); }},
+      {/*what=*/"extended event: an item of 200 bytes in an item loop of 250, which stops after it",
+       /*descriptors=*/
+       sb::Cat({Bytes{0x4E, 0xF0, 0x01}, sb::Text("por"), sb::U8(250), sb::U8(1), sb::Text("A"), sb::U8(200), name}),
+       /*declaredText=*/200,
+       /*keptText=*/
+       [](RavelCEventInfo& e) {
+         RavelCExtendedEventDescriptor* d = e.pExtendedEventDescriptor;
+         return d->GetNumOfItems() == 1 ? d->GetItem(0)->GetItem() : "(not one item)";
+       },
+       /*textAfter=*/[](RavelCEventInfo& e) { return e.pExtendedEventDescriptor->GetText(); }},
+  };
+  for (const Case& c : cases) {
+    Bytes section = EitWithEventDescriptors(c.descriptors);
+    Records records = AssembleSections({section});
+    ASSERT_EQ(1u, records.size()) << c.what;
+    ASSERT_EQ(static_cast<int>(section.size()), records[0]->iSectionSize[0]) << c.what;
+    TraceRecorder recorder;
+    RavelCEIT eit(records[0]->pSection[0]);
+    ASSERT_EQ(1, eit.GetEventCount()) << c.what;
+    // The text takes the section's last bytes (its CRC_32), then zeros.
+    Bytes::const_iterator textStart = std::search(section.begin(), section.end(), name.begin(), name.end());
+    EXPECT_EQ(TextAt(section, textStart, c.declaredText), c.keptText(*eit.GetEventInfo(0))) << c.what;
+    EXPECT_STREQ("", c.textAfter(*eit.GetEventInfo(0))) << c.what;
+    RavelCEIT copy(eit);
+    copy.Show();
   }
 }

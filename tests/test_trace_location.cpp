@@ -7,6 +7,7 @@
 #include <string>
 
 #include "Ravel_CArray.h"
+#include "Ravel_CDescriptorService.h"
 #include "Ravel_CDsmccMsgBase.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_CTablePMT.h"
@@ -47,14 +48,27 @@ TEST(TraceLocation, IsTheCallSiteOfTheTraceEvenThroughASharedHelper) {
       {.label = "a class's own trace",
        .trigger =
            [] {
-             Bytes header = sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1), sb::U8(0xFF), sb::U8(0),
-                                     sb::U16(0)});
-             RavelCDsmccBase message(header.data());
+             // The message lies 8 bytes into its carousel section, as a receiver hands it.
+             sb::SectionOptions options;
+             options.tableId = 0x3B;
+             Bytes section = sb::LongSection(options, sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1),
+                                                                sb::U8(0xFF), sb::U8(0), sb::U16(0)}));
+             RavelCDsmccBase message(section.data() + 8);
            },
        .text = "Unknown DSMCC Type!",
        .file = "SectionParser/source/Ravel_CDsmccMsgBase",
        .extension = ".cpp",
        .marker = "\"Unknown DSMCC Type!"},
+      {.label = "the shared descriptor header parse, for the service descriptor",
+       .trigger =
+           [] {
+             Bytes descriptor = sb::Cat({sb::U8(0x49), sb::U8(0)});
+             RavelCServiceDescriptor service(descriptor.data());
+           },
+       .text = "This Descriptor isn't Service Descriptor!",
+       .file = "SectionParser/source/Ravel_CDescriptorService",
+       .extension = ".cpp",
+       .marker = "ParseHeader(raw, kKind, __LINE__)"},
       {.label = "the array template, from the line of the access check",
        .trigger =
            [] {

@@ -50,10 +50,11 @@ class RavelCDescriptorBase {
   // The shared first steps of a class's ParseRawData, after it has released its
   // previous parse: base parse, null check, tag check (skipped when the kind has
   // no wrong-tag message), naming. Gives 0 when the class is to decode its body,
-  // or the result code it is to return.
-  int ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind);
+  // or the result code it is to return. Its traces name the class's source and
+  // `sourceLine`, the line of the call.
+  int ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind, int sourceLine);
   // The banner at `mask`, then the base line, which keeps the dump level.
-  void ShowHeader(const RavelCDescriptorKind& kind, unsigned int mask = 0x10000020u);
+  void ShowHeader(const RavelCDescriptorKind& kind, int sourceLine, unsigned int mask = 0x10000020u);
 };
 
 #endif

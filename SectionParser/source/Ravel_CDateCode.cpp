@@ -1,6 +1,7 @@
 #include "Ravel_CDateCode.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 
 void RavelDateCode_DecodeMJD(unsigned int mjd, int& year, int& month, int& day) {
   const double date = static_cast<double>(mjd);
@@ -15,10 +16,10 @@ void RavelDateCode_DecodeMJD(unsigned int mjd, int& year, int& month, int& day) 
 }
 
 void RavelDateCode_DecodeDateTime(const unsigned char* utc, RavelCDateTime& dateTime) {
-  RavelDateCode_DecodeMJD(RavelRead16(utc), dateTime.iYear, dateTime.iMonth, dateTime.iDay);
-  dateTime.iHour = RavelBcd(utc[2]);
-  dateTime.iMinute = RavelBcd(utc[3]);
-  dateTime.iSecond = RavelBcd(utc[4]);
+  RavelDateCode_DecodeMJD(RavelCReadWindow::Read16(utc), dateTime.iYear, dateTime.iMonth, dateTime.iDay);
+  dateTime.iHour = RavelBcd(RavelCReadWindow::Read8(utc + 2));
+  dateTime.iMinute = RavelBcd(RavelCReadWindow::Read8(utc + 3));
+  dateTime.iSecond = RavelBcd(RavelCReadWindow::Read8(utc + 4));
   dateTime.iMilliSecond = 0;
   dateTime.iDayOfWeek = 0;
   dateTime.iTimeZone = 0;

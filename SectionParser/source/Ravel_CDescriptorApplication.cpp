@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorApplication.h"
 
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -37,9 +38,9 @@ void RavelCApplicationDescriptor::Clear() {
 
 int RavelCApplicationDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  RavelCBitInputStream reader(raw + 2, iDescriptorLength, 0);
+  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   unsigned char status = 0;
   reader.ReadByte(8, status);  // application_profiles_length: one profile is read whatever it says
   iApplicationProfile = reader.ReadShort(16, status);
@@ -55,7 +56,7 @@ int RavelCApplicationDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCApplicationDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask,
               "\t iApplicationProfile=%u, iVersionMajor=%u, iVersionMinor=%u, iVersionMicro %u, "
               "bServiceBoundFlag=%u, iVisibility=%u, iAppPriority=%u, iAppTransportLabel=%u \n",

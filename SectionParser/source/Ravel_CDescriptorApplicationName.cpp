@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_FixedText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -36,9 +37,9 @@ void RavelCApplicationNameDescriptor::Clear() {
 
 int RavelCApplicationNameDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  RavelCBitInputStream reader(raw + 2, iDescriptorLength, 0);
+  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   unsigned char status = 0;
   reader.GetByteArray(reinterpret_cast<unsigned char*>(szISOLanguageCode), 3);
   // An 8-bit count never exceeds the 255-byte field.
@@ -48,7 +49,7 @@ int RavelCApplicationNameDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCApplicationNameDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask, "\t iISOLanguageCode=%s, iApplicationName=%s", szISOLanguageCode,
               RavelFixedText_Print(szApplicationName).Get());
 }

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -53,13 +54,13 @@ void RavelCAudioComponentDescriptor::Clear() {
 }
 
 int RavelCAudioComponentDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     Clear();
     return result;
   }
   unsigned char status = 0;
-  RavelCBitInputStream reader(raw + 2, iDescriptorLength, 0);
+  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   reader.Skip(4);                                      // xxxx....
   iStreamContent = reader.ReadByte(4, status);         // ....xxxx
   iComponentType = reader.ReadByte(8, status);
@@ -79,7 +80,7 @@ int RavelCAudioComponentDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCAudioComponentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP,
               "\tiStreamContent=[0x%x], iComponentType=[0x%x], iComponentTag=[0x%x],iStreamType=[0x%x], "
               "iSimulcastGroupTag=[0x%x], iESMultiLingualFlag=[0x%x], iMainComponentFlag=[0x%x], "

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorBase.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -29,8 +30,8 @@ int RavelCDescriptorBase::ParseRawData(unsigned char* raw) {
     iDescriptorLength = 0;
     return kRavelErrInvalidArgument;
   }
-  iDescriptorTag = raw[0];
-  iDescriptorLength = raw[1];
+  iDescriptorTag = RavelCReadWindow::Read8(raw);
+  iDescriptorLength = RavelCReadWindow::Read8(raw + 1);
   sDescriptorName = "Unknown Descriptor";
   return kRavelOk;
 }
@@ -40,24 +41,25 @@ void RavelCDescriptorBase::Show() {
               iDescriptorLength, sDescriptorName.GetString());
 }
 
-// Traces of the shared steps are reported from the descriptor class's own source.
-#define RAVEL_TRACE_KIND(kind, mask, ...) RAVEL_PGL_TRACE_AT((kind).szSourcePath, __LINE__, (mask), __VA_ARGS__)
+// Traces of the shared steps are reported from the descriptor class's own
+// source, at the line of its call.
+#define RAVEL_TRACE_KIND(kind, line, mask, ...) RAVEL_PGL_TRACE_AT((kind).szSourcePath, (line), (mask), __VA_ARGS__)
 
-int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind) {
+int RavelCDescriptorBase::ParseHeader(unsigned char* raw, const RavelCDescriptorKind& kind, int sourceLine) {
   RavelCDescriptorBase::ParseRawData(raw);
   if (raw == 0) {
-    if (kind.bTraceNullArgument) RAVEL_TRACE_KIND(kind, RAVEL_PARSER_ERROR, "Invalid Argument!\n");
+    if (kind.bTraceNullArgument) RAVEL_TRACE_KIND(kind, sourceLine, RAVEL_PARSER_ERROR, "Invalid Argument!\n");
     return kRavelErrInvalidArgument;
   }
   if (kind.szWrongTagFormat != 0 && iDescriptorTag != kind.iTag) {
-    RAVEL_TRACE_KIND(kind, kind.iWrongTagMask, kind.szWrongTagFormat, iDescriptorTag);
+    RAVEL_TRACE_KIND(kind, sourceLine, kind.iWrongTagMask, kind.szWrongTagFormat, iDescriptorTag);
     return kRavelErrInvalidArgument;
   }
   sDescriptorName = kind.szDisplayName;
   return kRavelOk;
 }
 
-void RavelCDescriptorBase::ShowHeader(const RavelCDescriptorKind& kind, unsigned int mask) {
-  RAVEL_TRACE_KIND(kind, mask, "%s", kind.szBanner);
+void RavelCDescriptorBase::ShowHeader(const RavelCDescriptorKind& kind, int sourceLine, unsigned int mask) {
+  RAVEL_TRACE_KIND(kind, sourceLine, mask, "%s", kind.szBanner);
   RavelCDescriptorBase::Show();
 }

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -28,13 +29,13 @@ RavelCCRC32Descriptor::~RavelCCRC32Descriptor() {}
 
 int RavelCCRC32Descriptor::ParseRawData(unsigned char* raw) {
   std::memset(aCRC32, 0, sizeof(aCRC32));
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  std::memcpy(aCRC32, raw + 2, sizeof(aCRC32));
+  RavelCReadWindow::Copy(aCRC32, raw + 2, sizeof(aCRC32));
   return kRavelOk;
 }
 
 void RavelCCRC32Descriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tCRC32=[0x%02x 0x%02x 0x%02x 0x%02x]\n", aCRC32[0], aCRC32[1], aCRC32[2], aCRC32[3]);
 }

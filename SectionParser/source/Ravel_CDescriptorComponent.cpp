@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorComponent.h"
 
 #include "Ravel_CBitInputStream.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -29,13 +30,13 @@ void RavelCComponentDescriptor::Clear() {
 }
 
 int RavelCComponentDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     Clear();
     return result;
   }
   unsigned char status = 0;
-  RavelCBitInputStream reader(raw + 2, iDescriptorLength, 0);
+  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
   reader.Skip(4);                                      // xxxx....
   iStreamContent = reader.ReadByte(4, status);         // ....xxxx
   iComponentType = reader.ReadByte(8, status);
@@ -45,7 +46,7 @@ int RavelCComponentDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCComponentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP,
               "\tiStreamContent=[0x%x], iComponentType=[0x%x], iComponentTag=[0x%x], ISO Language Code=[0x%x]\n",
               iStreamContent, iComponentType, iComponentTag, iISO639LanguageCode);

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorCompressionType.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -28,15 +29,15 @@ RavelCCompressionTypeDescriptor::~RavelCCompressionTypeDescriptor() {}
 int RavelCCompressionTypeDescriptor::ParseRawData(unsigned char* raw) {
   iCompressionType = 0;
   iOriginalSize = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iCompressionType = raw[2];
-  iOriginalSize = RavelRead32(raw + 3);
+  iCompressionType = RavelCReadWindow::Read8(raw + 2);
+  iOriginalSize = RavelCReadWindow::Read32(raw + 3);
   return kRavelOk;
 }
 
 void RavelCCompressionTypeDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiCompressionType=[%d], iOriginalSize=[%d]\n", iCompressionType,
               static_cast<int>(iOriginalSize));
 }

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -46,7 +47,7 @@ void RavelCContentDescriptor::Release() {
 
 int RavelCContentDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   iGenreCount = iDescriptorLength >> 1;
   if (iDescriptorLength < 2) {
@@ -56,10 +57,10 @@ int RavelCContentDescriptor::ParseRawData(unsigned char* raw) {
   pGenre = new unsigned char[iGenreCount];
   pUserGenre = new unsigned char[iGenreCount];
   for (int i = 0; i < iGenreCount; ++i) {
-    pGenre[i] = raw[2 + 2 * i];
+    pGenre[i] = RavelCReadWindow::Read8(raw + 2 + 2 * i);
     // Every genre is reported at warning level for the field diagnostics.
     RAVEL_TRACE(RAVEL_PARSER_WARNING, "raw genre = 0x%x!\n", pGenre[i]);
-    pUserGenre[i] = raw[3 + 2 * i];
+    pUserGenre[i] = RavelCReadWindow::Read8(raw + 3 + 2 * i);
   }
   return kRavelOk;
 }
@@ -87,7 +88,7 @@ unsigned char RavelCContentDescriptor::GetUserGenre(int index) {
 }
 
 void RavelCContentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < iGenreCount && pGenre != 0; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tGenre[%d]=[0x%02x]", i, pGenre[i]);
   }

@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -41,15 +42,15 @@ void RavelCCopyrightDescriptor::Release() {
 
 int RavelCCopyrightDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iCopyrightId = RavelRead32(raw + 2);
+  iCopyrightId = RavelCReadWindow::Read32(raw + 2);
   // Counted in 8 bits: a length of 0 takes 255 bytes into a 256-byte buffer.
   unsigned char count = static_cast<unsigned char>(iDescriptorLength - 1);
   std::size_t size = static_cast<std::size_t>(count) + 1;
   pCopyrightInfo = static_cast<char*>(std::malloc(size));
   if (pCopyrightInfo != 0) {
-    std::memcpy(pCopyrightInfo, raw + 6, count);
+    RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(pCopyrightInfo), raw + 6, count);
     // The buffer's last byte is the one the copy leaves over; it closes the text.
     pCopyrightInfo[count] = '\0';
   }
@@ -57,7 +58,7 @@ int RavelCCopyrightDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCCopyrightDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Copyright id: %d \n", static_cast<int>(iCopyrightId));
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Copyright info: %s \n", RavelTraceText(pCopyrightInfo));
 }

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorCountryAvailability.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -40,21 +41,22 @@ void RavelCCountryAvailabilityDescriptor::Release() {
 
 int RavelCCountryAvailabilityDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iCountryAvailabilityFlag = static_cast<unsigned char>(raw[2] >> 7);  // x.......
-  // Steps of 3 while the code starts inside the body; a code holding a 0 byte
-  // is shorter than 3 letters and leaves its record empty.
-  for (int position = 3; position < 2 + iDescriptorLength; position += 3) {
-    char code[4] = {static_cast<char>(raw[position]), static_cast<char>(raw[position + 1]),
-                    static_cast<char>(raw[position + 2]), '\0'};
+  iCountryAvailabilityFlag = static_cast<unsigned char>(RavelCReadWindow::Read8(raw + 2) >> 7);  // x.......
+  // Steps of 3 while the code starts inside the body (and the section); a code
+  // holding a 0 byte is shorter than 3 letters and leaves its record empty.
+  const unsigned char* end = RavelCReadWindow::Clamp(raw + 3, raw + 2 + iDescriptorLength);
+  for (const unsigned char* at = raw + 3; at < end; at += 3) {
+    char code[4] = {'\0', '\0', '\0', '\0'};
+    RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(code), at, 3);
     aCountryCodes.Append(new RavelCCountryCode(code));
   }
   return kRavelOk;
 }
 
 void RavelCCountryAvailabilityDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Ability flag = %d\n", iCountryAvailabilityFlag);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Codes: \n");
   for (int i = 0; i < aCountryCodes.iCount; ++i) {

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorDataComponent.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -21,16 +22,16 @@ RavelCDataComponentDescriptor& RavelCDataComponentDescriptor::operator=(RavelCDa
 RavelCDataComponentDescriptor::~RavelCDataComponentDescriptor() {}
 
 int RavelCDataComponentDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     iDataComponentId = 0;
     return result;
   }
-  iDataComponentId = RavelRead16(raw + 2);
+  iDataComponentId = RavelCReadWindow::Read16(raw + 2);
   return kRavelOk;
 }
 
 void RavelCDataComponentDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiDataComponentId=[0x%04x]\n", iDataComponentId);
 }

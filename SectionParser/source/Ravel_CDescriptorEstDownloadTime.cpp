@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorEstDownloadTime.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -26,14 +27,14 @@ RavelCEstDownloadTimeDescriptor::~RavelCEstDownloadTimeDescriptor() {}
 
 int RavelCEstDownloadTimeDescriptor::ParseRawData(unsigned char* raw) {
   iEstDownloadTime = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iEstDownloadTime = RavelRead32(raw + 2);
+  iEstDownloadTime = RavelCReadWindow::Read32(raw + 2);
   return kRavelOk;
 }
 
 void RavelCEstDownloadTimeDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   // Printed as a signed number, as the receivers' logs show it.
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiEstDownloadTime=[%d]\n", static_cast<int>(iEstDownloadTime));
 }

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
@@ -70,35 +71,37 @@ void RavelCExtendedEventDescriptor::Release() {
 
 int RavelCExtendedEventDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iDescriptorNumber = static_cast<unsigned char>(raw[2] >> 4);        // xxxx....
-  iLastDescriptorNumber = static_cast<unsigned char>(raw[2] & 0x0F);  // ....xxxx
+  const unsigned char numbers = RavelCReadWindow::Read8(raw + 2);
+  iDescriptorNumber = static_cast<unsigned char>(numbers >> 4);        // xxxx....
+  iLastDescriptorNumber = static_cast<unsigned char>(numbers & 0x0F);  // ....xxxx
   RavelText_SetLanguageCode(szLanguageCode, raw + 3);
 
-  const int itemsLength = raw[6];
-  const int itemsEnd = 7 + itemsLength;
+  const int itemsLength = RavelCReadWindow::Read8(raw + 6);
+  // The items stop at the end of the section too.
+  const unsigned char* itemsEnd = RavelCReadWindow::Clamp(raw + 7, raw + 7 + itemsLength);
   int p = 7;
-  if (itemsLength > 0) {
+  if (raw + p < itemsEnd) {
     do {
-      int descriptionCount = raw[p];
+      int descriptionCount = RavelCReadWindow::Read8(raw + p);
       char* description = RavelText_NewCText(raw + p + 1, descriptionCount);
       p += 1 + descriptionCount;
-      int itemCount = raw[p];
+      int itemCount = RavelCReadWindow::Read8(raw + p);
       char* item = RavelText_NewCText(raw + p + 1, itemCount);
       p += 1 + itemCount;
       aItems.Append(new RavelCExtendedEvent(description, item));
-    } while (p < itemsEnd);
+    } while (raw + p < itemsEnd);
   }
 
   // The copy starts at the text_length byte itself and takes text_length bytes.
-  int textCount = raw[p];
+  int textCount = RavelCReadWindow::Read8(raw + p);
   pText = RavelText_NewCText(raw + p, textCount);
   return kRavelOk;
 }
 
 void RavelCExtendedEventDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tDescriptorNumber=[%d]\n", iDescriptorNumber);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLastDescriptorNumber=[%d]\n", iLastDescriptorNumber);
   for (int i = 0; i < aItems.iCount; ++i) {

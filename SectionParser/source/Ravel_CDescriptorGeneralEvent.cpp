@@ -4,6 +4,7 @@
 
 #include "Ravel_ByteOrder.h"
 #include "Ravel_CDateCode.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -66,12 +67,12 @@ RavelCGeneralEventDescriptor::~RavelCGeneralEventDescriptor() { RavelText_FreeCT
 
 int RavelCGeneralEventDescriptor::ParseRawData(unsigned char* raw) {
   // A refused descriptor keeps everything of its earlier parse, private data included.
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_FreeCText(pPrivateData);
 
-  iEventMsgGroupId = static_cast<unsigned short>(raw[2] * 16 + (raw[3] >> 4));  // 12 bits, then xxxx----
-  iTimeMode = raw[4];
+  iEventMsgGroupId = static_cast<unsigned short>(RavelCReadWindow::Read16(raw + 2) >> 4);  // 12 bits, then xxxx----
+  iTimeMode = RavelCReadWindow::Read8(raw + 4);
   switch (iTimeMode) {
     case 0:
       break;
@@ -80,23 +81,26 @@ int RavelCGeneralEventDescriptor::ParseRawData(unsigned char* raw) {
       RavelDateCode_DecodeDateTime(raw + 5, cEventMsgMJDJSTTime);
       break;
     case 2:
-      aEventMsgNPT[0] = raw[5] & 0x01;  // -------1: bit 32
-      std::memcpy(aEventMsgNPT + 1, raw + 6, 4);
+      aEventMsgNPT[0] = RavelCReadWindow::Read8(raw + 5) & 0x01;  // -------1: bit 32
+      RavelCReadWindow::Copy(aEventMsgNPT + 1, raw + 6, 4);
       break;
-    case 3:
+    case 3: {
       // The BCD digits sit four bits further on, after 4 reserved bits.
       std::memset(&cEventMsgRelativeTime, 0, sizeof(cEventMsgRelativeTime));
-      cEventMsgRelativeTime.iHours = (raw[5] & 0x0F) * 10 + (raw[6] >> 4);
-      cEventMsgRelativeTime.iMinutes = (raw[6] & 0x0F) * 10 + (raw[7] >> 4);
-      cEventMsgRelativeTime.iSeconds = (raw[7] & 0x0F) * 10 + (raw[8] >> 4);
+      unsigned char digits[4];  // bytes 5 to 8
+      RavelCReadWindow::Copy(digits, raw + 5, sizeof(digits));
+      cEventMsgRelativeTime.iHours = (digits[0] & 0x0F) * 10 + (digits[1] >> 4);
+      cEventMsgRelativeTime.iMinutes = (digits[1] & 0x0F) * 10 + (digits[2] >> 4);
+      cEventMsgRelativeTime.iSeconds = (digits[2] & 0x0F) * 10 + (digits[3] >> 4);
       break;
+    }
     default:
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "Unknown Time Mode =[0x%x]\n", iTimeMode);
       break;
   }
   // Fixed positions whatever the time mode, even where no time field was sent.
-  iEventMsgType = raw[10];
-  iEventMsgId = RavelRead16(raw + 11);
+  iEventMsgType = RavelCReadWindow::Read8(raw + 10);
+  iEventMsgId = RavelCReadWindow::Read16(raw + 11);
   // 8-bit on purpose: a descriptor_length of 10 gives 255 (the receivers' value).
   iPrivateDataLength = static_cast<unsigned char>(iDescriptorLength - 11);
   pPrivateData = RavelText_NewCText(raw + 13, iPrivateDataLength);
@@ -104,7 +108,7 @@ int RavelCGeneralEventDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCGeneralEventDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t EventMsgGroupID=[%d], TimeMode=[%d]\n", iEventMsgGroupId, iTimeMode);
   switch (iTimeMode) {
     case 1:

@@ -28,10 +28,10 @@ RavelCGingaAppDescriptor::~RavelCGingaAppDescriptor() {}
 
 int RavelCGingaAppDescriptor::ParseRawData(unsigned char* raw) {
   if (raw == 0) std::memset(szParameter, 0, sizeof(szParameter));
-  return ParseHeader(raw, kKind);
+  return ParseHeader(raw, kKind, __LINE__);
 }
 
 void RavelCGingaAppDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask, "\t iParameter %s \n", RavelFixedText_Print(szParameter).Get());
 }

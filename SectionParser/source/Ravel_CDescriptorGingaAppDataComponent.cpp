@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorGingaAppDataComponent.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -46,9 +47,9 @@ void RavelCGingaAppDataComponentDescriptor::Release() {
 
 int RavelCGingaAppDataComponentDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iDataComponentId = RavelRead16(raw + 2);
+  iDataComponentId = RavelCReadWindow::Read16(raw + 2);
   RAVEL_TRACE(RAVEL_PARSER_WARNING, "ComponentId [0x%04x]\n", iDataComponentId);
   pAdditionalGingaInfo = new RavelCAdditionalGingaInfo();
   pAdditionalGingaInfo->ParseRawData(raw + 4);

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_FixedText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -35,26 +36,26 @@ void RavelCGingaAppLocDescriptor::Clear() {
 
 int RavelCGingaAppLocDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   // Every count is 8 bits wide, so no text exceeds its 255-byte field.
   const unsigned char* position = raw + 2;
-  unsigned char baseLength = *position++;
-  std::memcpy(sBaseDirectory, position, baseLength);
+  unsigned char baseLength = RavelCReadWindow::Read8(position++);
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(sBaseDirectory), position, baseLength);
   position += baseLength;
-  unsigned char classPathLength = *position++;
-  std::memcpy(sClassPath, position, classPathLength);
+  unsigned char classPathLength = RavelCReadWindow::Read8(position++);
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(sClassPath), position, classPathLength);
   position += classPathLength;
   // The rest of the descriptor; wraps modulo 256 when the two counts claim more
   // than the descriptor holds.
   unsigned char initialClassLength =
       static_cast<unsigned char>(iDescriptorLength - baseLength - classPathLength - 2);
-  std::memcpy(sInicialClassName, position, initialClassLength);
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(sInicialClassName), position, initialClassLength);
   return kRavelOk;
 }
 
 void RavelCGingaAppLocDescriptor::Show() {
-  ShowHeader(kKind, kShowMask);
+  ShowHeader(kKind, __LINE__, kShowMask);
   RAVEL_TRACE(kShowMask, "\t  sBaseDirectory = %s, sClassPath = %s, sInicialClassName = %s \n",
               RavelFixedText_Print(sBaseDirectory).Get(), RavelFixedText_Print(sClassPath).Get(),
               RavelFixedText_Print(sInicialClassName).Get());

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -52,20 +53,20 @@ int RavelCInfoDescriptor::ParseRawData(unsigned char* raw) {
   // The text of an earlier parse is released here too, so parsing again never leaks it.
   ReleaseText();
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetLanguageCode(szLanguageCode, raw + 2);
   // descriptor_length - 3 text bytes and two 0 bytes (descriptor_length - 1 in all).
   // A length below 3 holds no text: the buffer is then just the two 0 bytes.
   int textLength = iDescriptorLength >= 3 ? iDescriptorLength - 3 : 0;
   pText = new char[textLength + 2];
-  if (textLength > 0) std::memcpy(pText, raw + 5, static_cast<std::size_t>(textLength));
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(pText), raw + 5, textLength);
   pText[textLength] = '\0';
   pText[textLength + 1] = '\0';
   return kRavelOk;
 }
 
 void RavelCInfoDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiISO639LangCode=[%s], ipTextChar=[%s]\n", szLanguageCode, RavelTraceText(pText));
 }

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorLinkage.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -22,7 +23,7 @@ RavelCLinkageDescriptor& RavelCLinkageDescriptor::operator=(RavelCLinkageDescrip
 RavelCLinkageDescriptor::~RavelCLinkageDescriptor() {}
 
 int RavelCLinkageDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     iTransportStreamId = 0;
     iOriginalNetworkId = 0;
@@ -30,15 +31,15 @@ int RavelCLinkageDescriptor::ParseRawData(unsigned char* raw) {
     iLinkageType = 0;
     return result;
   }
-  iTransportStreamId = RavelRead16(raw + 2);
-  iOriginalNetworkId = RavelRead16(raw + 4);
-  iServiceId = RavelRead16(raw + 6);
-  iLinkageType = raw[8];
+  iTransportStreamId = RavelCReadWindow::Read16(raw + 2);
+  iOriginalNetworkId = RavelCReadWindow::Read16(raw + 4);
+  iServiceId = RavelCReadWindow::Read16(raw + 6);
+  iLinkageType = RavelCReadWindow::Read8(raw + 8);
   return kRavelOk;
 }
 
 void RavelCLinkageDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP,
               "\tTransportStreamId=[0x%04x], OrginalNetworkId=[0x%04x], ServiceId=[0x%04x], LinkageType=[0x%02x]\n",
               iTransportStreamId, iOriginalNetworkId, iServiceId, iLinkageType);

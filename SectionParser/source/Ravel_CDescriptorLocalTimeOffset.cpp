@@ -4,6 +4,7 @@
 
 #include "Ravel_ByteOrder.h"
 #include "Ravel_CDateCode.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -42,16 +43,17 @@ int RavelCLocalTimeOffset::ParseRawData(unsigned char* raw) {
     Clear();
     return kRavelErrInvalidArgument;
   }
-  std::memcpy(szCountryCode, raw, 3);
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(szCountryCode), raw, 3);
   szCountryCode[3] = '\0';
-  iCountryRegionId = static_cast<unsigned char>(raw[3] >> 2);          // xxxxxx..
-  iLocalTimeOffsetPolarity = static_cast<unsigned char>(raw[3] & 1);   // .......x
-  iLocalTimeOffsetHour = RavelBcd(raw[4]);
-  iLocalTimeOffsetMinute = RavelBcd(raw[5]);
+  const unsigned char region = RavelCReadWindow::Read8(raw + 3);
+  iCountryRegionId = static_cast<unsigned char>(region >> 2);          // xxxxxx..
+  iLocalTimeOffsetPolarity = static_cast<unsigned char>(region & 1);   // .......x
+  iLocalTimeOffsetHour = RavelBcd(RavelCReadWindow::Read8(raw + 4));
+  iLocalTimeOffsetMinute = RavelBcd(RavelCReadWindow::Read8(raw + 5));
   iLocalTimeOffsetSecond = 0;
   RavelDateCode_DecodeDateTime(raw + 6, cTimeOfChange);
-  iNextTimeOffsetHour = RavelBcd(raw[11]);
-  iNextTimeOffsetMinute = RavelBcd(raw[12]);
+  iNextTimeOffsetHour = RavelBcd(RavelCReadWindow::Read8(raw + 11));
+  iNextTimeOffsetMinute = RavelBcd(RavelCReadWindow::Read8(raw + 12));
   iNextTimeOffsetSecond = 0;
   return kRavelOk;
 }
@@ -92,14 +94,15 @@ RavelCLocalTimeOffsetDescriptor::~RavelCLocalTimeOffsetDescriptor() { RavelRecor
 
 int RavelCLocalTimeOffsetDescriptor::ParseRawData(unsigned char* raw) {
   RavelRecordList_DeleteAll(aLocalTimeOffsets);
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   if (iDescriptorLength == 0) return kRavelOk;
-  // Steps of 13 while the entry starts inside the body; a partial last entry is
-  // read as a whole one.
-  for (int position = 2; position < 2 + iDescriptorLength; position += 13) {
+  // Steps of 13 while the entry starts inside the body (and the section); a
+  // partial last entry is read as a whole one.
+  const unsigned char* end = RavelCReadWindow::Clamp(raw + 2, raw + 2 + iDescriptorLength);
+  for (unsigned char* at = raw + 2; at < end; at += 13) {
     RavelCLocalTimeOffset* entry = new RavelCLocalTimeOffset();
-    entry->ParseRawData(raw + position);
+    entry->ParseRawData(at);
     aLocalTimeOffsets.Append(entry);
   }
   return kRavelOk;
@@ -127,7 +130,7 @@ RavelCLocalTimeOffset* RavelCLocalTimeOffsetDescriptor::GetLocalTimeOffset(const
 }
 
 void RavelCLocalTimeOffsetDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < aLocalTimeOffsets.iCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t##################### LocalTimeOffset [%d] #####################\n", i);
     aLocalTimeOffsets.ipArray[i]->Show();

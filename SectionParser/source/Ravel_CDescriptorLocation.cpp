@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorLocation.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -23,13 +24,13 @@ RavelCLocationDescriptor::~RavelCLocationDescriptor() {}
 
 int RavelCLocationDescriptor::ParseRawData(unsigned char* raw) {
   iLocationTag = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iLocationTag = raw[2];
+  iLocationTag = RavelCReadWindow::Read8(raw + 2);
   return kRavelOk;
 }
 
 void RavelCLocationDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiLocationTag=[%d]\n", iLocationTag);
 }

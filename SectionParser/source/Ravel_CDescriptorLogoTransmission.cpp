@@ -4,6 +4,7 @@
 #include <cstring>
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -26,7 +27,7 @@ char* NewLogoCharacters(const unsigned char* text, int descriptorLength) {
   char* buffer = static_cast<char*>(std::malloc(size));
   if (buffer == 0) return 0;
   std::memset(buffer, 0, size);
-  if (count > 0) std::memcpy(buffer, text, static_cast<std::size_t>(count));
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(buffer), text, count);
   return buffer;
 }
 
@@ -88,22 +89,22 @@ int RavelCLogoTransmissionDescriptor::GetLogoCharactersLength() const {
 
 int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   // A refused descriptor keeps the type, ids and version it had.
   if (result != kRavelOk) return result;
   // A descriptor of another transmission type keeps nothing of an earlier one.
   iLogoId = 0;
   iLogoVersion = 0;
   iDownloadDataId = 0;
-  iLogoTransmissionType = raw[2];
+  iLogoTransmissionType = RavelCReadWindow::Read8(raw + 2);
   switch (iLogoTransmissionType) {
     case 1:
-      iLogoId = RavelRead16(raw + 3) & 0x01FF;       // -------x xxxxxxxx
-      iLogoVersion = RavelRead16(raw + 5) & 0x0FFF;  // ----xxxx xxxxxxxx
-      iDownloadDataId = RavelRead16(raw + 7);
+      iLogoId = RavelCReadWindow::Read16(raw + 3) & 0x01FF;       // -------x xxxxxxxx
+      iLogoVersion = RavelCReadWindow::Read16(raw + 5) & 0x0FFF;  // ----xxxx xxxxxxxx
+      iDownloadDataId = RavelCReadWindow::Read16(raw + 7);
       break;
     case 2:
-      iLogoId = RavelRead16(raw + 3) & 0x01FF;  // -------x xxxxxxxx
+      iLogoId = RavelCReadWindow::Read16(raw + 3) & 0x01FF;  // -------x xxxxxxxx
       break;
     case 3:
       pLogoCharacters = NewLogoCharacters(raw + 3, iDescriptorLength);
@@ -115,7 +116,7 @@ int RavelCLogoTransmissionDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCLogoTransmissionDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogoTransmission Type=[0x%02x]\n", iLogoTransmissionType);
   if (iLogoTransmissionType == 3) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLogo Char String=[%s]\n", RavelTraceText(pLogoCharacters));

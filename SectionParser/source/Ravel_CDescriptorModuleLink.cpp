@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorModuleLink.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -27,15 +28,15 @@ RavelCModuleLinkDescriptor::~RavelCModuleLinkDescriptor() {}
 int RavelCModuleLinkDescriptor::ParseRawData(unsigned char* raw) {
   iPosition = 0;
   iModuleId = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iPosition = raw[2];
-  iModuleId = RavelRead16(raw + 3);
+  iPosition = RavelCReadWindow::Read8(raw + 2);
+  iModuleId = RavelCReadWindow::Read16(raw + 3);
   return kRavelOk;
 }
 
 void RavelCModuleLinkDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   // The module id is a number: printed in decimal under its usual label.
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiPosition=[%d], iModuleId=[%d]\n", iPosition, iModuleId);
 }

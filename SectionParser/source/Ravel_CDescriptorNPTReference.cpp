@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -29,8 +30,8 @@ void ClearFields(RavelCNPTReferenceDescriptor& d) {
 
 // A 33-bit reference: bit 32 alone (xxxxxxx1), then the 32 bits below it.
 void ReadReference33(const unsigned char* raw, unsigned char (&target)[5]) {
-  target[0] = raw[0] & 0x01;
-  std::memcpy(target + 1, raw + 1, 4);
+  target[0] = RavelCReadWindow::Read8(raw) & 0x01;
+  RavelCReadWindow::Copy(target + 1, raw + 1, 4);
 }
 
 }  // namespace
@@ -48,19 +49,20 @@ RavelCNPTReferenceDescriptor::~RavelCNPTReferenceDescriptor() {}
 
 int RavelCNPTReferenceDescriptor::ParseRawData(unsigned char* raw) {
   // Nothing owned to release; a refused descriptor keeps the fields it had.
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iPostDiscontinuityIndicator = raw[2] >> 7;  // 1xxxxxxx
-  iContentId = raw[2] & 0x7F;                 // x1111111
+  const unsigned char flags = RavelCReadWindow::Read8(raw + 2);
+  iPostDiscontinuityIndicator = flags >> 7;  // 1xxxxxxx
+  iContentId = flags & 0x7F;                 // x1111111
   ReadReference33(raw + 3, aSTCReference);    // bytes 3 to 7
   ReadReference33(raw + 11, aNPTReference);   // bytes 11 to 15
-  iScaleNumerator = RavelRead16(raw + 16);
-  iScaleDenominator = RavelRead16(raw + 18);
+  iScaleNumerator = RavelCReadWindow::Read16(raw + 16);
+  iScaleDenominator = RavelCReadWindow::Read16(raw + 18);
   return kRavelOk;
 }
 
 void RavelCNPTReferenceDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Post Discontinuity Indicator=[%d], Dsm_ContentID=[%d]\n",
               iPostDiscontinuityIndicator, iContentId);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t STC_Reference=[0x%02x 0x%02x 0x%02x 0x%02x 0x%02x]\n", aSTCReference[0],

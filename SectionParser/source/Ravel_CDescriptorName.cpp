@@ -24,13 +24,13 @@ RavelCNameDescriptor::~RavelCNameDescriptor() {}
 
 int RavelCNameDescriptor::ParseRawData(unsigned char* raw) {
   sFileName = "";
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetString(sFileName, raw + 2, iDescriptorLength);
   return kRavelOk;
 }
 
 void RavelCNameDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiFileName=[%s]\n", sFileName.GetString());
 }

@@ -23,13 +23,13 @@ RavelCNetworkNameDescriptor::~RavelCNetworkNameDescriptor() {}
 
 int RavelCNetworkNameDescriptor::ParseRawData(unsigned char* raw) {
   sNetworkName = "";
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetString(sNetworkName, raw + 2, iDescriptorLength);
   return kRavelOk;
 }
 
 void RavelCNetworkNameDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tNetwork Name=[%s]\n", sNetworkName.GetString());
 }

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_Cfg.h"
 #include "Ravel_RecordList.h"
 #include "Ravel_ResultCode.h"
@@ -22,9 +23,9 @@ RavelCParentalRating::~RavelCParentalRating() {}
 
 int RavelCParentalRating::ParseRawData(unsigned char* raw) {
   if (raw == 0) return kRavelErrInvalidArgument;
-  std::memcpy(szCountryCode, raw, 3);
+  RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(szCountryCode), raw, 3);
   szCountryCode[3] = '\0';
-  const unsigned char rating = raw[3];
+  const unsigned char rating = RavelCReadWindow::Read8(raw + 3);
   if (RavelCfg_GetStandard() == RAVEL_STANDARD_JAPAN) {
     iMinimumAge = (rating >= 1 && rating <= 15) ? static_cast<unsigned char>(rating + 3) : 0;
     return kRavelOk;
@@ -76,21 +77,22 @@ RavelCParentalRatingDescriptor::~RavelCParentalRatingDescriptor() { RavelRecordL
 
 int RavelCParentalRatingDescriptor::ParseRawData(unsigned char* raw) {
   RavelRecordList_DeleteAll(aParentalRatings);
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   if (iDescriptorLength == 0) return kRavelOk;
-  // Steps of 4 while the entry starts inside the body; a partial last entry is
-  // read as a whole one.
-  for (int position = 2; position < 2 + iDescriptorLength; position += 4) {
+  // Steps of 4 while the entry starts inside the body (and the section); a
+  // partial last entry is read as a whole one.
+  const unsigned char* end = RavelCReadWindow::Clamp(raw + 2, raw + 2 + iDescriptorLength);
+  for (unsigned char* at = raw + 2; at < end; at += 4) {
     RavelCParentalRating* entry = new RavelCParentalRating();
-    entry->ParseRawData(raw + position);
+    entry->ParseRawData(at);
     aParentalRatings.Append(entry);
   }
   return kRavelOk;
 }
 
 void RavelCParentalRatingDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < aParentalRatings.iCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t##################### ParentalRating [%d] #####################\n", i);
     aParentalRatings.ipArray[i]->Show();

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorPartialReception.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -32,11 +33,13 @@ RavelCPartialReceptionDescriptor::~RavelCPartialReceptionDescriptor() {}
 
 int RavelCPartialReceptionDescriptor::ParseRawData(unsigned char* raw) {
   aServiceIds.iCount = 0;
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   // Each 16-bit service_id is stored as its first byte only; the receivers that
   // use this list match on that byte, so it is kept so.
-  for (int at = 2; at < 2 + iDescriptorLength; at += 2) aServiceIds.Append(raw[at]);
+  // The list stops at the end of the section too.
+  const unsigned char* end = RavelCReadWindow::Clamp(raw + 2, raw + 2 + iDescriptorLength);
+  for (const unsigned char* at = raw + 2; at < end; at += 2) aServiceIds.Append(*at);
   return kRavelOk;
 }
 
@@ -47,7 +50,7 @@ unsigned short RavelCPartialReceptionDescriptor::GetServiceId(int index) {
 }
 
 void RavelCPartialReceptionDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   for (int i = 0; i < aServiceIds.iCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Id [%d] = %d\n", i, aServiceIds.ipArray[i]);
   }

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorSeries.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -66,21 +67,23 @@ void RavelCSeriesDescriptor::Release() {
 
 int RavelCSeriesDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iSeriesId = RavelRead16(raw + 2);
-  iRepeatLabel = static_cast<unsigned char>(raw[4] >> 4);                 // xxxx....
-  iProgramPattern = static_cast<unsigned char>((raw[4] >> 1) & 0x07);     // ....xxx.
-  iExpireDateValidFlag = static_cast<unsigned char>(raw[4] & 0x01);       // .......x
-  iExpireDate = RavelRead16(raw + 5);
-  iEpisodeNumber = static_cast<unsigned short>(raw[7] * 16 + (raw[8] >> 4));             // 12 bits
-  iLastEpisodeNumber = static_cast<unsigned short>((raw[8] & 0x0F) * 256 + raw[9]);      // 12 bits
+  iSeriesId = RavelCReadWindow::Read16(raw + 2);
+  const unsigned char flags = RavelCReadWindow::Read8(raw + 4);
+  iRepeatLabel = static_cast<unsigned char>(flags >> 4);                 // xxxx....
+  iProgramPattern = static_cast<unsigned char>((flags >> 1) & 0x07);     // ....xxx.
+  iExpireDateValidFlag = static_cast<unsigned char>(flags & 0x01);       // .......x
+  iExpireDate = RavelCReadWindow::Read16(raw + 5);
+  const unsigned int episodes = RavelCReadWindow::Read24(raw + 7);
+  iEpisodeNumber = static_cast<unsigned short>(episodes >> 12);          // 12 bits
+  iLastEpisodeNumber = static_cast<unsigned short>(episodes & 0x0FFF);   // 12 bits
   if (iDescriptorLength >= 9) pSeriesName = RavelText_NewCText(raw + 10, iDescriptorLength - 8);
   return kRavelOk;
 }
 
 void RavelCSeriesDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tSeriesId=[%d]\n", iSeriesId);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tRepeatLabel=[%d]\n", iRepeatLabel);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tProgramPattern=[%d]\n", iProgramPattern);

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorService.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -40,20 +41,20 @@ void RavelCServiceDescriptor::Release() {
 
 int RavelCServiceDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iServiceType = raw[2];
+  iServiceType = RavelCReadWindow::Read8(raw + 2);
   const unsigned char* at = raw + 3;
-  int providerLength = at[0];
+  int providerLength = RavelCReadWindow::Read8(at);
   if (providerLength > 0) pServiceProviderName = RavelText_NewCText(at + 1, providerLength);
   at += 1 + providerLength;
-  int nameLength = at[0];
+  int nameLength = RavelCReadWindow::Read8(at);
   if (nameLength > 0) pServiceName = RavelText_NewCText(at + 1, nameLength);
   return kRavelOk;
 }
 
 void RavelCServiceDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Type=[0x%02x]\n", iServiceType);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Provider Name=[%s]\n", RavelTraceText(pServiceProviderName));
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService Name=[%s]\n", RavelTraceText(pServiceName));

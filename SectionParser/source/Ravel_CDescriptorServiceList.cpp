@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorServiceList.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -49,7 +50,7 @@ void RavelCServiceListDescriptor::Release() {
 
 int RavelCServiceListDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   if (iDescriptorLength <= 2) {
     // Not even one 3-byte entry: an empty list is still a valid descriptor.
@@ -61,8 +62,8 @@ int RavelCServiceListDescriptor::ParseRawData(unsigned char* raw) {
   pServiceTypes = new unsigned char[iServiceCount];
   const unsigned char* entry = raw + 2;
   for (int i = 0; i < iServiceCount; ++i, entry += 3) {
-    pServiceIds[i] = RavelRead16(entry);
-    pServiceTypes[i] = entry[2];
+    pServiceIds[i] = RavelCReadWindow::Read16(entry);
+    pServiceTypes[i] = RavelCReadWindow::Read8(entry + 2);
   }
   return kRavelOk;
 }
@@ -80,7 +81,7 @@ int RavelCServiceListDescriptor::GetServiceInfo(int index, unsigned short& servi
 }
 
 void RavelCServiceListDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tService List Length=[%d]\n", iServiceCount);
   for (int i = 0; i < iServiceCount; ++i) {
     RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t\t[%d]th Service Info: Service ID=[0x%04x], Service Type=[0x%02x]\n", i,

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -43,20 +44,20 @@ void RavelCShortEventDescriptor::Release() {
 
 int RavelCShortEventDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetLanguageCode(szLanguageCode, raw + 2);
   const unsigned char* p = raw + 5;
-  int nameCount = p[0];
+  int nameCount = RavelCReadWindow::Read8(p);
   pEventName = RavelText_NewCText(p + 1, nameCount);
   p += 1 + nameCount;
-  int textCount = p[0];
+  int textCount = RavelCReadWindow::Read8(p);
   pEventDescription = RavelText_NewCText(p + 1, textCount);
   return kRavelOk;
 }
 
 void RavelCShortEventDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tLanguageCode=[%s]\n", szLanguageCode);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tEventName=[%s]\n", RavelTraceText(pEventName));
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tEventDescription=[%s]\n", RavelTraceText(pEventDescription));

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorStreamIdentifier.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -20,16 +21,16 @@ RavelCStreamIdentifierDescriptor& RavelCStreamIdentifierDescriptor::operator=(Ra
 RavelCStreamIdentifierDescriptor::~RavelCStreamIdentifierDescriptor() {}
 
 int RavelCStreamIdentifierDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) {
     iComponentTag = 0;
     return result;
   }
-  iComponentTag = raw[2];
+  iComponentTag = RavelCReadWindow::Read8(raw + 2);
   return kRavelOk;
 }
 
 void RavelCStreamIdentifierDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tComponent Tag = [0x%02x]\n", iComponentTag);
 }

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorSystemManagement.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
 
@@ -22,18 +23,19 @@ RavelCSystemManagementDescriptor& RavelCSystemManagementDescriptor::operator=(Ra
 RavelCSystemManagementDescriptor::~RavelCSystemManagementDescriptor() {}
 
 int RavelCSystemManagementDescriptor::ParseRawData(unsigned char* raw) {
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   // The flag is read from the two lowest bits, overlapping the identifier; the
   // receivers compare against these values, so the reading stays as it is.
-  iBroadcastingFlag = raw[2] & 0x03;        // ------xx
-  iBroadcastingIdentifier = raw[2] & 0x3F;  // --xxxxxx
-  iAdditionalBroadcastingIdentification = raw[3];
+  const unsigned char identifier = RavelCReadWindow::Read8(raw + 2);
+  iBroadcastingFlag = identifier & 0x03;        // ------xx
+  iBroadcastingIdentifier = identifier & 0x3F;  // --xxxxxx
+  iAdditionalBroadcastingIdentification = RavelCReadWindow::Read8(raw + 3);
   return kRavelOk;
 }
 
 void RavelCSystemManagementDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tBroadcasting Flag=[0x%02x], Broadcasting Id=[0x%02x], Additional Ids=[0x%02x]\n",
               iBroadcastingFlag, iBroadcastingIdentifier, iAdditionalBroadcastingIdentification);
 }

@@ -1,5 +1,6 @@
 #include "Ravel_CDescriptorTSInformation.h"
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -27,7 +28,7 @@ void RavelCTSInformationDescriptor::ClearTxTypes() {
 
 int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
   sTsName = "";
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (raw == 0) {
     iRemoteControlKeyId = 0;
     iTransmissionTypeCount = 0;
@@ -37,9 +38,10 @@ int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
   // descriptor as they were; only the name is released.
   if (result != kRavelOk) return result;
   ClearTxTypes();
-  iRemoteControlKeyId = raw[2];
-  int nameLength = raw[3] >> 2;              // xxxxxx--
-  iTransmissionTypeCount = raw[3] & 0x03;    // ------xx
+  iRemoteControlKeyId = RavelCReadWindow::Read8(raw + 2);
+  const unsigned char counts = RavelCReadWindow::Read8(raw + 3);
+  int nameLength = counts >> 2;              // xxxxxx--
+  iTransmissionTypeCount = counts & 0x03;    // ------xx
   RavelText_SetString(sTsName, raw + 4, nameLength);
   unsigned char* record = raw + 4 + nameLength;
   for (int i = 0; i < iTransmissionTypeCount; ++i) {
@@ -50,7 +52,7 @@ int RavelCTSInformationDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCTSInformationDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tRemote Control Key Id=[0x%02x], Ts Name=[%s], Tx Type Count=[%d]\n",
               iRemoteControlKeyId, sTsName.GetString(), iTransmissionTypeCount);
   for (int i = 0; i < iTransmissionTypeCount && i < kTxTypeSlots; ++i) cTxTypes[i].Show();

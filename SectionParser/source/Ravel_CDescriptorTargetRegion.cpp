@@ -3,6 +3,7 @@
 #include <cstdlib>
 #include <cstring>
 
+#include "Ravel_CReadWindow.h"
 #include "Ravel_DescriptorText.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -40,14 +41,14 @@ void RavelCTargetRegionDescriptor::Release() {
 
 int RavelCTargetRegionDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iRegionSpecType = raw[2];
+  iRegionSpecType = RavelCReadWindow::Read8(raw + 2);
   // Counted in 8 bits: a length of 0 takes 255 bytes into a 256-byte buffer.
   unsigned char count = static_cast<unsigned char>(iDescriptorLength - 1);
   pRegionSpec = static_cast<char*>(std::malloc(static_cast<std::size_t>(count) + 1));
   if (pRegionSpec != 0) {
-    std::memcpy(pRegionSpec, raw + 3, count);
+    RavelCReadWindow::Copy(reinterpret_cast<unsigned char*>(pRegionSpec), raw + 3, count);
     // The buffer's last byte is the one the copy leaves over; it closes the text.
     pRegionSpec[count] = '\0';
   }
@@ -55,7 +56,7 @@ int RavelCTargetRegionDescriptor::ParseRawData(unsigned char* raw) {
 }
 
 void RavelCTargetRegionDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Region Spec Type: %d \n", iRegionSpecType);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\t Region Spec: %s \n", RavelTraceText(pRegionSpec));
 }

@@ -1,6 +1,7 @@
 #include "Ravel_CDescriptorTerrDeliverySystem.h"
 
 #include "Ravel_ByteOrder.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_Cfg.h"
 #include "Ravel_ResultCode.h"
 #include "Ravel_Trace.h"
@@ -53,17 +54,18 @@ void RavelCTerrDeliverySystemDescriptor::Release() {
 
 int RavelCTerrDeliverySystemDescriptor::ParseRawData(unsigned char* raw) {
   Release();
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  iAreaCode = RavelRead16(raw + 2) >> 4;  // xxxxxxxx xxxx----
-  iGuardInterval = (raw[3] >> 2) & 0x03;  // ----xx--
-  iTransmissionMode = raw[3] & 0x03;      // ------xx
+  iAreaCode = RavelCReadWindow::Read16(raw + 2) >> 4;  // xxxxxxxx xxxx----
+  const unsigned char mode = RavelCReadWindow::Read8(raw + 3);
+  iGuardInterval = (mode >> 2) & 0x03;  // ----xx--
+  iTransmissionMode = mode & 0x03;      // ------xx
   // Signed on purpose: a descriptor without even the area code gives -1.
   int bodyLength = iDescriptorLength - 2;
   iFrequencyCount = bodyLength / 2;
   if (iFrequencyCount > 0) {
     pFrequencies = new unsigned short[iFrequencyCount];
-    for (int i = 0; i < iFrequencyCount; ++i) pFrequencies[i] = RavelRead16(raw + 4 + 2 * i);
+    for (int i = 0; i < iFrequencyCount; ++i) pFrequencies[i] = RavelCReadWindow::Read16(raw + 4 + 2 * i);
   }
   return kRavelOk;
 }
@@ -96,7 +98,7 @@ int RavelCTerrDeliverySystemDescriptor::GetRegionId() const {
 }
 
 void RavelCTerrDeliverySystemDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tArea Code=[0x%04x], Guard Interval=[0x%02x], Tx Mode=[0x%02x], Num Of Freq=[%d]\n",
               iAreaCode, iGuardInterval, iTransmissionMode, iFrequencyCount);
   for (int i = 0; i < iFrequencyCount; ++i) {

@@ -24,13 +24,13 @@ RavelCTypeDescriptor::~RavelCTypeDescriptor() {}
 
 int RavelCTypeDescriptor::ParseRawData(unsigned char* raw) {
   sType = "";
-  int result = ParseHeader(raw, kKind);
+  int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
   RavelText_SetString(sType, raw + 2, iDescriptorLength);
   return kRavelOk;
 }
 
 void RavelCTypeDescriptor::Show() {
-  ShowHeader(kKind);
+  ShowHeader(kKind, __LINE__);
   RAVEL_TRACE(RAVEL_PARSER_DUMP, "\tiType=[%s]\n", sType.GetString());
 }

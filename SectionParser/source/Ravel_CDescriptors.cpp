@@ -19,6 +19,7 @@
 #include "Ravel_CDescriptorTSInformation.h"
 #include "Ravel_CDescriptorTerrDeliverySystem.h"
 #include "Ravel_CDescriptorType.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_Trace.h"
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptors");
@@ -89,10 +90,11 @@ RavelCDescriptorBase* RavelSM_GetDescriptor(unsigned char* raw) {
     RAVEL_TRACE(RAVEL_PARSER_ERROR, "RavelSM_GetDescriptor: apRawData is NULL!\n");
     return 0;
   }
-  const DescriptorClass* descriptorClass = FindClass(raw[0]);
+  const unsigned char tag = RavelCReadWindow::Read8(raw);
+  const DescriptorClass* descriptorClass = FindClass(tag);
   if (descriptorClass == 0) {
     // Unsupported descriptors are normal in broadcast data: informational only.
-    RAVEL_TRACE(RAVEL_PARSER_DUMP, "Unsupoorted descriptor. Tag=[0x%x]\n", raw[0]);
+    RAVEL_TRACE(RAVEL_PARSER_DUMP, "Unsupoorted descriptor. Tag=[0x%x]\n", tag);
     return 0;
   }
   return descriptorClass->Create(raw);

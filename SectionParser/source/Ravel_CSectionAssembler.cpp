@@ -13,6 +13,10 @@ const unsigned char kStuffingByte = 0xFF;
 
 }  // namespace
 
+// The steps of AddTSPacket are declared inline so that they can be inlined into
+// it: in the position-independent library, a call to an exported function
+// could be interposed and is never inlined. All their callers are in this file.
+
 RavelCSectionAssembler::RavelCSectionAssembler(RavelSectionHandler handler, void* context)
     : iSectionsDelivered(0), iSectionsCut(0), iPacketsTransportError(0), iPacketsRepeated(0), iPacketsInvalid(0),
       iContinuityBreaks(0), iBytesWithoutStart(0), pHandler(handler), pContext(context), iLastCounter(kNoCounter),
@@ -32,7 +36,7 @@ void RavelCSectionAssembler::CutPending() {
   iSectionSize = 0;
 }
 
-bool RavelCSectionAssembler::TakeCounter(int counter, bool announcedDiscontinuity) {
+inline bool RavelCSectionAssembler::TakeCounter(int counter, bool announcedDiscontinuity) {
   const int last = iLastCounter;
   iLastCounter = counter;
   if (last == kNoCounter || counter == ((last + 1) & 0x0F)) {
@@ -51,7 +55,7 @@ bool RavelCSectionAssembler::TakeCounter(int counter, bool announcedDiscontinuit
   return true;
 }
 
-void RavelCSectionAssembler::Deliver(int& delivered) {
+inline void RavelCSectionAssembler::Deliver(int& delivered) {
   ++iSectionsDelivered;
   ++delivered;
   const int size = iSectionSize;
@@ -60,7 +64,7 @@ void RavelCSectionAssembler::Deliver(int& delivered) {
   if (pHandler != 0) pHandler(pContext, aSection, size);
 }
 
-int RavelCSectionAssembler::Continue(const unsigned char* data, int count, int& delivered) {
+inline int RavelCSectionAssembler::Continue(const unsigned char* data, int count, int& delivered) {
   int taken = 0;
   if (iSectionSize == 0) {
     // The header is split over two packets: complete it first.
@@ -80,7 +84,7 @@ int RavelCSectionAssembler::Continue(const unsigned char* data, int count, int& 
   return taken;
 }
 
-void RavelCSectionAssembler::StartSections(const unsigned char* data, int count, int& delivered) {
+inline void RavelCSectionAssembler::StartSections(const unsigned char* data, int count, int& delivered) {
   int at = 0;
   while (at < count && data[at] != kStuffingByte) {
     // A new section: its bytes go to the buffer as far as this packet holds them.

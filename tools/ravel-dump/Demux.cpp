@@ -65,11 +65,18 @@ void Demux::OnPacket(const uint8_t* packet) {
     }
     lastCounter_[pid] = counter;
   }
-  int slot = slot_[pid];
-  if (slot < 0) {
-    if (restricted_ || !AdoptedBySectionStart(pid, packet, control)) return;
-    slot = slot_[pid];
+  // Both hand-ons end the call, so that a packet of an unread PID costs no more
+  // than its header read. Only the start of a payload unit can make an unread
+  // PID a section PID.
+  const int slot = slot_[pid];
+  if (slot >= 0) {
+    HandOn(*stores_[slot], stats, packet, control);
+  } else if (!restricted_ && (packet[1] & 0x40) != 0) {
+    AdoptOnSectionStart(pid, packet, control);
   }
+}
+
+void Demux::HandOn(PidAssembler& store, PidStats& stats, const uint8_t* packet, unsigned int control) {
   // Payloads the assembler cannot take: none at all, or an adaptation field
   // that leaves no payload byte (its length is at most 182 when a payload follows).
   if (control == 0x00 || (control == 0x03 && packet[4] > 182)) {
@@ -77,25 +84,26 @@ void Demux::OnPacket(const uint8_t* packet) {
     return;
   }
   if (control == 0x02) return;
-  stores_[slot]->Add(packet);
+  store.Add(packet);
 }
 
 void Demux::End() {
   for (auto& store : stores_) store->End();
 }
 
-bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int control) {
-  // Only an unscrambled packet that starts a payload unit can start a section.
-  if ((packet[1] & 0x40) == 0 || (control & 0x01) == 0 || (packet[3] & 0xC0) != 0) return false;
+void Demux::AdoptOnSectionStart(int pid, const uint8_t* packet, unsigned int control) {
+  // Only an unscrambled packet with a payload can start a section (OnPacket
+  // has seen that it starts a payload unit).
+  if ((control & 0x01) == 0 || (packet[3] & 0xC0) != 0) return;
   unsigned int at = 4;
   if (control == 0x03) at += 1u + packet[4];
-  if (at >= 188) return false;
+  if (at >= 188) return;
   at += 1u + packet[at];  // pointer_field
-  if (at + 3 > 188) return false;
+  if (at + 3 > 188) return;
   // A PES packet starts 00 00 01, so its "table_id" is 0 (a PAT) and never matches.
   RavelSectionHeader header;
   const int held = static_cast<int>(188 - at);
-  if (!RavelCSafeSection::ReadHeader(packet + at, held, header)) return false;
+  if (!RavelCSafeSection::ReadHeader(packet + at, held, header)) return;
   PidRole role = PidRole::kNone;
   switch (RavelCSafeSection::GetKind(packet + at, held)) {
     case kRavelKindDSI:
@@ -110,9 +118,9 @@ bool Demux::AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int c
     default:
       break;
   }
-  if (role == PidRole::kNone || !header.bLongForm) return false;
+  if (role == PidRole::kNone || !header.bLongForm) return;
   AddSectionPid(pid, role);
-  return true;
+  HandOn(*stores_[slot_[pid]], stats_.pids[pid], packet, control);
 }
 
 }  // namespace ravel_dump

@@ -54,7 +54,9 @@ class Demux {
   // A capture of one carousel or stream-event PID has no PAT or PMT to name
   // it: the start of a DSM-CC section on an unread PID makes it a section PID
   // from that packet on. (An AIT waits for its PMT, as in a receiver.)
-  bool AdoptedBySectionStart(int pid, const uint8_t* packet, unsigned int control);
+  void AdoptOnSectionStart(int pid, const uint8_t* packet, unsigned int control);
+  // A packet of a section PID goes to its assembler when it carries a payload.
+  void HandOn(PidAssembler& store, PidStats& stats, const uint8_t* packet, unsigned int control);
 
   Stats& stats_;
   SectionSink& sink_;

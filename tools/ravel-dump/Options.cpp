@@ -60,9 +60,12 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
   // clang-format off
   parser.add_options()
       ("s,summary", "Print what a viewer wants to know: network, services, PIDs, events, time, applications, modules")
-      ("j,json", "Print the summary as JSON")
+      ("j,json", "Print the summary as JSON (its schema: ravel-dump.schema.json)")
       ("jsonl", "Print one JSON object a line per event as it happens (a table new or changed, a module "
        "complete, a time, a problem), for programs that follow a live input")
+      ("epg", "Print the programme guide: every event of the EIT present/following and schedule, "
+       "actual and other, per service and day")
+      ("xmltv", "Write the programme guide to FILE as XMLTV", cxxopts::value<std::string>(), "FILE")
       ("x,extract-modules", "Rebuild the carousel modules and write each complete one to DIR, inflated when "
        "its DII says it is compressed",
        cxxopts::value<std::string>(), "DIR")
@@ -93,8 +96,9 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     cxxopts::ParseResult result = parser.parse(argc, argv);
     if (result.count("help")) {
       std::cout << parser.help({""}) << "\n"
-                << "Without --summary or --json, each table is dumped by the library's own Show() as soon as\n"
-                << "it is complete, and again, marked as changed, when its version or contents change.\n"
+                << "Without --summary, --json, --jsonl or --epg, each table is dumped by the library's own\n"
+                << "Show() as soon as it is complete, and again, marked as changed, when its version or\n"
+                << "contents change.\n"
                 << "Section PIDs are those a receiver reads (PAT, NIT, SDT, EIT,\n"
                 << "TDT/TOT, BIT, the PMTs the PAT names and the AIT, carousel and stream-event PIDs the\n"
                 << "PMTs name), and any PID where a DSM-CC carousel or stream-event section starts;\n"
@@ -124,16 +128,36 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
     }
     options.input = result.count("input") ? result["input"].as<std::string>() : "-";
     options.sections = result.count("sections") > 0;
-    if (result.count("summary")) options.mode = OutputMode::kSummary;
-    if (result.count("json")) options.mode = OutputMode::kJson;
-    if (result.count("jsonl")) options.mode = OutputMode::kJsonLines;
+    // One output on stdout: two asked for at once are refused, not one picked.
+    const char* const kOutputs[] = {"summary", "json", "jsonl", "epg"};
+    std::string chosen;
+    for (const char* output : kOutputs) {
+      if (!result.count(output)) continue;
+      if (!chosen.empty()) {
+        error = "--" + chosen + " and --" + output + " each choose what is printed: give one";
+        return ParseOutcome::kUsageError;
+      }
+      chosen = output;
+    }
+    if (chosen == "summary") options.mode = OutputMode::kSummary;
+    if (chosen == "json") options.mode = OutputMode::kJson;
+    if (chosen == "jsonl") options.mode = OutputMode::kJsonLines;
+    if (chosen == "epg") options.mode = OutputMode::kEpg;
+    if (result.count("xmltv")) {
+      options.xmltvFile = result["xmltv"].as<std::string>();
+      if (options.xmltvFile.empty()) {
+        error = "--xmltv needs a file";
+        return ParseOutcome::kUsageError;
+      }
+      if (chosen.empty()) options.mode = OutputMode::kNone;
+    }
     if (result.count("extract-modules")) {
       options.extractDirectory = result["extract-modules"].as<std::string>();
       if (options.extractDirectory.empty()) {
         error = "--extract-modules needs a directory";
         return ParseOutcome::kUsageError;
       }
-      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+      if (chosen.empty()) options.mode = OutputMode::kNone;
     }
     options.rawText = result.count("raw-text") > 0;
     if (result.count("extract-files")) {
@@ -142,7 +166,7 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
         error = "--extract-files needs a directory";
         return ParseOutcome::kUsageError;
       }
-      if (!result.count("summary") && !result.count("json")) options.mode = OutputMode::kNone;
+      if (chosen.empty()) options.mode = OutputMode::kNone;
     }
     if (result.count("standard")) {
       std::string name = result["standard"].as<std::string>();
@@ -172,6 +196,13 @@ ParseOutcome ParseOptions(int argc, char** argv, Options& options, std::string& 
       }
     }
     if (result.count("table")) {
+      // The events of --jsonl name tables as the dump does, and are chosen the same way.
+      if (options.mode != OutputMode::kDump && options.mode != OutputMode::kJsonLines) {
+        error = "--table chooses the tables of the dump, which " +
+                (chosen.empty() ? std::string("is not printed here") : "--" + chosen + " replaces") +
+                " (use --pid to read fewer tables)";
+        return ParseOutcome::kUsageError;
+      }
       for (const std::string& word : SplitList(result["table"].as<std::vector<std::string>>())) {
         if (!options.tables.Parse(word, error)) return ParseOutcome::kUsageError;
       }

@@ -9,7 +9,7 @@
 
 namespace ravel_dump {
 
-enum class OutputMode { kDump, kSummary, kJson, kJsonLines, kNone };
+enum class OutputMode { kDump, kSummary, kJson, kJsonLines, kEpg, kNone };
 
 struct Options {
   std::string input;             // path, "-" for standard input, or udp://...
@@ -18,6 +18,7 @@ struct Options {
   OutputMode mode = OutputMode::kDump;
   std::string extractDirectory;  // --extract-modules
   std::string filesDirectory;    // --extract-files
+  std::string xmltvFile;         // --xmltv: the programme guide written there
   int standard = -1;             // -1: detected from the capture
   bool rawText = false;          // broadcast texts as broadcast, not decoded
   std::vector<int> pids;         // --pid: read only these, all as section PIDs

@@ -5,6 +5,7 @@
 #include <cstdio>
 
 #include "Carousel.h"
+#include "Report.h"
 #include "Stats.h"
 #include "Summary.h"
 #include "TableKind.h"
@@ -24,6 +25,12 @@ void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, 
 // The summary of the tables read (the latest version of each) and of the
 // carousel modules.
 Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace);
+
+// Every distinct descriptor of the DSM-CC stream descriptor sections read.
+std::vector<StreamDescriptorSummary> BuildStreamDescriptors(const TableRegistry& registry);
+
+// The figures of the final report, for the outputs that carry them.
+ReportFigures FiguresOf(const InputSummary& input, const Stats& stats, const TableRegistry& registry);
 
 }  // namespace ravel_dump
 

@@ -6,7 +6,9 @@
 namespace ravel_dump {
 namespace {
 
-const std::size_t kChunk = 4u << 20;
+// One read's worth: big enough that the read calls cost little, small enough
+// that the packets read are still in the cache when the demultiplexer takes them.
+const std::size_t kChunk = 1u << 20;
 // How far into the input the first run of sync bytes is looked for.
 const std::size_t kDetectWindow = 1u << 20;
 // Enough for a run of sync bytes in every packet size, at any position.
@@ -163,7 +165,8 @@ bool PacketReader::Resync() {
 
 const uint8_t* PacketReader::Next() {
   for (;;) {
-    if (!Fill(stride_)) {
+    // Most packets are whole in the buffer already: no call to fill it.
+    if (end_ - pos_ < static_cast<std::size_t>(stride_) && !Fill(stride_)) {
       if (!error_.empty()) return nullptr;
       std::size_t left = end_ - pos_;
       if (left >= syncOffset_ + kPacket && buffer_[pos_ + syncOffset_] == kSync) {
@@ -173,7 +176,7 @@ const uint8_t* PacketReader::Next() {
         ++packets_;
         return packet;
       }
-      if (left > 0) Cut(left);
+      NoteTruncation();
       return nullptr;
     }
     if (buffer_[pos_ + syncOffset_] == kSync) {
@@ -184,6 +187,16 @@ const uint8_t* PacketReader::Next() {
     }
     if (!Resync()) return nullptr;
   }
+}
+
+void PacketReader::NoteTruncation() {
+  std::size_t left = end_ - pos_;
+  if (left == 0) return;
+  // Damage, not a failure: the whole packets before it have been read.
+  skipped_ += left;
+  pos_ = end_;
+  NoteDamage(input_.Name() + ": truncated: the input ends inside a packet (" + std::to_string(left) + " of " +
+             std::to_string(stride_) + " bytes)");
 }
 
 }  // namespace ravel_dump

@@ -56,6 +56,8 @@ class PacketReader {
   bool RunAt(int stride, std::size_t syncOffset, bool whole) const;
   // The input ends with `left` bytes that make no whole packet.
   void Cut(std::size_t left);
+  // The input has ended inside a packet.
+  void NoteTruncation();
   void NoteDamage(const std::string& line);
 
   InputFile& input_;

@@ -7,6 +7,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "BroadcastText.h"
@@ -23,10 +24,14 @@ struct Duration {
   int hours = 0, minutes = 0, seconds = 0;
 };
 
+// A rating as broadcast and as the standard defines it, with the library's
+// reading (content, minimumAge).
 struct Rating {
   std::string country;
   int content = 0;
   int minimumAge = 0;
+  int raw = -1;       // the rating byte, -1 where the guide has not read it
+  std::string label;  // "L", "10" ... in Brazil, the minimum age elsewhere; "" when undefined
 };
 
 struct EventSummary {
@@ -72,7 +77,8 @@ struct TransportStreamSummary {
   int guardInterval = -1;
   int transmissionMode = -1;
   std::vector<unsigned int> frequencies;  // in the descriptor's units (1/7 MHz)
-  std::vector<int> partialReception;      // service ids as the library keeps them
+  std::vector<int> partialReception;         // service ids as broadcast
+  std::vector<int> libraryPartialReception;  // as the library keeps them
   std::vector<std::pair<int, int>> serviceList;  // id, type
 };
 
@@ -154,6 +160,107 @@ struct ObjectCarouselSummary {
   std::vector<std::string> problems;
 };
 
+// A service of any transport stream, from the latest SDT (actual or other)
+// that describes it. The original network id is the one the section carries;
+// the library's reading is kept beside it where it differs.
+struct SdtService {
+  int originalNetworkId = 0;
+  int libraryOriginalNetworkId = 0;
+  int transportStreamId = 0;
+  bool actual = false;
+  int id = 0;
+  int type = -1;
+  std::string name;
+  std::string provider;
+};
+
+// A descriptor of a DSM-CC stream descriptor section (table_id 0x3D): a
+// stream event with its id, NPT and private data, or an NPT reference.
+struct StreamDescriptorSummary {
+  int pid = -1;
+  int extension = 0;  // table_id_extension (the event id for stream events)
+  int version = 0;
+  int tag = 0;
+  std::string name;
+  int eventId = -1;
+  long long npt = -1;  // the event's NPT, or the NPT reference
+  long long stc = -1;  // STC reference of an NPT reference
+  int scaleNumerator = 0, scaleDenominator = 0;
+  std::string privateData;  // bytes as broadcast
+  std::size_t length = 0;
+};
+
+// The BIT (ISDB broadcasters), the latest version of each network's.
+struct BroadcasterSummary {
+  int id = 0;
+  std::vector<std::pair<int, int>> descriptors;  // tag, length
+};
+struct BitSummary {
+  int originalNetworkId = 0;
+  int version = 0;
+  bool viewPropriety = false;
+  std::vector<std::pair<int, int>> descriptors;  // first loop: tag, length
+  std::vector<BroadcasterSummary> broadcasters;
+};
+
+// A table the library has no class for, by the name its table_id has.
+struct UnclassedTableSummary {
+  std::string name;  // "" for a table_id no standard assigns
+  int tableId = 0;
+  int pid = -1;
+  int extension = 0;
+  int version = 0;
+  std::size_t sections = 0;
+  std::size_t bytes = 0;  // of its distinct sections
+  uint64_t timesSeen = 0;
+};
+
+// The final report's figures, for the JSON.
+struct KindFigures {
+  std::string kind;
+  uint64_t sections = 0, distinct = 0, tables = 0, crcFailures = 0, malformed = 0, parseFailures = 0;
+};
+struct ReportFigures {
+  bool rawSections = false;
+  uint64_t bytes = 0, packets = 0, skippedBytes = 0, resyncs = 0;
+  uint64_t sectionsAssembled = 0, crcFailures = 0, lengthMismatches = 0, malformed = 0, panics = 0, sectionsCut = 0;
+  std::vector<KindFigures> kinds;
+  std::vector<std::string> problems;
+};
+
+// One event of the programme guide (see Epg.h).
+struct EpgRating {
+  std::string country;
+  int raw = 0;        // the rating byte as broadcast
+  std::string label;  // as the country's standard defines it: "L", "14", "min 12", or "" (unknown)
+};
+
+struct EpgGenre {
+  int level1 = 0, level2 = 0;  // content nibbles
+  std::string name;            // of level 1, in the standard's genre table
+};
+
+struct EpgEvent {
+  int tableId = 0;
+  int originalNetworkId = 0, transportStreamId = 0, serviceId = 0;
+  int eventId = 0;
+  DateTime start;
+  Duration duration;
+  int runningStatus = 0;
+  bool freeCaMode = false;
+  std::string language;  // of the short event
+  std::string name, text;
+  // Every extended event descriptor joined in descriptor_number order: the
+  // items (an item without a description goes on the one before) and the text.
+  std::vector<std::pair<std::string, std::string>> items;
+  std::string extendedText;
+  std::vector<EpgRating> ratings;
+  std::vector<EpgGenre> genres;
+
+  bool Actual() const { return tableId == 0x4E || (tableId >= 0x50 && tableId <= 0x5F); }
+  bool Schedule() const { return tableId >= 0x50; }
+};
+
 struct Summary {
   std::string standard;        // "brazil" or "japan"
   std::string standardReason;  // why: detected signs, or --standard
@@ -166,10 +273,22 @@ struct Summary {
   std::vector<ApplicationSummary> applications;
   std::vector<CarouselSummary> carousels;
   std::vector<ObjectCarouselSummary> objectCarousels;
+  std::vector<SdtService> allServices;
+  std::vector<BitSummary> bits;
+  std::vector<StreamDescriptorSummary> streamDescriptors;
+  std::vector<UnclassedTableSummary> tablesWithoutClass;
+  ReportFigures report;
+  std::vector<EpgEvent> epg;
 };
 
 void PrintSummaryText(const Summary& summary, std::FILE* out);
+// The JSON's layout is described by ravel-dump.schema.json; its version
+// changes with every change of that layout.
+const int kSummarySchemaVersion = 1;
 std::string SummaryJson(const Summary& summary);
+// The programme guide per service and day (--epg).
+void PrintEpgText(const Summary& summary, std::FILE* out);
+std::size_t EpgServiceCount(const std::vector<EpgEvent>& events);
 
 // Names of codes, for the text summary.
 const char* ServiceTypeName(int type);

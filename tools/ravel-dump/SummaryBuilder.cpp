@@ -1,6 +1,8 @@
 // The summary, from the latest version of each table read, through the
 // objects the library made of its sections when they arrived.
 #include <cstring>
+#include <map>
+#include <tuple>
 
 #include "Output.h"
 #include "Ravel_CDescriptorLocalTimeOffset.h"
@@ -22,7 +24,10 @@
 #include "Ravel_CTableSDT.h"
 #include "Ravel_CTableTDT.h"
 #include "Ravel_CTableTOT.h"
+#include "Epg.h"
+#include "SectionBytes.h"
 #include "StandardDetection.h"
+#include "TableNames.h"
 
 namespace ravel_dump {
 namespace {
@@ -112,8 +117,12 @@ void AddPat(const TableRegistry& registry, Summary& summary) {
   });
 }
 
-// Each service's PMT: the PIDs the receiver would play.
+// Each service's PMT: the PIDs the receiver would play. A PMT the PAT does
+// not list is on the air all the same: its program is listed too.
 void AddPmts(const TableRegistry& registry, Summary& summary) {
+  for (const auto& entry : registry.Tables()) {
+    if (entry->kind == kRavelKindPMT) ServiceOf(summary.services, entry->extension);
+  }
   for (ServiceSummary& service : summary.services) {
     const TableEntry* table = Latest(registry, kRavelKindPMT, [&](const TableEntry& t) {
       return t.extension == service.id && (service.pmtPid < 0 || t.pid == service.pmtPid || t.pid == kNoPid);
@@ -171,6 +180,80 @@ void AddSdt(const TableRegistry& registry, Summary& summary) {
   });
 }
 
+// The services of every transport stream: the latest version of each SDT,
+// actual and other, by its stream and network.
+void AddAllServices(const TableRegistry& registry, Summary& summary) {
+  typedef std::tuple<int, int, int> SdtKey;  // network, stream, table_id
+  std::map<SdtKey, const TableEntry*> latest = LatestTables<SdtKey>(registry, [](const TableEntry& t, SdtKey& key) {
+    const StoredSection& first = t.sections.begin()->second;
+    if (t.kind != kRavelKindSDT || first.Size() < 10) return false;
+    key = SdtKey((first.Bytes()[8] << 8) | first.Bytes()[9], t.extension, t.tableId);
+    return true;
+  });
+  for (const auto& kv : latest) {
+    for (const auto& section : kv.second->sections) {
+      if (!section.second.Parsed()) continue;
+      RavelCSDT& sdt = Held<RavelCSDT>(section.second);
+      for (int i = 0; i < sdt.aServiceList.iCount; ++i) {
+        const RavelCServiceDescription* description = sdt.aServiceList.ipArray[i];
+        SdtService service;
+        service.originalNetworkId = std::get<0>(kv.first);
+        service.libraryOriginalNetworkId = sdt.GetOriginalNetworkId();
+        service.transportStreamId = std::get<1>(kv.first);
+        service.actual = !RavelCSafeSection::DescribesOtherStream(std::get<2>(kv.first));
+        service.id = description->iServiceId;
+        if (description->pService != nullptr) {
+          service.type = description->pService->iServiceType;
+          service.name = Text(description->pService->pServiceName);
+          service.provider = Text(description->pService->pServiceProviderName);
+        }
+        summary.allServices.push_back(service);
+      }
+    }
+  }
+}
+
+// Calls `use(tsid, onid, tag, body, length)` for each descriptor of the
+// transport stream loop of a NIT section, read from its bytes; a loop that
+// overruns the section ends the walk.
+template <class Use>
+void EachTsDescriptor(const uint8_t* s, std::size_t size, Use use) {
+  const std::size_t end = size >= 4 ? size - 4 : 0;
+  std::size_t at = 8;
+  if (at + 2 > end) return;
+  at += 2 + (((s[at] & 0x0F) << 8) | s[at + 1]);
+  if (at + 2 > end) return;
+  at += 2;
+  while (at + 6 <= end) {
+    const int tsid = (s[at] << 8) | s[at + 1];
+    const int onid = (s[at + 2] << 8) | s[at + 3];
+    const std::size_t loopEnd = at + 6 + (((s[at + 4] & 0x0F) << 8) | s[at + 5]);
+    if (loopEnd > end) return;
+    EachDescriptor(s + at + 6, loopEnd - at - 6, [&](uint8_t tag, const uint8_t* body, std::size_t length) {
+      use(tsid, onid, tag, body, length);
+    });
+    at = loopEnd;
+  }
+}
+
+// The partial reception descriptor's service ids as broadcast (16 bits each),
+// beside the library's reading.
+void AddPartialReception(const TableEntry& table, NetworkSummary& network) {
+  const uint8_t kPartialReceptionTag = 0xFB;
+  for (const auto& kv : table.sections) {
+    EachTsDescriptor(kv.second.Bytes(), kv.second.Size(),
+                     [&](int tsid, int onid, uint8_t tag, const uint8_t* body, std::size_t length) {
+                       if (tag != kPartialReceptionTag) return;
+                       for (TransportStreamSummary& ts : network.streams) {
+                         if (ts.id != tsid || ts.originalNetworkId != onid || !ts.partialReception.empty()) continue;
+                         for (std::size_t i = 0; i + 2 <= length; i += 2) {
+                           ts.partialReception.push_back((body[i] << 8) | body[i + 1]);
+                         }
+                       }
+                     });
+  }
+}
+
 // The NIT of this network: its name and transport streams.
 void AddNit(const TableRegistry& registry, Summary& summary) {
   const TableEntry* table = Latest(registry, kRavelKindNIT, [](const TableEntry& t) { return !RavelCSafeSection::DescribesOtherStream(t.tableId); });
@@ -198,7 +281,9 @@ void AddNit(const TableRegistry& registry, Summary& summary) {
         }
       }
       if (const RavelCPartialReceptionDescriptor* partial = info->pPartialReception) {
-        for (int s = 0; s < partial->aServiceIds.iCount; ++s) ts.partialReception.push_back(partial->aServiceIds.ipArray[s]);
+        for (int s = 0; s < partial->aServiceIds.iCount; ++s) {
+          ts.libraryPartialReception.push_back(partial->aServiceIds.ipArray[s]);
+        }
       }
       if (const RavelCServiceListDescriptor* list = info->pServiceList) {
         for (int s = 0; s < list->iServiceCount && list->pServiceIds != nullptr; ++s) {
@@ -208,6 +293,7 @@ void AddNit(const TableRegistry& registry, Summary& summary) {
       network.streams.push_back(ts);
     }
   });
+  AddPartialReception(*table, network);
 }
 
 EventSummary MakeEvent(RavelCEventInfo& info) {
@@ -237,6 +323,18 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
   return event;
 }
 
+// The rating bytes as broadcast, from the guide's reading of the same event.
+void AddBroadcastRatings(const std::vector<EpgEvent>& epg, int tableId, int serviceId, EventSummary& event) {
+  for (const EpgEvent& e : epg) {
+    if (e.tableId != tableId || e.serviceId != serviceId || e.eventId != event.eventId) continue;
+    for (std::size_t i = 0; i < event.ratings.size() && i < e.ratings.size(); ++i) {
+      event.ratings[i].raw = e.ratings[i].raw;
+      event.ratings[i].label = e.ratings[i].label;
+    }
+    return;
+  }
+}
+
 // Present (section 0) and following (section 1) events of each service, from
 // the EIT present/following of the actual stream.
 void AddEvents(const TableRegistry& registry, Summary& summary) {
@@ -250,6 +348,7 @@ void AddEvents(const TableRegistry& registry, Summary& summary) {
       RavelCEIT& eit = Held<RavelCEIT>(kv.second);
       if (eit.aEventInfo.iCount == 0) continue;
       EventSummary event = MakeEvent(*eit.aEventInfo.ipArray[0]);
+      AddBroadcastRatings(summary.epg, table->tableId, service.id, event);
       (kv.first == 0 ? service.present : service.following) = event;
     }
   }
@@ -323,7 +422,98 @@ void AddApplications(const TableRegistry& registry, Summary& summary) {
   }
 }
 
+// Descriptors of a loop as (tag, length), up to where one overruns it.
+std::vector<std::pair<int, int>> DescriptorList(const uint8_t* p, std::size_t n) {
+  std::vector<std::pair<int, int>> list;
+  EachDescriptor(p, n, [&](uint8_t tag, const uint8_t*, std::size_t length) {
+    list.push_back({tag, static_cast<int>(length)});
+  });
+  return list;
+}
+
+// The BIT of each network, read from its sections' bytes.
+void AddBits(const TableRegistry& registry, Summary& summary) {
+  std::map<int, const TableEntry*> latest = LatestTables<int>(registry, [](const TableEntry& t, int& network) {
+    network = t.extension;
+    return t.kind == kRavelKindBIT;
+  });
+  for (const auto& kv : latest) {
+    BitSummary bit;
+    bit.originalNetworkId = kv.first;
+    bit.version = kv.second->version;
+    for (const auto& section : kv.second->sections) {
+      const uint8_t* s = section.second.Bytes();
+      const std::size_t end = section.second.Size() >= 14 ? section.second.Size() - 4 : 0;
+      if (end < 10) continue;
+      bit.viewPropriety = (s[8] & 0x10) != 0;
+      std::size_t at = 10 + (((s[8] & 0x0F) << 8) | s[9]);
+      if (at > end) continue;
+      std::vector<std::pair<int, int>> first = DescriptorList(s + 10, at - 10);
+      bit.descriptors.insert(bit.descriptors.end(), first.begin(), first.end());
+      while (at + 3 <= end) {
+        const std::size_t loopEnd = at + 3 + (((s[at + 1] & 0x0F) << 8) | s[at + 2]);
+        if (loopEnd > end) break;
+        BroadcasterSummary broadcaster;
+        broadcaster.id = s[at];
+        broadcaster.descriptors = DescriptorList(s + at + 3, loopEnd - at - 3);
+        bit.broadcasters.push_back(broadcaster);
+        at = loopEnd;
+      }
+    }
+    summary.bits.push_back(bit);
+  }
+}
+
+// Tables the library has no class for, by name, with their size and counts.
+void AddTablesWithoutClass(const TableRegistry& registry, Summary& summary) {
+  for (const auto& entry : registry.Tables()) {
+    if (!WithoutClass(*entry)) continue;
+    UnclassedTableSummary table;
+    table.name = TableIdName(entry->tableId);
+    table.tableId = entry->tableId;
+    table.pid = entry->pid;
+    table.extension = entry->extension;
+    table.version = entry->version;
+    table.sections = entry->sections.size();
+    for (const auto& kv : entry->sections) table.bytes += kv.second.Size();
+    table.timesSeen = entry->TimesSeen();
+    summary.tablesWithoutClass.push_back(table);
+  }
+}
+
 }  // namespace
+
+ReportFigures FiguresOf(const InputSummary& input, const Stats& stats, const TableRegistry& registry) {
+  ReportFigures figures;
+  figures.rawSections = input.sections;
+  figures.bytes = input.bytes;
+  figures.packets = input.packets;
+  figures.skippedBytes = input.skippedBytes;
+  figures.resyncs = input.resyncs;
+  figures.sectionsAssembled = stats.sectionsAssembled;
+  figures.crcFailures = stats.crcFailures;
+  figures.lengthMismatches = stats.lengthMismatches;
+  figures.malformed = stats.malformed;
+  figures.panics = stats.panics;
+  figures.sectionsCut = stats.sectionsCut;
+  uint64_t tables[kRavelKindCount] = {};
+  for (const auto& table : registry.Tables()) ++tables[table->kind];
+  for (int k = 0; k < kRavelKindCount; ++k) {
+    const KindStats& s = stats.kinds[k];
+    if (s.sections == 0 && s.crcFailures == 0 && s.malformed == 0 && tables[k] == 0) continue;
+    KindFigures kind;
+    kind.kind = RavelCSafeSection::GetKindName(static_cast<TableKind>(k));
+    kind.sections = s.sections;
+    kind.distinct = s.distinct;
+    kind.tables = tables[k];
+    kind.crcFailures = s.crcFailures;
+    kind.malformed = s.malformed;
+    kind.parseFailures = s.parseFailures;
+    figures.kinds.push_back(kind);
+  }
+  figures.problems = stats.problems;
+  return figures;
+}
 
 Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& carousel, TraceOutput& trace) {
   TraceOutput::QuietScope quiet(trace);
@@ -333,9 +523,14 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddSdt(registry, summary);
   AddPmts(registry, summary);
   AddNit(registry, summary);
+  summary.epg = BuildEpg(registry, RavelCfg_GetStandard() != RAVEL_STANDARD_JAPAN);
   AddEvents(registry, summary);
   AddTime(registry, summary);
   AddApplications(registry, summary);
+  AddAllServices(registry, summary);
+  AddTablesWithoutClass(registry, summary);
+  AddBits(registry, summary);
+  summary.streamDescriptors = BuildStreamDescriptors(registry);
   summary.carousels = carousel.Summarize();
   return summary;
 }

@@ -6,6 +6,7 @@
 #include <nlohmann/json.hpp>
 
 #include "ByteText.h"
+#include "Epg.h"
 #include "Summary.h"
 #include "TimeBase.h"
 
@@ -24,13 +25,19 @@ json When(const DateTime& t, int utcOffsetMinutes) {
               {"minute", t.minute}, {"second", t.second}, {"iso8601", Iso8601(t, utcOffsetMinutes)}};
 }
 
+json OrNull(const std::string& text) { return text.empty() ? json(nullptr) : json(text); }
+
 json Pid(int pid) { return pid < 0 ? json(nullptr) : json(pid); }
 
 json Event(const EventSummary& e, const Summary& s) {
   if (!e.valid) return nullptr;
   json ratings = json::array();
   for (const Rating& r : e.ratings)
-    ratings.push_back({{"country", Bytes(r.country)}, {"content", r.content}, {"minimum_age", r.minimumAge}});
+    ratings.push_back({{"country", Bytes(r.country)},
+                       {"raw", r.raw < 0 ? json(nullptr) : json(r.raw)},
+                       {"label", OrNull(r.label)},
+                       {"content", r.content},
+                       {"minimum_age", r.minimumAge}});
   return json{{"event_id", e.eventId},
               {"start", When(e.start, s.utcOffsetMinutes)},
               {"duration", {{"hours", e.duration.hours}, {"minutes", e.duration.minutes},
@@ -40,6 +47,69 @@ json Event(const EventSummary& e, const Summary& s) {
               {"name", Text(e.name, s.textCoding)},
               {"text", Text(e.text, s.textCoding)},
               {"ratings", ratings}};
+}
+
+json EpgEventJson(const EpgEvent& e, const Summary& s) {
+  json items = json::array();
+  for (const auto& item : e.items)
+    items.push_back({{"description", Text(item.first, s.textCoding)}, {"item", Text(item.second, s.textCoding)}});
+  json ratings = json::array();
+  for (const EpgRating& r : e.ratings)
+    ratings.push_back({{"country", Bytes(r.country)}, {"raw", r.raw}, {"label", OrNull(r.label)}});
+  json genres = json::array();
+  for (const EpgGenre& g : e.genres)
+    genres.push_back({{"level1", g.level1}, {"level2", g.level2}, {"name", OrNull(g.name)}});
+  return json{{"table_id", e.tableId},
+              {"original_network_id", e.originalNetworkId},
+              {"transport_stream_id", e.transportStreamId},
+              {"service_id", e.serviceId},
+              {"actual", e.Actual()},
+              {"schedule", e.Schedule()},
+              {"event_id", e.eventId},
+              {"start", OrNull(Iso8601(e.start, s.utcOffsetMinutes))},
+              {"stop", OrNull(Iso8601(EventEnd(e), s.utcOffsetMinutes))},
+              {"duration_seconds", e.duration.hours * 3600 + e.duration.minutes * 60 + e.duration.seconds},
+              {"running_status", e.runningStatus},
+              {"free_ca_mode", e.freeCaMode},
+              {"language", Bytes(e.language)},
+              {"name", Text(e.name, s.textCoding)},
+              {"text", Text(e.text, s.textCoding)},
+              {"items", items},
+              {"extended_text", Text(e.extendedText, s.textCoding)},
+              {"ratings", ratings},
+              {"genres", genres}};
+}
+
+json DescriptorsJson(const std::vector<std::pair<int, int>>& descriptors) {
+  json list = json::array();
+  for (const auto& d : descriptors) list.push_back({{"tag", d.first}, {"length", d.second}});
+  return list;
+}
+
+json ReportJson(const ReportFigures& r) {
+  json kinds = json::array();
+  for (const KindFigures& k : r.kinds) {
+    kinds.push_back({{"kind", k.kind},
+                     {"sections", k.sections},
+                     {"distinct", k.distinct},
+                     {"tables", k.tables},
+                     {"crc_failures", k.crcFailures},
+                     {"malformed", k.malformed},
+                     {"parse_failures", k.parseFailures}});
+  }
+  return json{{"input", r.rawSections ? "sections" : "transport stream"},
+              {"bytes", r.bytes},
+              {"packets", r.packets},
+              {"skipped_bytes", r.skippedBytes},
+              {"resyncs", r.resyncs},
+              {"sections_assembled", r.sectionsAssembled},
+              {"crc_failures", r.crcFailures},
+              {"length_mismatches", r.lengthMismatches},
+              {"malformed", r.malformed},
+              {"library_panics", r.panics},
+              {"sections_cut", r.sectionsCut},
+              {"kinds", kinds},
+              {"problems", r.problems}};
 }
 
 }  // namespace
@@ -60,6 +130,9 @@ std::string SummaryJson(const Summary& s) {
                          {"transmission_mode", ts.transmissionMode < 0 ? json(nullptr) : json(ts.transmissionMode)},
                          {"frequencies", ts.frequencies},
                          {"partial_reception", ts.partialReception},
+                         {"library_partial_reception", ts.libraryPartialReception == ts.partialReception
+                                                           ? json(nullptr)
+                                                           : json(ts.libraryPartialReception)},
                          {"services", services}});
     }
     network = {{"id", s.network.id}, {"name", Text(s.network.name, s.textCoding)}, {"transport_streams", streams}};
@@ -152,7 +225,65 @@ std::string SummaryJson(const Summary& s) {
     objectCarousels.push_back({{"pid", Pid(c.pid)}, {"entries", entries}, {"problems", c.problems}});
   }
 
-  json document = {{"standard", s.standard},
+  json allServices = json::array();
+  for (const SdtService& service : s.allServices) {
+    allServices.push_back({{"original_network_id", service.originalNetworkId},
+                           {"library_original_network_id", service.libraryOriginalNetworkId == service.originalNetworkId
+                                                                ? json(nullptr)
+                                                                : json(service.libraryOriginalNetworkId)},
+                           {"transport_stream_id", service.transportStreamId},
+                           {"actual", service.actual},
+                           {"id", service.id},
+                           {"type", service.type < 0 ? json(nullptr) : json(service.type)},
+                           {"name", Text(service.name, s.textCoding)},
+                           {"provider", Text(service.provider, s.textCoding)}});
+  }
+
+  json streamDescriptors = json::array();
+  for (const StreamDescriptorSummary& d : s.streamDescriptors) {
+    json entry = {{"pid", Pid(d.pid)}, {"id", d.extension}, {"version", d.version},
+                  {"tag", d.tag},      {"name", d.name},      {"length", d.length}};
+    if (d.eventId >= 0) {
+      entry["event_id"] = d.eventId;
+      entry["npt"] = d.npt;
+      entry["private_data"] = Bytes(d.privateData);
+    } else if (d.stc >= 0) {
+      entry["stc_reference"] = d.stc;
+      entry["npt_reference"] = d.npt;
+      entry["scale"] = {{"numerator", d.scaleNumerator}, {"denominator", d.scaleDenominator}};
+    }
+    streamDescriptors.push_back(entry);
+  }
+
+  json bits = json::array();
+  for (const BitSummary& bit : s.bits) {
+    json broadcasters = json::array();
+    for (const BroadcasterSummary& b : bit.broadcasters)
+      broadcasters.push_back({{"id", b.id}, {"descriptors", DescriptorsJson(b.descriptors)}});
+    bits.push_back({{"original_network_id", bit.originalNetworkId},
+                    {"version", bit.version},
+                    {"broadcaster_view_propriety", bit.viewPropriety},
+                    {"descriptors", DescriptorsJson(bit.descriptors)},
+                    {"broadcasters", broadcasters}});
+  }
+
+  json epg = json::array();
+  for (const EpgEvent& e : s.epg) epg.push_back(EpgEventJson(e, s));
+
+  json unclassed = json::array();
+  for (const UnclassedTableSummary& t : s.tablesWithoutClass) {
+    unclassed.push_back({{"name", OrNull(t.name)},
+                         {"table_id", t.tableId},
+                         {"pid", Pid(t.pid)},
+                         {"id", t.extension},
+                         {"version", t.version},
+                         {"sections", t.sections},
+                         {"bytes", t.bytes},
+                         {"times_seen", t.timesSeen}});
+  }
+
+  json document = {{"schema_version", kSummarySchemaVersion},
+                   {"standard", s.standard},
                    {"standard_reason", s.standardReason},
                    {"time_base", UtcOffsetText(s.utcOffsetMinutes)},
                    {"transport_stream_id", s.transportStreamId < 0 ? json(nullptr) : json(s.transportStreamId)},
@@ -161,7 +292,13 @@ std::string SummaryJson(const Summary& s) {
                    {"time", time},
                    {"applications", applications},
                    {"carousels", carousels},
-                   {"object_carousels", objectCarousels}};
+                   {"object_carousels", objectCarousels},
+                   {"all_services", allServices},
+                   {"bits", bits},
+                   {"stream_descriptors", streamDescriptors},
+                   {"epg", epg},
+                   {"tables_without_class", unclassed},
+                   {"report", ReportJson(s.report)}};
   return document.dump(2) + "\n";
 }
 

@@ -4,6 +4,8 @@
 #include "ByteText.h"
 #include "Summary.h"
 #include "TimeBase.h"
+#include "Epg.h"
+#include "Xmltv.h"
 
 namespace ravel_dump {
 namespace {
@@ -43,7 +45,13 @@ void PrintEvent(std::FILE* out, const char* label, const EventSummary& event, Te
                             event.duration.hours, event.duration.minutes, event.duration.seconds);
   line += event.name.empty() ? std::string("(no name)") : Quoted(event.name, coding);
   for (const Rating& rating : event.ratings) {
-    line += " rating " + EscapeBytes(rating.country) + Format(" age %d", rating.minimumAge);
+    line += " rating " + EscapeBytes(rating.country);
+    if (rating.raw < 0) {
+      line += Format(" age %d", rating.minimumAge);
+    } else {
+      line += " " + (rating.label.empty() ? std::string("undefined") : rating.label) + Format(" (0x%02x)", rating.raw);
+      if (rating.label != std::to_string(rating.minimumAge)) line += Format(" [library: age %d]", rating.minimumAge);
+    }
     if (rating.content != 0) line += Format(" content 0x%x", rating.content);
   }
   std::fprintf(out, "%s (event 0x%04x)\n", line.c_str(), event.eventId);
@@ -126,9 +134,14 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
       for (unsigned int f : ts.frequencies) line += Format(" %.3f MHz (%u)", f / 7.0, f);
       std::fprintf(out, "%s\n", line.c_str());
     }
-    if (!ts.partialReception.empty()) {
+    if (!ts.partialReception.empty() || !ts.libraryPartialReception.empty()) {
       line = "    partial reception:";
-      for (int id : ts.partialReception) line += Format(" 0x%02x", id);
+      for (int id : ts.partialReception) line += Format(" 0x%04x", id);
+      if (ts.partialReception != ts.libraryPartialReception) {
+        line += " [library reads";
+        for (int id : ts.libraryPartialReception) line += Format(" 0x%02x", id);
+        line += "]";
+      }
       std::fprintf(out, "%s\n", line.c_str());
     }
     if (!ts.serviceList.empty()) {
@@ -164,6 +177,49 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
       PrintEvent(out, "present:", service.present, s.textCoding);
       PrintEvent(out, "following:", service.following, s.textCoding);
     }
+  }
+
+  std::fprintf(out, "Services of every transport stream (%zu, from the SDT actual and other):\n", s.allServices.size());
+  for (const SdtService& service : s.allServices) {
+    std::string line = Format("  network 0x%04x TS 0x%04x service 0x%04x%s", service.originalNetworkId,
+                              service.transportStreamId, service.id, service.actual ? " (this stream)" : "");
+    if (service.originalNetworkId != service.libraryOriginalNetworkId) {
+      line += Format(" [library reads network 0x%04x]", service.libraryOriginalNetworkId);
+    }
+    if (service.type >= 0) line += Format(" %s (0x%02x)", ServiceTypeName(service.type), service.type);
+    if (!service.name.empty()) line += " " + Quoted(service.name, s.textCoding);
+    std::fprintf(out, "%s\n", line.c_str());
+  }
+  std::fprintf(out, "Programme guide: %zu events of %zu services (shown by --epg)\n", s.epg.size(), EpgServiceCount(s.epg));
+  for (const BitSummary& bit : s.bits) {
+    std::string line = Format("BIT of network 0x%04x version %d, broadcaster view propriety %d", bit.originalNetworkId,
+                              bit.version, bit.viewPropriety ? 1 : 0);
+    for (const auto& d : bit.descriptors) line += Format(", descriptor 0x%02x (%d bytes)", d.first, d.second);
+    std::fprintf(out, "%s\n", line.c_str());
+    for (const BroadcasterSummary& broadcaster : bit.broadcasters) {
+      line = Format("  broadcaster 0x%02x", broadcaster.id);
+      for (const auto& d : broadcaster.descriptors) line += Format(", descriptor 0x%02x (%d bytes)", d.first, d.second);
+      std::fprintf(out, "%s\n", line.c_str());
+    }
+  }
+  std::fprintf(out, "Stream descriptors (%zu):\n", s.streamDescriptors.size());
+  for (const StreamDescriptorSummary& d : s.streamDescriptors) {
+    std::string line = Format("  PID %s id 0x%04x version %d: %s (tag 0x%02x, %zu bytes)", Pid(d.pid).c_str(),
+                              d.extension, d.version, d.name.c_str(), d.tag, d.length);
+    if (d.eventId >= 0) {
+      line += Format(" event 0x%04x at NPT %lld, private data ", d.eventId, d.npt) +
+              Quoted(d.privateData, TextCoding::kAsBroadcast);
+    } else if (d.stc >= 0) {
+      line += Format(" STC %lld = NPT %lld, scale %d/%d", d.stc, d.npt, d.scaleNumerator, d.scaleDenominator);
+    }
+    std::fprintf(out, "%s\n", line.c_str());
+  }
+  std::fprintf(out, "Tables without a class in the library (%zu):\n", s.tablesWithoutClass.size());
+  for (const UnclassedTableSummary& t : s.tablesWithoutClass) {
+    std::string where = t.pid < 0 ? std::string() : " on PID " + Pid(t.pid);
+    std::fprintf(out, "  %s%s: table_id 0x%02x, id 0x%04x, version %d, %zu sections, %zu bytes, seen %llu times\n",
+                 t.name.empty() ? "other" : t.name.c_str(), where.c_str(), t.tableId, t.extension, t.version, t.sections,
+                 t.bytes, static_cast<unsigned long long>(t.timesSeen));
   }
 
   if (s.time.valid) {
@@ -226,6 +282,58 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
       std::fprintf(out, "%s\n", line.c_str());
     }
     for (const std::string& problem : c.problems) std::fprintf(out, "  problem: %s\n", problem.c_str());
+  }
+}
+
+std::size_t EpgServiceCount(const std::vector<EpgEvent>& events) {
+  std::size_t count = 0;
+  for (std::size_t i = 0; i < events.size(); ++i) {
+    const EpgEvent& a = events[i];
+    count += i == 0 || a.originalNetworkId != events[i - 1].originalNetworkId ||
+             a.transportStreamId != events[i - 1].transportStreamId || a.serviceId != events[i - 1].serviceId;
+  }
+  return count;
+}
+
+void PrintEpgText(const Summary& s, std::FILE* out) {
+  std::fprintf(out, "Programme guide: %zu events of %zu services (times in UTC%s)\n", s.epg.size(),
+               EpgServiceCount(s.epg), UtcOffsetText(s.utcOffsetMinutes).c_str());
+  const EpgEvent* previous = nullptr;
+  for (const EpgEvent& e : s.epg) {
+    bool newService = previous == nullptr || previous->originalNetworkId != e.originalNetworkId ||
+                      previous->transportStreamId != e.transportStreamId || previous->serviceId != e.serviceId;
+    if (newService) {
+      std::string name = ServiceNameOf(s, e.originalNetworkId, e.transportStreamId, e.serviceId);
+      std::fprintf(out, "Service 0x%04x%s of TS 0x%04x, network 0x%04x (%s)\n", e.serviceId,
+                   name.empty() ? "" : (" " + Quoted(name, s.textCoding)).c_str(), e.transportStreamId,
+                   e.originalNetworkId, e.Actual() ? "this stream" : "other stream");
+    }
+    if (newService || previous->start.year != e.start.year || previous->start.month != e.start.month ||
+        previous->start.day != e.start.day) {
+      std::fprintf(out, "  %s\n", e.start.valid ? Format("%04d-%02d-%02d", e.start.year, e.start.month, e.start.day).c_str()
+                                                 : "(no start time)");
+    }
+    previous = &e;
+    DateTime end = EventEnd(e);
+    std::string line = e.start.valid ? Format("    %02d:%02d-%02d:%02d", e.start.hour, e.start.minute, end.hour, end.minute)
+                                     : std::string("    --:-----:--");
+    line += " " + (e.name.empty() ? std::string("(no name)") : Quoted(e.name, s.textCoding));
+    line += Format(" (event 0x%04x, table 0x%02x)", e.eventId, e.tableId);
+    for (const EpgGenre& genre : e.genres) {
+      line += Format(" genre 0x%x%x", genre.level1, genre.level2);
+      if (!genre.name.empty()) line += " " + genre.name;
+    }
+    for (const EpgRating& rating : e.ratings) {
+      line += " rating " + EscapeBytes(rating.country) + " " + (rating.label.empty() ? "?" : rating.label) +
+              Format(" (0x%02x)", rating.raw);
+    }
+    std::fprintf(out, "%s\n", line.c_str());
+    if (!e.text.empty()) std::fprintf(out, "      %s\n", OneLineText(e.text, s.textCoding).c_str());
+    for (const auto& item : e.items) {
+      std::fprintf(out, "      %s: %s\n", OneLineText(item.first, s.textCoding).c_str(),
+                   OneLineText(item.second, s.textCoding).c_str());
+    }
+    if (!e.extendedText.empty()) std::fprintf(out, "      %s\n", OneLineText(e.extendedText, s.textCoding).c_str());
   }
 }
 

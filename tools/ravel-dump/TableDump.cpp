@@ -3,6 +3,7 @@
 
 #include "Output.h"
 #include "Ravel_CTableBase.h"
+#include "TableNames.h"
 
 namespace ravel_dump {
 namespace {
@@ -88,6 +89,28 @@ class JoinedTable {
   std::unique_ptr<RavelCTableBase> copy_;
 };
 
+// A table the library has no class for, as its bytes: offset, 16 bytes in
+// hex, and those that are printable ASCII.
+void HexDump(const TableEntry& table, std::FILE* out) {
+  for (const auto& kv : table.sections) {
+    const StoredSection& section = kv.second;
+    std::fprintf(out, "  %s section %u, %zu bytes:\n", TableName(table).c_str(), kv.first, section.Size());
+    const uint8_t* bytes = section.Bytes();
+    for (std::size_t row = 0; row < section.Size(); row += 16) {
+      std::string hex, ascii;
+      for (std::size_t i = row; i < row + 16; ++i) {
+        char text[4] = "   ";
+        if (i < section.Size()) {
+          std::snprintf(text, sizeof text, " %02x", bytes[i]);
+          ascii += bytes[i] >= 0x20 && bytes[i] < 0x7F ? static_cast<char>(bytes[i]) : '.';
+        }
+        hex += text;
+      }
+      std::fprintf(out, "    %04zx %s  |%s|\n", row, hex.c_str(), ascii.c_str());
+    }
+  }
+}
+
 }  // namespace
 
 void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, std::FILE* out) {
@@ -98,7 +121,8 @@ void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, 
     joined.reset(new JoinedTable(table));
   }
   line += joined->refused;
-  if (joined->Empty() && joined->refused.empty()) line += " (no class in the library for this table_id)";
+  const bool withoutClass = joined->Empty() && joined->refused.empty();
+  if (withoutClass) line += " (no class in the library for this table_id)";
   std::fprintf(out, "%s\n", line.c_str());
   if (!joined->Empty()) {
     TraceOutput::ShowScope show(trace, out);
@@ -107,6 +131,7 @@ void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, 
   // The next line (the tool's own) starts on a line of its own, even after
   // a dump whose last line was left open.
   if (!trace.ShowEndedLine()) std::fputc('\n', out);
+  if (withoutClass) HexDump(table, out);
 }
 
 void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out) {

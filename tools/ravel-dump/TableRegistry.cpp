@@ -19,6 +19,10 @@ uint64_t HashBytes(const uint8_t* data, std::size_t size) {
 
 namespace {
 
+// Stream-event tables kept after a newer version replaced them: each version
+// is a few events, and a live input sending new ones for hours stays bounded.
+const std::size_t kReplacedStreamEvents = 64;
+
 // Section numbers a table announces. EIT sections are numbered by segments of
 // eight (ETSI EN 300 468 5.2.4): a segment runs from its first number to the
 // segment_last_section_number its sections carry; a segment not seen yet is
@@ -107,6 +111,10 @@ TableEntry* TableRegistry::NewEntry(const Key& key, int pid, TableKind kind, con
     latest_.erase(keys_[slot]);
     entry->order = slot;
     entry->firstSeen = tables_[slot]->firstSeen;
+    if (tables_[slot]->kind == kRavelKindStreamEvents) {
+      replacedStreamEvents_.push_back(std::move(tables_[slot]));
+      if (replacedStreamEvents_.size() > kReplacedStreamEvents) replacedStreamEvents_.pop_front();
+    }
     tables_[slot] = std::move(entry);
     keys_[slot] = key;
     latest_[key] = slot;
@@ -154,18 +162,41 @@ TableRegistry::Place TableRegistry::Locate(int pid, const uint8_t* section,
   return place;
 }
 
+void TableRegistry::Count(TableEntry& table, StoredSection& stored) {
+  ++arrivals_;
+  last_ = &table;
+  table.lastSeen = arrivals_;
+  ++stored.seen;
+}
+
 bool TableRegistry::CountRepeat(int pid, const uint8_t* section, std::size_t size) {
+  // A section is at most 4096 bytes and a PID (kNoPid included) fits in 14
+  // bits: PID, size and CRC_32 make one key.
+  const bool keyed = RavelCSafeSection::CarriesCrc(section) && size >= 4;
+  const uint64_t key = keyed ? (static_cast<uint64_t>(pid + 1) << 45) | (static_cast<uint64_t>(size) << 32) |
+                                   RavelRead32(section + size - 4)
+                             : 0;
+  if (keyed) {
+    auto known = repeats_.find(key);
+    if (known != repeats_.end()) {
+      StoredSection& stored = *known->second.stored;
+      if (stored.Size() == size && std::memcmp(stored.Bytes(), section, size) == 0) {
+        Count(*known->second.table, stored);
+        return true;
+      }
+    }
+  }
   Place place = Locate(pid, section, size);
   if (!place.same) return false;
-  ++arrivals_;
-  last_ = place.table;
-  place.table->lastSeen = arrivals_;
-  ++place.table->sections[place.number].seen;
+  StoredSection& stored = place.table->sections[place.number];
+  Count(*place.table, stored);
+  if (keyed) repeats_[key] = Repeat{place.table, &stored};
   return true;
 }
 
 StoredSection& TableRegistry::Add(int pid, TableKind kind, std::unique_ptr<RavelCSafeSection> parsed,
                                   RavelSafeResult result) {
+  if (!repeats_.empty()) repeats_.clear();
   ++arrivals_;
   Place place = Locate(pid, parsed->GetData(), static_cast<std::size_t>(parsed->GetDataSize()));
   TableEntry* table = place.table;

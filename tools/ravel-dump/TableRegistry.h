@@ -12,6 +12,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <deque>
 #include <map>
 #include <memory>
 #include <tuple>
@@ -75,6 +76,9 @@ class TableRegistry {
   StoredSection& Add(int pid, TableKind kind, std::unique_ptr<RavelCSafeSection> parsed, RavelSafeResult result);
 
   const std::vector<std::unique_ptr<TableEntry>>& Tables() const { return tables_; }
+  // Stream-event tables a newer version replaced, oldest first: the events
+  // each version carried stay in the summary, the oldest dropped past a cap.
+  const std::deque<std::unique_ptr<TableEntry>>& ReplacedStreamEvents() const { return replacedStreamEvents_; }
   // The table the last section counted or kept went to.
   const TableEntry& LastTable() const { return *last_; }
   uint64_t SectionsAdded() const { return arrivals_; }
@@ -108,6 +112,17 @@ class TableRegistry {
   std::unordered_map<Key, std::size_t, KeyHash> latest_;
   uint64_t arrivals_ = 0;
   const TableEntry* last_ = nullptr;
+  std::deque<std::unique_ptr<TableEntry>> replacedStreamEvents_;
+
+  // Where a repeat was counted, by PID, size and CRC_32: the same bytes again
+  // find the same place with one look-up, until a section is added (which may
+  // start a new table for them).
+  struct Repeat {
+    TableEntry* table;
+    StoredSection* stored;
+  };
+  std::unordered_map<uint64_t, Repeat> repeats_;
+  void Count(TableEntry& table, StoredSection& stored);
 };
 
 // 64-bit FNV-1a of a byte run: the identity of a section's contents.

@@ -24,6 +24,7 @@
 #include "StopSignal.h"
 #include "TimeBase.h"
 #include "TraceOutput.h"
+#include "Xmltv.h"
 
 namespace {
 
@@ -130,11 +131,11 @@ bool ReadTransportStream(InputFile& input, const Options& options, Demux& demux,
   summary.resyncs = reader.Resyncs();
   summary.bytes = reader.Offset();
   // Damage costs only the bytes it spoils: what was read before and after it stands.
+  // A stop request ends the input where it is, inside a packet or not.
   for (const std::string& line : reader.Damage()) {
-    // A stop request ends the input where it is, inside a packet or not.
     if (!StopRequested()) stats.Problem(line);
   }
-  if (!reader.Error().empty()) {
+  if (!reader.Error().empty() && !StopRequested()) {
     if (reader.Packets() == 0) {
       error = reader.Error();
       return false;
@@ -238,6 +239,7 @@ int main(int argc, char** argv) {
   // write them leaves no half output behind.
   Summary summary;
   bool wantSummary = options.mode == OutputMode::kSummary || options.mode == OutputMode::kJson ||
+                     options.mode == OutputMode::kEpg || !options.xmltvFile.empty() ||
                      !options.extractDirectory.empty() || !options.filesDirectory.empty();
   if (wantSummary) {
     summary = BuildSummary(capture.Registry(), capture.Carousel(), trace);
@@ -265,6 +267,10 @@ int main(int argc, char** argv) {
       }
     }
   }
+  summary.report = FiguresOf(inputSummary, stats, capture.Registry());
+  if (!options.xmltvFile.empty() && !WriteXmltv(options.xmltvFile, summary, error)) {
+    return Fail(error);
+  }
   switch (options.mode) {
     case OutputMode::kDump:
       events->End(capture.Registry());
@@ -276,6 +282,9 @@ int main(int argc, char** argv) {
       break;
     case OutputMode::kJson:
       std::fputs(SummaryJson(summary).c_str(), stdout);
+      break;
+    case OutputMode::kEpg:
+      PrintEpgText(summary, stdout);
       break;
     case OutputMode::kNone:
       for (const CarouselSummary& carousel : summary.carousels) {

@@ -8,24 +8,14 @@
 
 #include "Ravel_CString.h"
 
+// The text bytes are read through the read window of the parse in progress:
+// bytes beyond the section read as 0, and the text keeps its declared count.
+
 // Owned string object: count + 1 bytes from new[], handed to the string.
-inline void RavelText_SetString(RavelCString& target, const unsigned char* text, int count) {
-  if (count < 0) count = 0;
-  char* buffer = new char[count + 1];
-  if (count > 0) std::memcpy(buffer, text, static_cast<std::size_t>(count));
-  buffer[count] = '\0';
-  target.SetMemAllocedString(buffer);
-}
+void RavelText_SetString(RavelCString& target, const unsigned char* text, int count);
 
 // Owned C text: count + 1 bytes from malloc, released with free.
-inline char* RavelText_NewCText(const unsigned char* text, int count) {
-  if (count < 0) count = 0;
-  char* buffer = static_cast<char*>(std::malloc(static_cast<std::size_t>(count) + 1));
-  if (buffer == 0) return 0;
-  if (count > 0) std::memcpy(buffer, text, static_cast<std::size_t>(count));
-  buffer[count] = '\0';
-  return buffer;
-}
+char* RavelText_NewCText(const unsigned char* text, int count);
 
 // The copy of an owned C text made by assignment: strlen, malloc, strcpy.
 inline char* RavelText_DuplicateCText(const char* text) {
@@ -42,9 +32,6 @@ inline void RavelText_FreeCText(char*& text) {
 }
 
 // ISO 639-2 language code: 3 bytes and a 0, no case folding or validation.
-inline void RavelText_SetLanguageCode(char (&target)[4], const unsigned char* code) {
-  std::memcpy(target, code, 3);
-  target[3] = '\0';
-}
+void RavelText_SetLanguageCode(char (&target)[4], const unsigned char* code);
 
 #endif
