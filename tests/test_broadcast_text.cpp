@@ -3,6 +3,8 @@
 // in the broadcast's time base.
 #include <gtest/gtest.h>
 
+#include <unistd.h>
+
 #include <cstdio>
 #include <fstream>
 #include <string>
@@ -50,7 +52,8 @@ std::string SdtFileNaming(const std::string& name) {
   Bytes descriptor = sb::Descriptor(0x48, sb::Cat({sb::U8(0x01), sb::U8(0), sb::U8(name.size()), sb::Text(name)}));
   Bytes service = sb::Cat({sb::U16(0x0101), sb::U8(0xFD), sb::U16(0x8000 | descriptor.size()), descriptor});
   Bytes section = sb::LongSection(options, sb::Cat({sb::U16(0x0001), sb::U8(0xFF), service}));
-  std::string path = testing::TempDir() + "ravel_broadcast_text.sections";
+  // One file per test process: ctest runs tests side by side.
+  std::string path = testing::TempDir() + "ravel_broadcast_text_" + std::to_string(getpid()) + ".sections";
   std::ofstream(path.c_str(), std::ios::binary)
       .write(reinterpret_cast<const char*>(section.data()), static_cast<std::streamsize>(section.size()));
   return path;
