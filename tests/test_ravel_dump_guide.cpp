@@ -167,7 +167,7 @@ TEST_F(RavelDumpGuideTest, EveryJsonOutputMatchesTheSchema) {
     ASSERT_EQ(0, run.status) << c.input << run.err;
     std::ofstream(Path("out.json")) << run.out;
     EXPECT_EQ(0, Shell(validate + Path("out.json") + " " RAVEL_DUMP_SCHEMA)) << c.input;
-    EXPECT_EQ(1, json::parse(run.out)["schema_version"]) << c.input;
+    EXPECT_EQ(2, json::parse(run.out)["schema_version"]) << c.input;
   }
   // The check itself fails a document the schema does not describe.
   std::ofstream(Path("bad.json")) << "{\"schema_version\": 1}";

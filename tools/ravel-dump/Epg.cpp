@@ -46,12 +46,15 @@ DateTime FromDays(long days, long secondOfDay) {
   return t;
 }
 
-// start_time: 16-bit MJD and six BCD digits; all ones when undefined.
-DateTime StartTime(const uint8_t* p) {
+}  // namespace
+
+DateTime BroadcastDateTime(const uint8_t* p) {
   if (p[0] == 0xFF && p[1] == 0xFF && p[2] == 0xFF && p[3] == 0xFF && p[4] == 0xFF) return DateTime();
   const long mjd = (p[0] << 8) | p[1];
   return FromDays(mjd - kMjdOfUnixEpoch, Bcd(p[2]) * 3600L + Bcd(p[3]) * 60L + Bcd(p[4]));
 }
+
+namespace {
 
 std::string Bytes(const uint8_t* p, std::size_t n) { return std::string(reinterpret_cast<const char*>(p), n); }
 
@@ -168,7 +171,7 @@ void ReadSection(const uint8_t* s, std::size_t size, bool brazil, std::vector<Ep
     event.transportStreamId = (s[8] << 8) | s[9];
     event.originalNetworkId = (s[10] << 8) | s[11];
     event.eventId = (e[0] << 8) | e[1];
-    event.start = StartTime(e + 2);
+    event.start = BroadcastDateTime(e + 2);
     event.duration.hours = Bcd(e[7]);
     event.duration.minutes = Bcd(e[8]);
     event.duration.seconds = Bcd(e[9]);

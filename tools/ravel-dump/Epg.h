@@ -17,6 +17,10 @@ namespace ravel_dump {
 // ordered by service (network, stream, service) and start time.
 std::vector<EpgEvent> BuildEpg(const TableRegistry& registry, bool brazil);
 
+// A date and time as broadcast (16-bit MJD, then six BCD digits), read by
+// the calendar; all ones (undefined) gives an invalid one.
+DateTime BroadcastDateTime(const uint8_t* mjdAndBcd);
+
 // The end of an event: its start plus its duration.
 DateTime EventEnd(const EpgEvent& event);
 

@@ -14,7 +14,8 @@
 
 namespace ravel_dump {
 
-// Dates and times as the library decodes them (its date rule included).
+// A date and time: as broadcast, read by the calendar, or as the library
+// decodes it (its date rule included, which can give a 32nd day).
 struct DateTime {
   bool valid = false;
   int year = 0, month = 0, day = 0, hour = 0, minute = 0, second = 0;
@@ -37,7 +38,8 @@ struct Rating {
 struct EventSummary {
   bool valid = false;
   int eventId = 0;
-  DateTime start;
+  DateTime start;         // as broadcast
+  DateTime libraryStart;  // as the library reads it
   Duration duration;
   int runningStatus = 0;
   std::string language;  // of the short event
@@ -94,14 +96,16 @@ struct LocalOffset {
   int regionId = 0;
   int polarity = 0;
   int offsetHours = 0, offsetMinutes = 0;
-  DateTime timeOfChange;
+  DateTime timeOfChange;         // as broadcast
+  DateTime libraryTimeOfChange;  // as the library reads it
   int nextHours = 0, nextMinutes = 0;
 };
 
 struct TimeSummary {
   bool valid = false;
   std::string source;  // "TOT" or "TDT"
-  DateTime time;
+  DateTime time;         // as broadcast
+  DateTime libraryTime;  // as the library reads it
   std::vector<LocalOffset> offsets;
 };
 
@@ -284,7 +288,7 @@ struct Summary {
 void PrintSummaryText(const Summary& summary, std::FILE* out);
 // The JSON's layout is described by ravel-dump.schema.json; its version
 // changes with every change of that layout.
-const int kSummarySchemaVersion = 1;
+const int kSummarySchemaVersion = 2;
 std::string SummaryJson(const Summary& summary);
 // The programme guide per service and day (--epg).
 void PrintEpgText(const Summary& summary, std::FILE* out);

@@ -1,5 +1,6 @@
 // The summary, from the latest version of each table read, through the
 // objects the library made of its sections when they arrived.
+#include <algorithm>
 #include <cstring>
 #include <map>
 #include <tuple>
@@ -300,7 +301,8 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
   EventSummary event;
   event.valid = true;
   event.eventId = info.iEventId;
-  event.start = MakeDateTime(info.cStartTime);
+  event.libraryStart = MakeDateTime(info.cStartTime);
+  event.start = event.libraryStart;  // until the guide's reading of the bytes replaces it
   event.duration.hours = info.iDurationHour;
   event.duration.minutes = info.iDurationMinute;
   event.duration.seconds = info.iDurationSecond;
@@ -323,10 +325,11 @@ EventSummary MakeEvent(RavelCEventInfo& info) {
   return event;
 }
 
-// The rating bytes as broadcast, from the guide's reading of the same event.
-void AddBroadcastRatings(const std::vector<EpgEvent>& epg, int tableId, int serviceId, EventSummary& event) {
+// The start and rating bytes as broadcast, from the guide's reading of the same event.
+void AddBroadcastReading(const std::vector<EpgEvent>& epg, int tableId, int serviceId, EventSummary& event) {
   for (const EpgEvent& e : epg) {
     if (e.tableId != tableId || e.serviceId != serviceId || e.eventId != event.eventId) continue;
+    event.start = e.start;
     for (std::size_t i = 0; i < event.ratings.size() && i < e.ratings.size(); ++i) {
       event.ratings[i].raw = e.ratings[i].raw;
       event.ratings[i].label = e.ratings[i].label;
@@ -348,10 +351,34 @@ void AddEvents(const TableRegistry& registry, Summary& summary) {
       RavelCEIT& eit = Held<RavelCEIT>(kv.second);
       if (eit.aEventInfo.iCount == 0) continue;
       EventSummary event = MakeEvent(*eit.aEventInfo.ipArray[0]);
-      AddBroadcastRatings(summary.epg, table->tableId, service.id, event);
+      AddBroadcastReading(summary.epg, table->tableId, service.id, event);
       (kv.first == 0 ? service.present : service.following) = event;
     }
   }
+}
+
+// The TDT's or TOT's time as broadcast (bytes 3 to 7), and the times of change
+// of the TOT's local time offsets, in the order of its descriptor loop.
+const std::size_t kTimeOffset = 3, kTimeSize = 5, kTotLoopOffset = 10, kLocalOffsetSize = 13, kTimeOfChange = 6;
+const uint8_t kLocalTimeOffsetTag = 0x58;
+
+DateTime BroadcastTime(const TableEntry& table) {
+  const StoredSection& section = table.sections.begin()->second;
+  return section.Size() >= kTimeOffset + kTimeSize ? BroadcastDateTime(section.Bytes() + kTimeOffset) : DateTime();
+}
+
+std::vector<DateTime> BroadcastTimesOfChange(const TableEntry& tot) {
+  std::vector<DateTime> times;
+  const StoredSection& section = tot.sections.begin()->second;
+  const uint8_t* bytes = section.Bytes();
+  if (section.Size() < kTotLoopOffset) return times;
+  const std::size_t loop = std::min<std::size_t>(((bytes[8] & 0x0F) << 8) | bytes[9], section.Size() - kTotLoopOffset);
+  EachDescriptor(bytes + kTotLoopOffset, loop, [&](uint8_t tag, const uint8_t* body, std::size_t length) {
+    if (tag != kLocalTimeOffsetTag) return;
+    for (std::size_t at = 0; at + kLocalOffsetSize <= length; at += kLocalOffsetSize)
+      times.push_back(BroadcastDateTime(body + at + kTimeOfChange));
+  });
+  return times;
 }
 
 // The broadcast time: the latest TOT (with the local time offset), else the latest TDT.
@@ -361,7 +388,9 @@ void AddTime(const TableRegistry& registry, Summary& summary) {
     EachSection<RavelCTOT>(*table, [&](RavelCTOT& tot) {
       time.valid = true;
       time.source = "TOT";
-      time.time = MakeDateTime(tot.iYear, tot.iMonth, tot.iDay, tot.iHour, tot.iMinute, tot.iSecond);
+      time.libraryTime = MakeDateTime(tot.iYear, tot.iMonth, tot.iDay, tot.iHour, tot.iMinute, tot.iSecond);
+      time.time = BroadcastTime(*table);
+      const std::vector<DateTime> changes = BroadcastTimesOfChange(*table);
       if (RavelCLocalTimeOffsetDescriptor* offsets = tot.pLocalTimeOffsetDescriptor) {
         for (int i = 0; i < offsets->aLocalTimeOffsets.iCount; ++i) {
           const RavelCLocalTimeOffset* entry = offsets->aLocalTimeOffsets.ipArray[i];
@@ -371,7 +400,8 @@ void AddTime(const TableRegistry& registry, Summary& summary) {
           o.polarity = entry->iLocalTimeOffsetPolarity;
           o.offsetHours = entry->iLocalTimeOffsetHour;
           o.offsetMinutes = entry->iLocalTimeOffsetMinute;
-          o.timeOfChange = MakeDateTime(entry->cTimeOfChange);
+          o.libraryTimeOfChange = MakeDateTime(entry->cTimeOfChange);
+          if (static_cast<std::size_t>(i) < changes.size()) o.timeOfChange = changes[i];
           o.nextHours = entry->iNextTimeOffsetHour;
           o.nextMinutes = entry->iNextTimeOffsetMinute;
           time.offsets.push_back(o);
@@ -384,7 +414,8 @@ void AddTime(const TableRegistry& registry, Summary& summary) {
     EachSection<RavelCTDT>(*table, [&](RavelCTDT& tdt) {
       time.valid = true;
       time.source = "TDT";
-      time.time = MakeDateTime(tdt.iYear, tdt.iMonth, tdt.iDay, tdt.iHour, tdt.iMinute, tdt.iSecond);
+      time.libraryTime = MakeDateTime(tdt.iYear, tdt.iMonth, tdt.iDay, tdt.iHour, tdt.iMinute, tdt.iSecond);
+      time.time = BroadcastTime(*table);
     });
   }
 }

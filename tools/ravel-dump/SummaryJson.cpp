@@ -2,7 +2,10 @@
 // in the summary's coding, line breaks kept; with --raw-text, and for the
 // application and carousel names and paths, bytes are escaped as in the text output (\xNN for control bytes and
 // bytes that are not UTF-8), so the document is valid UTF-8 whatever the
-// broadcast's character coding. Times carry the broadcast's time base.
+// broadcast's character coding. Times are ISO 8601 in the broadcast's time base, as
+// broadcast; the library's own reading stands beside them where it differs.
+#include <tuple>
+
 #include <nlohmann/json.hpp>
 
 #include "ByteText.h"
@@ -19,13 +22,20 @@ json Text(const std::string& text, TextCoding coding) { return DecodeBroadcastTe
 
 json Bytes(const std::string& bytes) { return EscapeBytes(bytes); }
 
-json When(const DateTime& t, int utcOffsetMinutes) {
-  if (!t.valid) return nullptr;
-  return json{{"year", t.year}, {"month", t.month}, {"day", t.day},   {"hour", t.hour},
-              {"minute", t.minute}, {"second", t.second}, {"iso8601", Iso8601(t, utcOffsetMinutes)}};
-}
-
 json OrNull(const std::string& text) { return text.empty() ? json(nullptr) : json(text); }
+
+json When(const DateTime& t, int utcOffsetMinutes) { return OrNull(Iso8601(t, utcOffsetMinutes)); }
+
+// The library's own reading of a time (its date rule can give a 32nd day),
+// where it differs from the broadcast's.
+json LibraryWhen(const DateTime& library, const DateTime& broadcast) {
+  const auto fields = [](const DateTime& t) {
+    return std::make_tuple(t.valid, t.year, t.month, t.day, t.hour, t.minute, t.second);
+  };
+  if (!library.valid || fields(library) == fields(broadcast)) return nullptr;
+  return json{{"year", library.year},     {"month", library.month},   {"day", library.day},
+              {"hour", library.hour},     {"minute", library.minute}, {"second", library.second}};
+}
 
 json Pid(int pid) { return pid < 0 ? json(nullptr) : json(pid); }
 
@@ -40,6 +50,7 @@ json Event(const EventSummary& e, const Summary& s) {
                        {"minimum_age", r.minimumAge}});
   return json{{"event_id", e.eventId},
               {"start", When(e.start, s.utcOffsetMinutes)},
+              {"library_start", LibraryWhen(e.libraryStart, e.start)},
               {"duration", {{"hours", e.duration.hours}, {"minutes", e.duration.minutes},
                             {"seconds", e.duration.seconds}}},
               {"running_status", e.runningStatus},
@@ -170,9 +181,13 @@ std::string SummaryJson(const Summary& s) {
                          {"polarity", o.polarity},
                          {"offset", {{"hours", o.offsetHours}, {"minutes", o.offsetMinutes}}},
                          {"time_of_change", When(o.timeOfChange, s.utcOffsetMinutes)},
+                         {"library_time_of_change", LibraryWhen(o.libraryTimeOfChange, o.timeOfChange)},
                          {"next_offset", {{"hours", o.nextHours}, {"minutes", o.nextMinutes}}}});
     }
-    time = {{"source", s.time.source}, {"time", When(s.time.time, s.utcOffsetMinutes)}, {"local_time_offsets", offsets}};
+    time = {{"source", s.time.source},
+            {"time", When(s.time.time, s.utcOffsetMinutes)},
+            {"library_time", LibraryWhen(s.time.libraryTime, s.time.time)},
+            {"local_time_offsets", offsets}};
   }
 
   json applications = json::array();

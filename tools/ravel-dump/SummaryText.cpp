@@ -41,7 +41,7 @@ void PrintEvent(std::FILE* out, const char* label, const EventSummary& event, Te
     std::fprintf(out, "    %-10s (none)\n", label);
     return;
   }
-  std::string line = Format("    %-10s %s for %02d:%02d:%02d ", label, When(event.start).c_str(),
+  std::string line = Format("    %-10s %s for %02d:%02d:%02d ", label, When(event.libraryStart).c_str(),
                             event.duration.hours, event.duration.minutes, event.duration.seconds);
   line += event.name.empty() ? std::string("(no name)") : Quoted(event.name, coding);
   for (const Rating& rating : event.ratings) {
@@ -223,12 +223,12 @@ void PrintSummaryText(const Summary& s, std::FILE* out) {
   }
 
   if (s.time.valid) {
-    std::fprintf(out, "Time: %s (%s)\n", When(s.time.time).c_str(), s.time.source.c_str());
+    std::fprintf(out, "Time: %s (%s)\n", When(s.time.libraryTime).c_str(), s.time.source.c_str());
     for (const LocalOffset& o : s.time.offsets) {
       char sign = o.polarity ? '-' : '+';
       std::fprintf(out, "  local time offset %s region %d: %c%02d:%02d, changes %s to %c%02d:%02d\n",
                    EscapeBytes(o.country).c_str(), o.regionId, sign, o.offsetHours, o.offsetMinutes,
-                   When(o.timeOfChange).c_str(), sign, o.nextHours, o.nextMinutes);
+                   When(o.libraryTimeOfChange).c_str(), sign, o.nextHours, o.nextMinutes);
     }
   } else {
     std::fputs("Time: (no TDT or TOT)\n", out);
