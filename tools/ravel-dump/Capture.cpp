@@ -17,7 +17,7 @@ std::string Where(int pid, const uint8_t* section) {
 
 }  // namespace
 
-Capture::Capture(Stats& stats) : stats_(stats), demux_(nullptr) { carousel_.SetListener(&objects_); }
+Capture::Capture(Stats& stats, TraceOutput& trace) : stats_(stats), trace_(trace), demux_(nullptr) { carousel_.SetListener(&objects_); }
 
 void Capture::SetEvents(LiveEvents* events) {
   events_ = events;
@@ -36,7 +36,12 @@ void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   }
   // The one parse of these bytes: the library checks them, then its class parses them.
   std::unique_ptr<RavelCSafeSection> parsed(new RavelCSafeSection);
-  RavelSafeResult result = parsed->Parse(section, static_cast<int>(size));
+  std::vector<SkippedDescriptor> skipped;
+  RavelSafeResult result;
+  {
+    TraceOutput::SkipRecordScope record(trace_, skipped);
+    result = parsed->Parse(section, static_cast<int>(size));
+  }
   switch (result) {
     case kRavelSafeOk:
     case kRavelSafeRefused:
@@ -58,6 +63,8 @@ void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   ++kindStats.sections;
   ++kindStats.distinct;
   StoredSection& stored = registry_.Add(pid, kind, std::move(parsed), result);
+  MeasureSkippedDescriptors(kind, section, size, skipped);
+  stored.skipped = std::move(skipped);
   if (result == kRavelSafeOk) {
     UseOnArrival(pid, kind, *stored.parsed, demux_, carousel_);
   }

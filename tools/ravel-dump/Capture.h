@@ -16,12 +16,14 @@
 #include "ObjectCarousel.h"
 #include "Stats.h"
 #include "TableRegistry.h"
+#include "TraceOutput.h"
 
 namespace ravel_dump {
 
 class Capture : public SectionSink {
  public:
-  explicit Capture(Stats& stats);
+  // `trace` tells which descriptors the library skips as it parses.
+  Capture(Stats& stats, TraceOutput& trace);
 
   // The demultiplexer of a transport stream; null for a file of sections.
   void SetDemux(Demux* demux) { demux_ = demux; }
@@ -38,6 +40,7 @@ class Capture : public SectionSink {
 
  private:
   Stats& stats_;
+  TraceOutput& trace_;
   Demux* demux_;
   LiveEvents* events_ = nullptr;
   TableRegistry registry_;

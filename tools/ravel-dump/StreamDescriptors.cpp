@@ -4,6 +4,7 @@
 #include <set>
 #include <tuple>
 
+#include "DescriptorNames.h"
 #include "Output.h"
 #include "SectionBytes.h"
 
@@ -18,16 +19,9 @@ long long Bits33(const uint8_t* p) {
          (p[3] << 8) | p[4];
 }
 
-const char* DescriptorName(int tag) {
-  switch (tag) {
-    case 0x17: return "NPT reference";
-    case 0x18: return "NPT endpoint";
-    case 0x19: return "stream mode";
-    case 0x1A: return "stream event";
-    case 0x40: return "general event";
-    default: return "descriptor";
-  }
-}
+// In a stream descriptor section, tag 0x40 is the general event descriptor
+// (ABNT NBR 15606-3), not the SI's network name.
+const uint8_t kGeneralEventTag = 0x40;
 
 StreamDescriptorSummary Read(const TableEntry& table, int tag, const uint8_t* body, std::size_t length) {
   StreamDescriptorSummary d;
@@ -35,7 +29,7 @@ StreamDescriptorSummary Read(const TableEntry& table, int tag, const uint8_t* bo
   d.extension = table.extension;
   d.version = table.version;
   d.tag = tag;
-  d.name = DescriptorName(tag);
+  d.name = tag == kGeneralEventTag ? std::string("general event") : DescriptorName(static_cast<uint8_t>(tag));
   d.length = length;
   if (tag == 0x1A && length >= 10) {
     d.eventId = (body[0] << 8) | body[1];

@@ -1,6 +1,7 @@
 // The default output: every distinct table's own dump, in the order first seen.
 #include <string>
 
+#include "DescriptorNames.h"
 #include "Output.h"
 #include "Ravel_CTableBase.h"
 #include "TableNames.h"
@@ -111,6 +112,17 @@ void HexDump(const TableEntry& table, std::FILE* out) {
   }
 }
 
+// The descriptors the library skipped in the table, which its dump leaves out.
+void ListSkipped(const TableEntry& table, std::FILE* out) {
+  for (const SkippedCount& c : TableSkipped(table)) {
+    const SkippedDescriptor& d = c.descriptor;
+    std::fprintf(out, "  skipped descriptor 0x%02x (%s), length %s", d.tag, DescriptorName(d.tag).c_str(),
+                 d.length < 0 ? "unknown" : std::to_string(d.length).c_str());
+    if (c.times > 1) std::fprintf(out, ", %zu times", c.times);
+    std::fputc('\n', out);
+  }
+}
+
 }  // namespace
 
 void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, std::FILE* out) {
@@ -132,6 +144,7 @@ void DumpTable(const TableEntry& table, TableMoment moment, TraceOutput& trace, 
   // a dump whose last line was left open.
   if (!trace.ShowEndedLine()) std::fputc('\n', out);
   if (withoutClass) HexDump(table, out);
+  ListSkipped(table, out);
 }
 
 void DumpTables(const TableRegistry& registry, const TableFilter& filter, TraceOutput& trace, std::FILE* out) {

@@ -1,5 +1,7 @@
 #include "TableNames.h"
 
+#include <algorithm>
+
 namespace ravel_dump {
 
 std::string TableIdName(uint8_t tableId) {
@@ -28,6 +30,20 @@ std::string TableIdName(uint8_t tableId) {
 std::string TableName(const TableEntry& table) {
   std::string name = table.kind == kRavelKindOther ? TableIdName(table.tableId) : std::string();
   return name.empty() ? std::string(RavelCSafeSection::GetKindName(table.kind)) : name;
+}
+
+std::vector<SkippedCount> TableSkipped(const TableEntry& table) {
+  std::vector<SkippedCount> counts;
+  for (const auto& kv : table.sections) {
+    for (const SkippedDescriptor& d : kv.second.skipped) {
+      auto same = std::find_if(counts.begin(), counts.end(), [&](const SkippedCount& c) {
+        return c.descriptor.tag == d.tag && c.descriptor.length == d.length;
+      });
+      if (same == counts.end()) same = counts.insert(counts.end(), SkippedCount{d, 0});
+      ++same->times;
+    }
+  }
+  return counts;
 }
 
 bool WithoutClass(const TableEntry& table) {

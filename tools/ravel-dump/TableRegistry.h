@@ -20,6 +20,7 @@
 #include <vector>
 
 #include "Ravel_CSafeSection.h"
+#include "SkippedDescriptors.h"
 #include "TableKind.h"
 
 namespace ravel_dump {
@@ -32,6 +33,7 @@ struct StoredSection {
   RavelSafeResult result = kRavelSafeOk;      // kRavelSafeOk, kRavelSafeRefused or kRavelSafeUnknownTable
   uint64_t hash = 0;  // content identity: size and CRC_32, or a hash of the bytes
   uint64_t seen = 0;
+  std::vector<SkippedDescriptor> skipped;  // as the library told at its parse
 
   const uint8_t* Bytes() const { return parsed->GetData(); }
   std::size_t Size() const { return static_cast<std::size_t>(parsed->GetDataSize()); }

@@ -28,6 +28,13 @@ TraceOutput::QuietScope::QuietScope(TraceOutput& trace) : trace_(trace), previou
 
 TraceOutput::QuietScope::~QuietScope() { trace_.quiet_ = previous_; }
 
+TraceOutput::SkipRecordScope::SkipRecordScope(TraceOutput& trace, std::vector<SkippedDescriptor>& skipped)
+    : trace_(trace), previous_(trace.skipped_) {
+  trace_.skipped_ = &skipped;
+}
+
+TraceOutput::SkipRecordScope::~SkipRecordScope() { trace_.skipped_ = previous_; }
+
 void TraceOutput::OnTrace(unsigned int mask, const char* file, int line, const char* text, void* context) {
   TraceOutput* self = static_cast<TraceOutput*>(context);
   if (self->showOut_ != nullptr && (mask & kTraceLevels) == kTraceLevelDump) {
@@ -39,6 +46,8 @@ void TraceOutput::OnTrace(unsigned int mask, const char* file, int line, const c
     }
     return;
   }
+  SkippedDescriptor skipped;
+  if (self->skipped_ != nullptr && ReadSkippedDescriptorTrace(text, skipped)) self->skipped_->push_back(skipped);
   if (!self->quiet_ && (mask & self->levels_ & kTraceLevels) != 0) {
     // One trace per line here, whether or not the text ends its line itself.
     std::string escaped = EscapeTraceText(text);

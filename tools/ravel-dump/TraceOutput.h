@@ -7,7 +7,10 @@
 #include <cstdio>
 #include <string>
 
+#include <vector>
+
 #include "BroadcastText.h"
+#include "SkippedDescriptors.h"
 
 namespace ravel_dump {
 
@@ -42,6 +45,18 @@ class TraceOutput {
   // last line open).
   bool ShowEndedLine() const { return showEndedLine_; }
 
+  // While alive, the descriptors the library tells it skips go to `skipped`:
+  // for the one parse of each distinct section.
+  class SkipRecordScope {
+   public:
+    SkipRecordScope(TraceOutput& trace, std::vector<SkippedDescriptor>& skipped);
+    ~SkipRecordScope();
+
+   private:
+    TraceOutput& trace_;
+    std::vector<SkippedDescriptor>* previous_;
+  };
+
   // While alive, traces are dropped: for the parses that build the outputs,
   // whose traces were shown (with --trace) when the sections first arrived.
   class QuietScope {
@@ -63,6 +78,7 @@ class TraceOutput {
   std::FILE* showOut_;
   bool showEndedLine_;
   bool quiet_;
+  std::vector<SkippedDescriptor>* skipped_ = nullptr;
   TextCoding textCoding_ = TextCoding::kAsBroadcast;
 };
 

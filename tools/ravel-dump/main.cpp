@@ -173,7 +173,7 @@ int main(int argc, char** argv) {
     return Fail(input.Name() + ": a file of raw sections, where --pid does not apply");
   }
 
-  Capture capture(stats);
+  Capture capture(stats, trace);
   // Tables and events go out as they happen; the summaries wait for the end.
   std::unique_ptr<LiveEvents> events;
   if (options.mode == OutputMode::kDump || options.mode == OutputMode::kJsonLines) {
