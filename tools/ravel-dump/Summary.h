@@ -219,6 +219,19 @@ struct UnclassedTableSummary {
   uint64_t timesSeen = 0;
 };
 
+// A descriptor the library skipped, for each table it was skipped in.
+struct SkippedDescriptorSummary {
+  std::string table;  // the table's name
+  int tableId = 0;
+  int pid = -1;
+  int extension = 0;
+  int version = 0;
+  int tag = 0;
+  std::string name;
+  int length = -1;  // -1 where unknown
+  std::size_t times = 0;
+};
+
 // The final report's figures, for the JSON.
 struct KindFigures {
   std::string kind;
@@ -281,6 +294,7 @@ struct Summary {
   std::vector<BitSummary> bits;
   std::vector<StreamDescriptorSummary> streamDescriptors;
   std::vector<UnclassedTableSummary> tablesWithoutClass;
+  std::vector<SkippedDescriptorSummary> skippedDescriptors;
   ReportFigures report;
   std::vector<EpgEvent> epg;
 };

@@ -25,6 +25,7 @@
 #include "Ravel_CTableSDT.h"
 #include "Ravel_CTableTDT.h"
 #include "Ravel_CTableTOT.h"
+#include "DescriptorNames.h"
 #include "Epg.h"
 #include "SectionBytes.h"
 #include "StandardDetection.h"
@@ -512,6 +513,24 @@ void AddTablesWithoutClass(const TableRegistry& registry, Summary& summary) {
   }
 }
 
+void AddSkippedDescriptors(const TableRegistry& registry, Summary& summary) {
+  for (const auto& entry : registry.Tables()) {
+    for (const SkippedCount& c : TableSkipped(*entry)) {
+      SkippedDescriptorSummary d;
+      d.table = TableName(*entry);
+      d.tableId = entry->tableId;
+      d.pid = entry->pid;
+      d.extension = entry->extension;
+      d.version = entry->version;
+      d.tag = c.descriptor.tag;
+      d.name = DescriptorName(c.descriptor.tag);
+      d.length = c.descriptor.length;
+      d.times = c.times;
+      summary.skippedDescriptors.push_back(d);
+    }
+  }
+}
+
 }  // namespace
 
 ReportFigures FiguresOf(const InputSummary& input, const Stats& stats, const TableRegistry& registry) {
@@ -560,6 +579,7 @@ Summary BuildSummary(const TableRegistry& registry, const CarouselCollector& car
   AddApplications(registry, summary);
   AddAllServices(registry, summary);
   AddTablesWithoutClass(registry, summary);
+  AddSkippedDescriptors(registry, summary);
   AddBits(registry, summary);
   summary.streamDescriptors = BuildStreamDescriptors(registry);
   summary.carousels = carousel.Summarize();

@@ -297,6 +297,19 @@ std::string SummaryJson(const Summary& s) {
                          {"times_seen", t.timesSeen}});
   }
 
+  json skipped = json::array();
+  for (const SkippedDescriptorSummary& d : s.skippedDescriptors) {
+    skipped.push_back({{"table", d.table},
+                       {"table_id", d.tableId},
+                       {"pid", Pid(d.pid)},
+                       {"id", d.extension},
+                       {"version", d.version},
+                       {"tag", d.tag},
+                       {"name", d.name},
+                       {"length", d.length < 0 ? json(nullptr) : json(d.length)},
+                       {"times", d.times}});
+  }
+
   json document = {{"schema_version", kSummarySchemaVersion},
                    {"standard", s.standard},
                    {"standard_reason", s.standardReason},
@@ -313,6 +326,7 @@ std::string SummaryJson(const Summary& s) {
                    {"stream_descriptors", streamDescriptors},
                    {"epg", epg},
                    {"tables_without_class", unclassed},
+                   {"skipped_descriptors", skipped},
                    {"report", ReportJson(s.report)}};
   return document.dump(2) + "\n";
 }
