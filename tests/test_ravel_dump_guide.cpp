@@ -254,6 +254,65 @@ TEST_F(RavelDumpGuideTest, TablesWithoutAClassAreNamedAndDumpedAsBytes) {
       << dump.out;
 }
 
+// A TOT of the broadcast's time, its local time offset changing at the same
+// moment, and a descriptor of a tag no standard assigns.
+Bytes Tot(int year, int month, int day) {
+  Bytes offset = sb::Cat({sb::Text("BRA"), {0x06, 0x03, 0x00}, sb::UtcTime(year, month, day, 12, 34, 56), {0x02, 0x00}});
+  return sb::ShortSection(
+      0x73,
+      sb::Cat({sb::UtcTime(year, month, day, 12, 34, 56),
+               sb::DescriptorLoop({sb::Descriptor(0x58, offset), sb::Descriptor(0x9F, {0x01, 0x02})})}),
+      /*withCrc=*/true);
+}
+
+TEST_F(RavelDumpGuideTest, TimesAreIso8601AsBroadcastWithTheLibrarysOwnReadingBeside) {
+  struct Case {
+    int year, month, day;
+    const char* iso;
+    json library;  // null where the library reads the same
+  } cases[] = {
+      {/*year=*/2024, /*month=*/5, /*day=*/14, /*iso=*/"2024-05-14T12:34:56-03:00", /*library=*/nullptr},
+      // The library's date rule gives 1 January 2013 as 32 December 2012.
+      {/*year=*/2013, /*month=*/1, /*day=*/1, /*iso=*/"2013-01-01T12:34:56-03:00",
+       /*library=*/{{"year", 2012}, {"month", 12}, {"day", 32}, {"hour", 12}, {"minute", 34}, {"second", 56}}},
+  };
+  for (const Case& c : cases) {
+    const std::string file = Write("tot.sections", Tot(c.year, c.month, c.day));
+    ToolRun run = Run({"-q", "--json", "--standard", "brazil", file});
+    ASSERT_EQ(0, run.status) << run.err;
+    const json time = json::parse(run.out)["time"];
+    ExpectMembers({{"time", c.iso}, {"library_time", c.library}}, time);
+    ExpectMembers({{"time_of_change", c.iso}, {"library_time_of_change", c.library}}, time["local_time_offsets"][0]);
+  }
+}
+
+TEST_F(RavelDumpGuideTest, DefaultDumpListsTheDescriptorsTheLibrarySkips) {
+  struct Case {
+    std::string input;
+    const char* listed;
+  } cases[] = {
+      {/*input=*/RAVEL_SAMPLES_DIR "/oneseg-brazil.ts",
+       /*listed=*/"#################################################\n"
+                  "  skipped descriptor 0xd7 (SI parameter), length 13\n"
+                  "  skipped descriptor 0xd8 (broadcaster name), length 12\n== DDB"},
+      {Write("tot.sections", Tot(2024, 5, 14)), "  skipped descriptor 0x9f (unknown descriptor), length 2\n"},
+      {captures::Path("isdbt-japan-psi.sections"),
+       "  skipped descriptor 0x09 (conditional access), length 4\n"
+       "  skipped descriptor 0xf6 (access control), length 4, 3 times\n"
+       "  skipped descriptor 0xc1 (digital copy control), length 1\n"
+       "  skipped descriptor 0xc8 (video decode control), length 1\n== PMT"},
+  };
+  for (const Case& c : cases) {
+    if (c.input.empty()) continue;  // a shared capture that is absent
+    ToolRun dump = Run({"-q", c.input});
+    ASSERT_EQ(0, dump.status) << dump.err;
+    EXPECT_NE(std::string::npos, dump.out.find(c.listed)) << c.input;
+  }
+  const json sample = json::parse(Run({"-q", "--json", RAVEL_SAMPLES_DIR "/oneseg-brazil.ts"}).out);
+  ExpectMembers({{"table", "BIT"}, {"pid", 0x24}, {"tag", 0xD7}, {"name", "SI parameter"}, {"length", 13}, {"times", 1}},
+                sample["skipped_descriptors"][0]);
+}
+
 }  // namespace
 
 #endif  // RAVEL_DUMP_PATH
