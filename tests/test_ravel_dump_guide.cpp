@@ -43,6 +43,17 @@ class RavelDumpGuideTest : public RavelDumpTest {
   }
 };
 
+// A TOT of the broadcast's time, its local time offset changing at the same
+// moment, and a descriptor of a tag no standard assigns.
+Bytes Tot(int year, int month, int day) {
+  Bytes offset = sb::Cat({sb::Text("BRA"), {0x06, 0x03, 0x00}, sb::UtcTime(year, month, day, 12, 34, 56), {0x02, 0x00}});
+  return sb::ShortSection(
+      0x73,
+      sb::Cat({sb::UtcTime(year, month, day, 12, 34, 56),
+               sb::DescriptorLoop({sb::Descriptor(0x58, offset), sb::Descriptor(0x9F, {0x01, 0x02})})}),
+      /*withCrc=*/true);
+}
+
 TEST_F(RavelDumpGuideTest, GuideHoldsEveryEventOfPresentFollowingAndScheduleActualAndOther) {
   json summary = Json("dvb-epg.ts");
   if (summary.is_null()) GTEST_SKIP() << "shared capture dvb-epg.ts absent";
@@ -155,6 +166,7 @@ TEST_F(RavelDumpGuideTest, EveryJsonOutputMatchesTheSchema) {
       {captures::Path("stream-events-1.ts"), {}},
       {captures::Path("isdbt-japan-psi.sections"), {}},
       {captures::Path("isdb-signalling-mix.sections"), {"--raw-text"}},
+      {Write("tot.sections", Tot(2013, 1, 1)), {"--standard", "brazil"}},  // the library's own reading beside
   };
   const std::string validate =
       "python3 -c 'import json, sys, jsonschema; "
@@ -252,17 +264,6 @@ TEST_F(RavelDumpGuideTest, TablesWithoutAClassAreNamedAndDumpedAsBytes) {
                                              "    0000  c8 f0 0e 12 34 c1 00 00 56 78 9a f0 00 81 32 ba  |....4...Vx....2.|\n"
                                              "    0010  63                                               |c|\n"))
       << dump.out;
-}
-
-// A TOT of the broadcast's time, its local time offset changing at the same
-// moment, and a descriptor of a tag no standard assigns.
-Bytes Tot(int year, int month, int day) {
-  Bytes offset = sb::Cat({sb::Text("BRA"), {0x06, 0x03, 0x00}, sb::UtcTime(year, month, day, 12, 34, 56), {0x02, 0x00}});
-  return sb::ShortSection(
-      0x73,
-      sb::Cat({sb::UtcTime(year, month, day, 12, 34, 56),
-               sb::DescriptorLoop({sb::Descriptor(0x58, offset), sb::Descriptor(0x9F, {0x01, 0x02})})}),
-      /*withCrc=*/true);
 }
 
 TEST_F(RavelDumpGuideTest, TimesAreIso8601AsBroadcastWithTheLibrarysOwnReadingBeside) {
