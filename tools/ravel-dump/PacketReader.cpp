@@ -32,12 +32,12 @@ const Format kFormats[] = {{188, 0}, {204, 0}, {192, 4}};
 }  // namespace
 
 PacketReader::PacketReader(InputFile& input)
-    : input_(input), buffer_(kChunk), pos_(0), end_(0), base_(0), eof_(false), stride_(188),
+    : input_(input), in_(kChunk), eof_(false), stride_(188),
       syncOffset_(0), packets_(0), skipped_(0), resyncs_(0) {}
 
 void PacketReader::Cut(std::size_t left) {
   skipped_ += left;
-  pos_ = end_;
+  in_.pos = in_.end;
   NoteDamage(input_.Name() + ": truncated: the input ends with " + std::to_string(left) +
          " bytes that do not make a whole packet");
 }
@@ -47,21 +47,11 @@ void PacketReader::NoteDamage(const std::string& line) {
 }
 
 bool PacketReader::Fill(std::size_t need) {
-  while (end_ - pos_ < need) {
+  while (in_.end - in_.pos < need) {
     if (eof_) return false;
-    if (pos_ > 0) {
-      std::memmove(buffer_.data(), buffer_.data() + pos_, end_ - pos_);
-      base_ += pos_;
-      end_ -= pos_;
-      pos_ = 0;
-    }
-    long long n = input_.Read(buffer_.data() + end_, buffer_.size() - end_, error_);
-    if (n < 0) {
-      eof_ = true;
-      return false;
-    }
-    if (n == 0) eof_ = true;
-    end_ += static_cast<std::size_t>(n);
+    const long long n = in_.Refill(input_, error_);
+    if (n <= 0) eof_ = true;
+    if (n < 0) return false;
   }
   return true;
 }
@@ -100,18 +90,18 @@ bool PacketReader::Start(std::string& error) {
   bool locked = false;
   for (std::size_t want = kFirstLook; !locked; want *= 2) {
     const bool more = Fill(std::min(want, kDetectWindow));
-    locked = end_ >= kFirstLook && FindLock(buffer_.data(), end_, syncAt, stride);
+    locked = in_.end >= kFirstLook && FindLock(in_.bytes.data(), in_.end, syncAt, stride);
     if (!more || want >= kDetectWindow) break;
   }
   if (!error_.empty()) {
     error = error_;
     return false;
   }
-  if (end_ == 0) {
+  if (in_.end == 0) {
     error = input_.Name() + ": empty input";
     return false;
   }
-  if (!locked && !FindLock(buffer_.data(), end_, syncAt, stride)) {
+  if (!locked && !FindLock(in_.bytes.data(), in_.end, syncAt, stride)) {
     error = input_.Name() +
             ": not a transport stream (no run of 0x47 sync bytes 188, 192 or 204 bytes apart) nor a file of raw "
             "sections (no chain of sections whose CRCs verify); --sections reads it as sections regardless";
@@ -119,18 +109,18 @@ bool PacketReader::Start(std::string& error) {
   }
   stride_ = stride;
   syncOffset_ = SyncOffset(stride);
-  pos_ = syncAt - syncOffset_;
-  skipped_ = pos_;
+  in_.pos = syncAt - syncOffset_;
+  skipped_ = in_.pos;
   return true;
 }
 
 bool PacketReader::RunAt(int stride, std::size_t syncOffset, bool whole) const {
-  const std::size_t left = end_ - pos_;
-  if (left < syncOffset + kPacket || buffer_[pos_ + syncOffset] != kSync) return false;
+  const std::size_t left = in_.end - in_.pos;
+  if (left < syncOffset + kPacket || in_.bytes[in_.pos + syncOffset] != kSync) return false;
   for (int k = 1; k < kResyncRun; ++k) {
     std::size_t at = syncOffset + k * static_cast<std::size_t>(stride);
     if (at >= left) return !whole;  // the input ends: the packets it holds decide
-    if (buffer_[pos_ + at] != kSync) return false;
+    if (in_.bytes[in_.pos + at] != kSync) return false;
   }
   return true;
 }
@@ -140,11 +130,11 @@ bool PacketReader::Resync() {
   // Room for a run at the largest packet size, whichever size the input goes on with.
   const std::size_t look = 4 + (kResyncRun - 1) * 204 + kPacket;
   for (;;) {
-    ++pos_;
+    ++in_.pos;
     ++skipped_;
     Fill(look);
     if (!error_.empty()) return false;
-    const std::size_t left = end_ - pos_;
+    const std::size_t left = in_.end - in_.pos;
     if (left < syncOffset_ + kPacket) {
       Cut(left);
       return false;
@@ -166,22 +156,22 @@ bool PacketReader::Resync() {
 const uint8_t* PacketReader::Next() {
   for (;;) {
     // Most packets are whole in the buffer already: no call to fill it.
-    if (end_ - pos_ < static_cast<std::size_t>(stride_) && !Fill(stride_)) {
+    if (in_.end - in_.pos < static_cast<std::size_t>(stride_) && !Fill(stride_)) {
       if (!error_.empty()) return nullptr;
-      std::size_t left = end_ - pos_;
-      if (left >= syncOffset_ + kPacket && buffer_[pos_ + syncOffset_] == kSync) {
+      std::size_t left = in_.end - in_.pos;
+      if (left >= syncOffset_ + kPacket && in_.bytes[in_.pos + syncOffset_] == kSync) {
         // A last 204-byte packet cut in its 16-byte trailer still has its 188 bytes.
-        const uint8_t* packet = buffer_.data() + pos_ + syncOffset_;
-        pos_ = end_;
+        const uint8_t* packet = in_.bytes.data() + in_.pos + syncOffset_;
+        in_.pos = in_.end;
         ++packets_;
         return packet;
       }
       NoteTruncation();
       return nullptr;
     }
-    if (buffer_[pos_ + syncOffset_] == kSync) {
-      const uint8_t* packet = buffer_.data() + pos_ + syncOffset_;
-      pos_ += stride_;
+    if (in_.bytes[in_.pos + syncOffset_] == kSync) {
+      const uint8_t* packet = in_.bytes.data() + in_.pos + syncOffset_;
+      in_.pos += stride_;
       ++packets_;
       return packet;
     }
@@ -190,11 +180,11 @@ const uint8_t* PacketReader::Next() {
 }
 
 void PacketReader::NoteTruncation() {
-  std::size_t left = end_ - pos_;
+  std::size_t left = in_.end - in_.pos;
   if (left == 0) return;
   // Damage, not a failure: the whole packets before it have been read.
   skipped_ += left;
-  pos_ = end_;
+  in_.pos = in_.end;
   NoteDamage(input_.Name() + ": truncated: the input ends inside a packet (" + std::to_string(left) + " of " +
              std::to_string(stride_) + " bytes)");
 }

@@ -12,6 +12,7 @@
 #include <vector>
 
 #include "Input.h"
+#include "InputBuffer.h"
 
 namespace ravel_dump {
 
@@ -37,7 +38,7 @@ class PacketReader {
   uint64_t SkippedBytes() const { return skipped_; }
   uint64_t Resyncs() const { return resyncs_; }
   // Bytes of the input consumed so far.
-  uint64_t Offset() const { return base_ + pos_; }
+  uint64_t Offset() const { return in_.base + in_.pos; }
 
   // Whether `data` holds a run of sync bytes for one of the packet sizes,
   // starting at `offset`; gives the size and the sync position's offset in it.
@@ -48,10 +49,10 @@ class PacketReader {
   static std::size_t SyncOffset(int stride) { return stride == 192 ? 4 : 0; }
 
  private:
-  // Makes `need` bytes from pos_ available; false when the input ends first.
+  // Makes `need` bytes from the read position available; false when the input ends first.
   bool Fill(std::size_t need);
   bool Resync();
-  // Whether a run of sync bytes `stride` apart starts at pos_ + `syncOffset`;
+  // Whether a run of sync bytes `stride` apart starts at the read position + `syncOffset`;
   // unless `whole`, a run cut by the end of the input counts as far as it goes.
   bool RunAt(int stride, std::size_t syncOffset, bool whole) const;
   // The input ends with `left` bytes that make no whole packet.
@@ -61,10 +62,7 @@ class PacketReader {
   void NoteDamage(const std::string& line);
 
   InputFile& input_;
-  std::vector<uint8_t> buffer_;
-  std::size_t pos_;
-  std::size_t end_;
-  uint64_t base_;
+  InputBuffer in_;
   bool eof_;
   int stride_;
   std::size_t syncOffset_;

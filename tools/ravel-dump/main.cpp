@@ -1,7 +1,6 @@
 // ravel-dump: reads a capture end to end through the section parser's public
 // interface, the way a receiver application does, and prints what it holds.
 #include <cstdio>
-#include <cstring>
 #include <memory>
 #include <string>
 #include <vector>
@@ -11,6 +10,7 @@
 #include "CaptureKind.h"
 #include "Demux.h"
 #include "Input.h"
+#include "InputBuffer.h"
 #include "LiveEvents.h"
 #include "Options.h"
 #include "Output.h"
@@ -60,51 +60,44 @@ bool ReadSections(InputFile& input, Capture& capture, Stats& stats, InputSummary
     error = input.Name() + ": a transport stream, not raw sections (drop --sections)";
     return false;
   }
-  std::vector<uint8_t> buffer(kSectionsChunk);
-  std::size_t pos = 0;
-  std::size_t end = 0;
-  uint64_t base = 0;  // input offset of buffer[0]
+  InputBuffer in(kSectionsChunk);
   uint64_t sections = 0;
   bool more = true;
   for (;;) {
-    while (pos < end && buffer[pos] == 0xFF) ++pos;
-    const std::size_t need = end - pos < 3 ? 3 : static_cast<std::size_t>(RavelSectionSize(buffer.data() + pos));
-    if (end - pos < need && more) {
-      // Too few bytes for the next section: keep what is left, read on.
-      std::memmove(buffer.data(), buffer.data() + pos, end - pos);
-      base += pos;
-      end -= pos;
-      pos = 0;
-      long long n = input.Read(buffer.data() + end, buffer.size() - end, error);
+    while (in.pos < in.end && in.bytes[in.pos] == 0xFF) ++in.pos;
+    const std::size_t left = in.end - in.pos;
+    const std::size_t need = left < 3 ? 3 : static_cast<std::size_t>(RavelSectionSize(in.bytes.data() + in.pos));
+    if (left < need && more) {
+      // Too few bytes for the next section: read on.
+      long long n = in.Refill(input, error);
       if (n < 0) {
         if (sections == 0) return false;
         stats.Problem(error);
         error.clear();
       }
       if (n <= 0) more = false;
-      end += n > 0 ? static_cast<std::size_t>(n) : 0;
       continue;
     }
-    if (pos == end) break;
-    if (end - pos < need) {
-      const std::string at = std::to_string(base + pos);
+    if (left == 0) break;
+    if (left < need) {
+      const std::string at = std::to_string(in.base + in.pos);
       if (sections == 0) {
         error = input.Name() + ": not a file of raw sections (the first would need " + std::to_string(need) +
-                " bytes, the input holds " + std::to_string(end - pos) + ")";
+                " bytes, the input holds " + std::to_string(left) + ")";
         return false;
       }
       // What came before the cut stands.
       stats.Problem(input.Name() + ": truncated: the section at byte " + at + " needs " + std::to_string(need) +
-                    " bytes, " + std::to_string(end - pos) + " are left");
-      pos = end;
+                    " bytes, " + std::to_string(left) + " are left");
+      in.pos = in.end;
       break;
     }
     ++sections;
     ++stats.sectionsAssembled;
-    capture.OnSection(kNoPid, buffer.data() + pos, need);
-    pos += need;
+    capture.OnSection(kNoPid, in.bytes.data() + in.pos, need);
+    in.pos += need;
   }
-  summary.bytes = base + pos;
+  summary.bytes = in.base + in.pos;
   uint64_t accepted = 0;
   for (const KindStats& k : stats.kinds) accepted += k.sections;
   if (sections > 0 && accepted == 0) {
