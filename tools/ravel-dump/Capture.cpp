@@ -17,7 +17,9 @@ std::string Where(int pid, const uint8_t* section) {
 
 }  // namespace
 
-Capture::Capture(Stats& stats, TraceOutput& trace) : stats_(stats), trace_(trace), demux_(nullptr) { carousel_.SetListener(&objects_); }
+Capture::Capture(Stats& stats, TraceOutput& trace) : stats_(stats), trace_(trace), demux_(nullptr) {
+  carousel_.SetListener(&objects_);
+}
 
 void Capture::SetEvents(LiveEvents* events) {
   events_ = events;
