@@ -198,6 +198,13 @@ class RavelCSafeSection {
   // The checks of a DSM-CC message of `count` bytes, by its message id:
   // kRavelSafeOk, or the result of the first check that fails.
   static RavelSafeResult CheckMessage(const unsigned char* message, int count);
+  // Told of a descriptor: its offset in the section, its tag and its length.
+  typedef void (*DescriptorVisit)(int offset, unsigned char tag, unsigned char length, void* context);
+  // Walks the descriptor loops of the section of `count` bytes the way its
+  // table's parse reads them, telling `visit` of each descriptor in that order.
+  // False when the table_id has no walk, the bytes end before the section or the
+  // walk refuses it; the descriptors before the refusal have been told.
+  static bool EachDescriptor(const unsigned char* section, int count, DescriptorVisit visit, void* context);
 
  private:
   RavelCSafeSection(const RavelCSafeSection&);

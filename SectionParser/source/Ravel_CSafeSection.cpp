@@ -451,6 +451,14 @@ RavelSafeResult RavelCSafeSection::CheckMessage(const unsigned char* message, in
   return refusal.eResult;
 }
 
+bool RavelCSafeSection::EachDescriptor(const unsigned char* section, int count, DescriptorVisit visit, void* context) {
+  if (section == 0 || count < 3 || count < RavelSectionSize(section)) return false;
+  int row = FindTableRow(section[0]);
+  if (row < 0 || kTableRows[row].pWalk == 0) return false;
+  RavelSafeRefusal refusal = Accepted();
+  return RavelCSectionWalk::Visit(kTableRows[row].pWalk, section, RavelSectionSize(section), visit, context, refusal);
+}
+
 RavelTableKind RavelCSafeSection::GetKind(const unsigned char* section, int count) {
   if (section == 0 || count < 1) return kRavelKindOther;
   int row = FindTableRow(section[0]);

@@ -9,6 +9,14 @@ const int kCrcSize = 4;
 const int kCarouselHeaderSize = 8;  // section header before the DSM-CC message
 const int kMessageHeaderSize = 12;  // through messageLength
 
+// The visit of the walk running on this thread, if any: the walks are plain
+// functions of one signature, so the visit rides beside them.
+struct DescriptorVisitor {
+  RavelCSafeSection::DescriptorVisit pVisit;
+  void* pContext;
+};
+thread_local DescriptorVisitor tVisitor = {0, 0};
+
 }  // namespace
 
 RavelCSectionWalk::RavelCSectionWalk(const unsigned char* bytes, int base, RavelSafeRefusal& refusal)
@@ -32,6 +40,7 @@ bool RavelCSectionWalk::Descriptors(int start, int end) {
     if (at + 2 > end) return Fail(kRavelSafeMalformed, "descriptor header cut by its loop's end", at);
     int next = at + 2 + pBytes[at + 1];
     if (next > end) return Fail(kRavelSafeMalformed, "descriptor runs past its loop's end", at);
+    if (tVisitor.pVisit != 0) tVisitor.pVisit(iBase + at, pBytes[at], pBytes[at + 1], tVisitor.pContext);
     at = next;
   }
   return true;
@@ -186,4 +195,14 @@ bool RavelCSectionWalk::MessageParts(int end, unsigned short messageId) {
     default:
       return Fail(kRavelSafeUnknownTable, "no class for this DSM-CC message id", 2);
   }
+}
+
+bool RavelCSectionWalk::Visit(Function walk, const unsigned char* section, int size,
+                              RavelCSafeSection::DescriptorVisit visit, void* context, RavelSafeRefusal& refusal) {
+  const DescriptorVisitor outer = tVisitor;
+  tVisitor.pVisit = visit;
+  tVisitor.pContext = context;
+  const bool walked = walk(section, size, refusal);
+  tVisitor = outer;
+  return walked;
 }

@@ -65,7 +65,7 @@ void Capture::OnSection(int pid, const uint8_t* section, std::size_t size) {
   ++kindStats.sections;
   ++kindStats.distinct;
   StoredSection& stored = registry_.Add(pid, kind, std::move(parsed), result);
-  MeasureSkippedDescriptors(kind, section, size, skipped);
+  MeasureSkippedDescriptors(section, size, skipped);
   stored.skipped = std::move(skipped);
   if (result == kRavelSafeOk) {
     UseOnArrival(pid, kind, *stored.parsed, demux_, carousel_);

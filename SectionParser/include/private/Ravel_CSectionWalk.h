@@ -31,6 +31,10 @@ class RavelCSectionWalk {
   static bool Message(const unsigned char* message, int end, unsigned short messageId, int base,
                       RavelSafeRefusal& refusal);
 
+  // Runs `walk` over the section, telling `visit` of each descriptor it passes.
+  static bool Visit(Function walk, const unsigned char* section, int size, RavelCSafeSection::DescriptorVisit visit,
+                    void* context, RavelSafeRefusal& refusal);
+
  private:
   RavelCSectionWalk(const unsigned char* bytes, int base, RavelSafeRefusal& refusal);
 
