@@ -299,12 +299,9 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
   ASSERT_NE(nullptr, event.pAudioComponentList);
 
   // A zero-length descriptor clears everything and frees the list itself.
-  {
-    TraceRecorder recorder;
-    EXPECT_EQ(kRavelErrCorruptSection, event.ParseRawData(broken.data()));
-    EXPECT_EQ((TraceLines{{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x54], descrLen=[0]\n"}}),
-              recorder.Lines());
-  }
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelErrCorruptSection, event.ParseRawData(broken.data()));
+  EXPECT_EQ((TraceLines{{kWarning, Invalid(0x54, 0)}}), recorder.Lines());
   EXPECT_EQ(nullptr, event.pAudioComponentList);
   EXPECT_EQ(nullptr, event.pShortEventDescriptor);
   EXPECT_EQ(0, event.iEventId);
@@ -314,11 +311,7 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
   EXPECT_EQ(nullptr, event.GetAudioComponent(0));
 
   // Without a list the event still dumps and copies; a copy gets a list of its own.
-  {
-    TraceRecorder recorder;
-    event.Show();
-    EXPECT_EQ(6u, recorder.Lines().size());
-  }
+  EXPECT_EQ(6u, ShowLines(event).size());
   RavelCEventInfo copy(event);
   EXPECT_NE(nullptr, copy.pAudioComponentList);
   EXPECT_EQ(0, copy.GetAudioComponentCount());
