@@ -682,44 +682,6 @@ TEST(EITShow, EmptyTableShowsAnUnknownName) {
 // ---------------------------------------------------------------------------
 // Real broadcasts
 
-TEST(EITCapture, JapanesePresentFollowingSections) {
-  Bytes file;
-  RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", file);
-  std::vector<Bytes> eits;
-  for (const Bytes& s : captures::SplitSections(file)) {
-    if (s[0] == 0x4E) eits.push_back(s);
-  }
-  ASSERT_EQ(4u, eits.size());
-  // Event id and what the event keeps, name aside; 0xC1, 0xC7 and 0xD6 are traced, not kept.
-  struct Case {
-    int eventId;
-    std::string kinds;
-  } cases[] = {
-      {0x0EDD, "content:0 component:0 audio:16 extended:0 "},
-      // Three extended event descriptors (numbers 0 to 2): the last one is kept.
-      {0x0EDE, "content:130 component:0 audio:16 audio:17 extended:2 "},
-      {0x0EDD, "content:0 component:0 audio:16 "},
-      {0x0EDE, "content:130 component:0 audio:16 audio:17 "},
-  };
-  for (size_t i = 0; i < eits.size(); ++i) {
-    SCOPED_TRACE(i);
-    TraceRecorder quiet;
-    RavelCEIT eit(nullptr);
-    ASSERT_EQ(kRavelOk, eit.ParseRawData(eits[i].data()));
-    ASSERT_EQ(1, eit.GetEventCount());
-    RavelCEventInfo* e = eit.GetEventInfo(0);
-    EXPECT_EQ(cases[i].eventId, e->iEventId);
-    const std::string holdings = Holdings(*e);
-    EXPECT_EQ(cases[i].kinds, holdings.substr(holdings.find(" content:") + 1));
-    EXPECT_STREQ("jpn", e->pShortEventDescriptor->GetLanguageCode());
-  }
-  // Present and following of one service join into one sorted table.
-  RavelCEIT following(eits[1].data());
-  RavelCEIT present(eits[0].data());
-  following += present;
-  EXPECT_EQ((std::vector<int>{0x0EDD, 0x0EDE}), EventIds(following));
-}
-
 TEST(EITCapture, DvbEpgSectionsParseExceptTheCorruptOne) {
   Bytes stream;
   RAVEL_LOAD_CAPTURE_OR_SKIP("dvb-epg.ts", stream);
