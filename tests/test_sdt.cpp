@@ -91,6 +91,8 @@ std::string Kept(RavelCServiceDescription& service) {
 
 }  // namespace
 
+// The entry constructor's initial flag values are never seen: every parse,
+// a null one included, writes all of them.
 TEST(ServiceDescription, DecodesFlagsAndStatusFromTheirOwnBits) {
   struct Case {
     Bytes entry;
