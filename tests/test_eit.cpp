@@ -165,12 +165,6 @@ std::string Holdings(RavelCEventInfo& e) {
   return s;
 }
 
-std::string HexToText(const std::string& hex) {
-  std::string out;
-  for (size_t i = 0; i + 1 < hex.size(); i += 2) out.push_back(static_cast<char>(std::stoi(hex.substr(i, 2), 0, 16)));
-  return out;
-}
-
 std::vector<unsigned int> FourFields(RavelCEIT& eit) {
   return {eit.iTransportStreamId, eit.iOriginalNetworkId, eit.iSegmentLastSectionNumber, eit.iLastTableId};
 }
@@ -191,15 +185,12 @@ TEST(EITEventFields, StartTimesFollowTheDateRuleAndBcdIsNotValidated) {
     int runningStatus;
     int freeCA;
   } cases[] = {
-      {"ordinary day", At(2020, 4, 5, 19, 0), Duration(0, 30), 0x8, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, {0, 30, 0}, 4, 0},
       {"leap day", At(2012, 2, 29, 23, 59, 59), Duration(1, 0, 5), 0x9, {2012, 2, 29, 23, 59, 59, 0, 0, 0}, {1, 0, 5}, 4, 1},
       {"1 January: previous year's 32 December", At(2013, 1, 1, 0, 0), Duration(0, 1), 0x2,
        {2012, 12, 32, 0, 0, 0, 0, 0, 0}, {0, 1, 0}, 1, 0},
-      {"2 January is right", At(2013, 1, 2, 6, 15), Duration(0, 1), 0x2, {2013, 1, 2, 6, 15, 0, 0, 0, 0}, {0, 1, 0}, 1, 0},
       {"1 March: 32 February", At(2013, 3, 1, 12, 0), Duration(2, 0), 0xE, {2013, 2, 32, 12, 0, 0, 0, 0, 0}, {2, 0, 0}, 7, 0},
       {"BCD digits unchecked", Bytes{0xE4, 0x89, 0x99, 0x9A, 0xFF}, Bytes{0xFF, 0x9A, 0x99}, 0x1,
        {2019, 1, 22, 99, 100, 165, 0, 0, 0}, {165, 100, 99}, 0, 1},
-      {"MJD 0 is not range-checked", Bytes(5, 0x00), Duration(0, 0), 0xF, {1859, -1, 19, 0, 0, 0, 0, 0, 0}, {0, 0, 0}, 7, 1},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
@@ -308,26 +299,19 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
   ASSERT_NE(nullptr, event.pAudioComponentList);
 
   // A zero-length descriptor clears everything and frees the list itself.
-  {
-    TraceRecorder recorder;
-    EXPECT_EQ(kRavelErrCorruptSection, event.ParseRawData(broken.data()));
-    EXPECT_EQ((TraceLines{{kWarning, "Invalid Descriptor Tag & Length!! descrTag=[0x54], descrLen=[0]\n"}}),
-              recorder.Lines());
-  }
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelErrCorruptSection, event.ParseRawData(broken.data()));
+  EXPECT_EQ((TraceLines{{kWarning, Invalid(0x54, 0)}}), recorder.Lines());
   EXPECT_EQ(nullptr, event.pAudioComponentList);
   EXPECT_EQ(nullptr, event.pShortEventDescriptor);
   EXPECT_EQ(0, event.iEventId);
-  EXPECT_EQ(TimeOf(RavelCDateTime()), TimeOf(event.cStartTime));
+  EXPECT_EQ(Ints(9, 0), TimeOf(event.cStartTime));
   EXPECT_EQ(0, event.iDescriptorsLoopLength);
   EXPECT_EQ(0, event.GetAudioComponentCount());
   EXPECT_EQ(nullptr, event.GetAudioComponent(0));
 
   // Without a list the event still dumps and copies; a copy gets a list of its own.
-  {
-    TraceRecorder recorder;
-    event.Show();
-    EXPECT_EQ(6u, recorder.Lines().size());
-  }
+  EXPECT_EQ(6u, ShowLines(event).size());
   RavelCEventInfo copy(event);
   EXPECT_NE(nullptr, copy.pAudioComponentList);
   EXPECT_EQ(0, copy.GetAudioComponentCount());
@@ -445,11 +429,6 @@ TEST(EITParse, AcceptsPresentFollowingTheFirstActualScheduleAndOtherSchedules) {
 }
 
 TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
-  EitOptions badCrcOptions;
-  badCrcOptions.corruptCrc = true;
-  badCrcOptions.tableId = 0x4F;
-  badCrcOptions.version = 9;
-  Bytes badCrc = EitSection(badCrcOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
   EitOptions otherOptions;
   otherOptions.tableId = 0x4F;
   otherOptions.version = 9;
@@ -457,13 +436,10 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
   Bytes zeroLength = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}),
                                                Ev(3, At(2020, 4, 5, 21, 0), {Bytes{0x4D, 0x00}})});
   Bytes zeroTag = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {Bytes{0x00, 0x03, 1, 2, 3}})});
-  Bytes badCrcAndTableId = EitSection([] {
-        EitOptions s;
-        s.tableId = 0x51;
-        s.corruptCrc = true;
-        return s;
-      }(),
-      {Ev(2, At(2020, 4, 5, 20, 0))});
+  otherOptions.corruptCrc = true;
+  Bytes badCrc = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
+  otherOptions.tableId = 0x51;
+  Bytes badCrcAndTableId = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
 
   struct Case {
     const char* label;
@@ -489,7 +465,6 @@ TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, eit.ParseRawData(c.section ? c.section->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
-    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableEIT", r.file);
     EXPECT_EQ(0, eit.GetEventCount());
     EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
     // Header and name of a section whose header was parsed stay; the others keep the earlier ones.
@@ -575,7 +550,6 @@ TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
                           {kError, "THIS: TS ID=[32464], Org Network ID=[32465], VersionNum=[4]\n"},
                           {kError, otherLine}}),
               recorder.Lines());
-    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableEIT", r.file);
     EXPECT_EQ((std::vector<int>{2, 1}), EventIds(target));  // not even sorted
   }
 }
@@ -708,120 +682,20 @@ TEST(EITShow, EmptyTableShowsAnUnknownName) {
 // ---------------------------------------------------------------------------
 // Real broadcasts
 
-TEST(EITCapture, JapanesePresentFollowingSections) {
-  Bytes file;
-  RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", file);
-  std::vector<Bytes> eits;
-  for (const Bytes& s : captures::SplitSections(file)) {
-    if (s[0] == 0x4E) eits.push_back(s);
-  }
-  ASSERT_EQ(4u, eits.size());
-
-  const std::string name0 = HexToText("0e4e484b1d4b1d65f91d39370f1b243b7a5a7a56");
-  const std::string name1 = HexToText(
-      "1d40f91b6f262373ac0f4d68bf212afb47484d70ce1b7ce9a4aaf333583160194b4078467e212a49343d43194e322619724d5c402e212a21"
-      "2afc1b243b7a5c7a56");
-  // The content descriptor reports its genres; 0xC1, 0xC7 and 0xD6 are not kept.
-  const std::vector<std::string> notKept = {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
-                                            "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xc7]\n",
-                                            "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xd6]\n"};
-  std::vector<std::string> genresA = {"raw genre = 0x0!\n", "raw genre = 0x1!\n", "raw genre = 0x10!\n"};
-  std::vector<std::string> genresB = {"raw genre = 0x82!\n", "raw genre = 0xa0!\n"};
-  genresA.insert(genresA.end(), notKept.begin(), notKept.end());
-  genresB.insert(genresB.end(), notKept.begin(), notKept.end());
-  struct Case {
-    unsigned int serviceId, version, sectionNumber;
-    int eventId;
-    Ints start;
-    std::string holdings;
-    std::vector<std::string> warnings;
-  } cases[] = {
-      {0x4800, 4, 0, 0x0EDD, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, "short:" + name0 + " content:0 component:0 audio:16 extended:0 ",
-       genresA},
-      // Three extended event descriptors (numbers 0 to 2): the last one is kept.
-      {0x4800, 4, 1, 0x0EDE, {2020, 4, 5, 19, 30, 0, 0, 0, 0},
-       "short:" + name1 + " content:130 component:0 audio:16 audio:17 extended:2 ", genresB},
-      {0x4801, 19, 0, 0x0EDD, {2020, 4, 5, 19, 0, 0, 0, 0, 0}, "short:" + name0 + " content:0 component:0 audio:16 ",
-       genresA},
-      {0x4801, 19, 1, 0x0EDE, {2020, 4, 5, 19, 30, 0, 0, 0, 0},
-       "short:" + name1 + " content:130 component:0 audio:16 audio:17 ", genresB},
-  };
-  for (size_t i = 0; i < eits.size(); ++i) {
-    const Case& c = cases[i];
-    SCOPED_TRACE(i);
-    RavelCEIT eit(nullptr);
-    TraceRecorder recorder;
-    ASSERT_EQ(kRavelOk, eit.ParseRawData(eits[i].data()));
-    EXPECT_EQ(At(kWarning, c.warnings), recorder.Lines());
-    EXPECT_STREQ("EIT Actual", eit.sTableName.GetString());
-    EXPECT_EQ((std::vector<unsigned int>{c.serviceId, c.version, c.sectionNumber}),
-              (std::vector<unsigned int>{eit.iTableIdExtension, eit.iVersionNumber, eit.iSectionNumber}));
-    EXPECT_EQ((std::vector<unsigned int>{0x7ED0, 0x7ED0, 1, 0x4E}), FourFields(eit));
-    ASSERT_EQ(1, eit.GetEventCount());
-    RavelCEventInfo* e = eit.GetEventInfo(0);
-    EXPECT_EQ(c.eventId, e->iEventId);
-    EXPECT_EQ(c.start, TimeOf(e->cStartTime));
-    EXPECT_EQ((Ints{0, 30, 0, 0, 0}),
-              (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond, e->iRunningStatus, e->bFreeCAMode}));
-    EXPECT_EQ(c.holdings, Holdings(*e));
-    EXPECT_STREQ("jpn", e->pShortEventDescriptor->GetLanguageCode());
-  }
-
-  // Present and following of one service join into one sorted table; the other
-  // service's version differs.
-  RavelCEIT following(eits[1].data());
-  RavelCEIT present(eits[0].data());
-  following += present;
-  EXPECT_EQ((std::vector<int>{0x0EDD, 0x0EDE}), EventIds(following));
-  RavelCEIT otherService(eits[2].data());
-  TraceRecorder recorder;
-  following += otherService;
-  EXPECT_EQ(3u, recorder.TextsAt(kError).size());
-  EXPECT_EQ(2, following.GetEventCount());
-}
-
 TEST(EITCapture, DvbEpgSectionsParseExceptTheCorruptOne) {
   Bytes stream;
   RAVEL_LOAD_CAPTURE_OR_SKIP("dvb-epg.ts", stream);
-  std::vector<Bytes> sections = captures::SectionsOfPid(stream, 0x12);
-
   std::map<std::pair<int, int>, int> results;  // (table_id, result) -> sections
+  std::vector<Bytes> sections = captures::SectionsOfPid(stream, 0x12);
   TraceRecorder recorder;
-  for (size_t i = 0; i < sections.size(); ++i) {
-    Bytes& section = sections[i];
-    bool goodCrc = RavelUtil_CheckSectionCRC32(section.data()) != 0;
+  for (Bytes& section : sections) {
     RavelCEIT eit(nullptr);
-    int result = eit.ParseRawData(section.data());
-    EXPECT_EQ(goodCrc ? kRavelOk : kRavelErrCorruptSection, result) << "section " << i;
-    ++results[{section[0], result}];
+    ++results[{section[0], eit.ParseRawData(section.data())}];
   }
   EXPECT_EQ((std::map<std::pair<int, int>, int>{{{0x4E, kRavelOk}, 597}, {{0x4E, kRavelErrCorruptSection}, 1},
                                                 {{0x4F, kRavelOk}, 636}, {{0x50, kRavelOk}, 205}}),
             results);
-  // DVB descriptors the receiver does not keep are traced and skipped; the one
-  // CRC error is the only failure.
+  // DVB descriptors the receiver does not keep are only traced.
   EXPECT_TRUE(recorder.TextsAt(kError).empty());
-  int crcErrors = 0;
-  for (const std::string& t : recorder.TextsAt(kWarning)) {
-    if (t == "EIT Section: CRC Error!\n") ++crcErrors;
-    EXPECT_EQ(std::string::npos, t.find("Parsing Fail"));
-    EXPECT_EQ(std::string::npos, t.find("Invalid Descriptor"));
-  }
-  EXPECT_EQ(1, crcErrors);
-
-  // The first section: EIT other of service 0x0A02, its first event as broadcast
-  // (the name starts with its DVB character table byte 0x05).
-  RavelCEIT first(sections[0].data());
-  ASSERT_GT(first.GetEventCount(), 0);
-  RavelCEventInfo* e = first.GetEventInfo(0);
-  EXPECT_STREQ("EIT Other", first.sTableName.GetString());
-  EXPECT_EQ(0x0A02, first.iTableIdExtension);
-  EXPECT_EQ(0x15, e->iEventId);
-  EXPECT_EQ((Ints{2019, 1, 22, 12, 0, 0, 0, 0, 0}), TimeOf(e->cStartTime));
-  EXPECT_EQ((Ints{1, 45, 0}), (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond}));
-  ASSERT_NE(nullptr, e->pShortEventDescriptor);
-  EXPECT_STREQ("fre", e->pShortEventDescriptor->GetLanguageCode());
-  EXPECT_EQ(std::string("\x05"
-                        "Biathlon"),
-            Str(e->pShortEventDescriptor->GetEventName()));
+  for (const std::string& t : recorder.TextsAt(kWarning)) EXPECT_EQ(std::string::npos, t.find("Invalid Descriptor"));
 }
