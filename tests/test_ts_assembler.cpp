@@ -401,27 +401,26 @@ TEST(TSPktEntry, StoresUpTo188BytesAndGivesThemOnce) {
                {300, 0, {{kError, "Too long data lenght=[300]\n"}}}};
   for (const Case& c : cases) {
     SCOPED_TRACE(c.len);
-    for (int viaSetData = 0; viaSetData < 2; ++viaSetData) {
-      TraceRecorder recorder;
-      RavelCPktEntry built(data.data(), c.len);
-      RavelCPktEntry set;
-      set.SetData(data.data(), c.len);
-      RavelCPktEntry& entry = viaSetData ? set : built;
-      EXPECT_EQ(c.stored, entry.iDataLen);
-      TraceLines twice = c.traces;
-      twice.insert(twice.end(), c.traces.begin(), c.traces.end());
-      EXPECT_EQ(twice, recorder.Lines());
+    TraceRecorder recorder;
+    RavelCPktEntry built(data.data(), c.len);
+    RavelCPktEntry set;
+    set.SetData(data.data(), c.len);
+    TraceLines twice = c.traces;
+    twice.insert(twice.end(), c.traces.begin(), c.traces.end());
+    EXPECT_EQ(twice, recorder.Lines());
+    for (RavelCPktEntry* entry : {&built, &set}) {
+      EXPECT_EQ(c.stored, entry->iDataLen);
       unsigned char copy[188];
       std::memset(copy, 0xEE, sizeof(copy));
       int count = -1;
-      EXPECT_EQ(c.stored, entry.GetData(copy, count));
+      EXPECT_EQ(c.stored, entry->GetData(copy, count));
       EXPECT_EQ(c.stored, count);
       EXPECT_EQ(0, std::memcmp(copy, data.data(), static_cast<size_t>(c.stored)));
       if (c.stored < 188) {
         EXPECT_EQ(0xEE, copy[c.stored]);
       }
-      EXPECT_EQ(0, entry.iDataLen);
-      EXPECT_EQ(0, entry.GetData(copy, count));
+      EXPECT_EQ(0, entry->iDataLen);
+      EXPECT_EQ(0, entry->GetData(copy, count));
       EXPECT_EQ(0, count);
     }
   }
