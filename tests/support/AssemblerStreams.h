@@ -14,6 +14,13 @@ namespace streams {
 
 const uint16_t kAssemblerPid = 0x0012;
 
+// Parts of a section as packets carry them.
+inline Bytes Head(const Bytes& b, std::size_t count) { return Bytes(b.begin(), b.begin() + count); }
+inline Bytes Tail(const Bytes& b, std::size_t from) { return Bytes(b.begin() + from, b.end()); }
+inline Bytes Mid(const Bytes& b, std::size_t from, std::size_t count) {
+  return Bytes(b.begin() + from, b.begin() + from + count);
+}
+
 // A long section of exactly `size` bytes (valid CRC, no 0xFF in its body).
 Bytes SectionOfSize(std::size_t size, unsigned int extension, uint8_t tableId = 0x4E);
 

@@ -67,10 +67,8 @@ Bytes UtcTime(int year, int month, int day, int hour, int minute, int second) {
 void FixCrc(Bytes& section) {
   if (section.size() < 4) return;
   unsigned int crc = RavelUtil_CRC32(0xFFFFFFFFu, section.data(), static_cast<unsigned int>(section.size() - 4));
-  section[section.size() - 4] = static_cast<uint8_t>(crc >> 24);
-  section[section.size() - 3] = static_cast<uint8_t>(crc >> 16);
-  section[section.size() - 2] = static_cast<uint8_t>(crc >> 8);
-  section[section.size() - 1] = static_cast<uint8_t>(crc);
+  const Bytes field = U32(crc);
+  std::copy(field.begin(), field.end(), section.end() - 4);
 }
 
 Bytes LongSection(const SectionOptions& o, const Bytes& body) {
@@ -123,20 +121,7 @@ Bytes PacketWriter::MakePacket(bool pusi, const Bytes& payload, uint8_t adaptati
   return p;
 }
 
-void PacketWriter::AddSection(const Bytes& section) {
-  size_t offset = 0;
-  bool first = true;
-  while (offset < section.size() || first) {
-    Bytes payload;
-    if (first) payload.push_back(0x00);
-    size_t room = 184 - payload.size();
-    size_t take = std::min(room, section.size() - offset);
-    payload.insert(payload.end(), section.begin() + offset, section.begin() + offset + take);
-    offset += take;
-    MakePacket(first, payload);
-    first = false;
-  }
-}
+void PacketWriter::AddSection(const Bytes& section) { AddPackedSections(std::vector<Bytes>{section}); }
 
 void PacketWriter::AddPackedSections(const std::vector<Bytes>& sections) {
   Bytes data = Cat(sections);
