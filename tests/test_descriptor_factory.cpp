@@ -130,7 +130,8 @@ const std::vector<ClassCase>& Classes() {
       {CLASS(RavelCCopyrightDescriptor), .displayName = "Copyright Descriptor", .wrongText = Wrong("Copyright Descriptor"),
        .banner = Banner("Copyright Descriptor", 21), .rich = Descriptor(0x0D, Cat({U32(0x80000001), Text("(C) TV")})),
        // The id goes through %d.
-       .richBody = Dump({"\t Copyright id: -2147483647 \n", "\t Copyright info: (C) TV \n"}), .pinEmptyBody = true, .emptyBody = {"\t Copyright id: 0 \n", "\t Copyright info: (null) \n"}},
+       .richBody = Dump({"\t Copyright id: -2147483647 \n", "\t Copyright info: (C) TV \n"}), .pinEmptyBody = true,
+       .emptyBody = {"\t Copyright id: 0 \n", "\t Copyright info: (null) \n"}},
       {CLASS(RavelCCountryAvailabilityDescriptor), .displayName = "Country Availabilty Descriptor",
        .wrongText = Wrong("Country Availability Descriptor"), .banner = Banner("Country Availability Descriptor", 21),
        .rich = Descriptor(0x49, Cat({U8(0x80), Text("BRAARG")})), .pinEmptyBody = true,

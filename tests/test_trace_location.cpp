@@ -49,7 +49,8 @@ TEST(TraceLocation, IsTheCallSiteOfTheTraceEvenThroughASharedHelper) {
   } cases[] = {
       // The message lies 8 bytes into its carousel section, as a receiver hands it.
       {.label = "a class's own trace",
-       .trigger = [] { Bytes s = Section(0x3B, sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1), sb::U8(0xFF), sb::U8(0), sb::U16(0)}));
+       .trigger = [] { Bytes s = Section(0x3B, sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1),
+                                                        sb::U8(0xFF), sb::U8(0), sb::U16(0)}));
                        RavelCDsmccBase message(s.data() + 8); },
        .text = "Unknown DSMCC Type!", .file = "SectionParser/source/Ravel_CDsmccMsgBase", .extension = ".cpp",
        .marker = "\"Unknown DSMCC Type!"},
