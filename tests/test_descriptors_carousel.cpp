@@ -18,6 +18,7 @@
 #include "Ravel_CDescriptorName.h"
 #include "Ravel_CDescriptorType.h"
 #include "Ravel_ResultCode.h"
+#include "DescriptorShow.h"
 #include "StreamBuilder.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
@@ -25,12 +26,6 @@
 using namespace th;
 
 namespace {
-
-// The lines after the banner and the base line.
-TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
-  TraceLines lines = ShowLines(descriptor);
-  return TraceLines(lines.begin() + 2, lines.end());
-}
 
 Bytes GeneralEvent(uint8_t timeMode, const Bytes& time5, uint8_t type, uint16_t id, const Bytes& privateData) {
   return sb::Descriptor(0x40, sb::Cat({Bytes{0xAB, 0xC0, timeMode}, time5, sb::U8(type), sb::U16(id), privateData}));

@@ -10,6 +10,7 @@
 #include "Ravel_CDescriptorLocalTimeOffset.h"
 #include "Ravel_CDescriptorParentalRating.h"
 #include "Ravel_Cfg.h"
+#include "DescriptorShow.h"
 #include "StreamBuilder.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
@@ -17,9 +18,6 @@
 using namespace th;
 
 namespace {
-
-// Zeros after a descriptor in its section: what a parse reading past its length takes in.
-Bytes FollowedByZeros(const Bytes& descriptor) { return InSection(descriptor, Bytes(64, 0x00)); }
 
 Bytes Rating(const char* country, uint8_t rating) { return sb::Cat({sb::Text(country), sb::U8(rating)}); }
 
@@ -102,7 +100,7 @@ TEST(ParentalRatingDescriptor, WalksFourByteEntriesAndShowsEachOne) {
   }
 }
 
-TEST(ParentalRatingEntry, NullParseIsRefusedAndKeepsTheEntry) {
+TEST(ParentalRatingEntry, NullParseIsRefusedAndKeepsTheEntryAndANullEntryIsEmpty) {
   StandardScope standard(RAVEL_STANDARD_BRAZIL);
   Bytes raw = Rating("BRA", 0x23);
   RavelCParentalRating entry(raw.data());
@@ -111,6 +109,10 @@ TEST(ParentalRatingEntry, NullParseIsRefusedAndKeepsTheEntry) {
   EXPECT_STREQ("BRA", entry.GetCountryCode());
   EXPECT_EQ(2, entry.GetContent());
   EXPECT_EQ(12, entry.GetMinimumAge());
+  // An entry built from nothing holds nothing.
+  RavelCParentalRating empty(nullptr);
+  EXPECT_EQ((std::vector<int>{0, 0}), (std::vector<int>{empty.GetContent(), empty.GetMinimumAge()}));
+  EXPECT_STREQ("", empty.GetCountryCode());
 }
 
 TEST(LocalTimeOffsetEntry, DecodesOffsetsAndTheTimeOfChangeByTheReceiversRules) {
@@ -162,15 +164,11 @@ TEST(LocalTimeOffsetEntry, DecodesOffsetsAndTheTimeOfChangeByTheReceiversRules) 
 TEST(LocalTimeOffsetEntry, NullParseClearsEveryField) {
   Bytes entryBytes = Offset("BRA", 0x17, 0x0300, sb::UtcTime(2013, 2, 17, 2, 30, 15), 0x0200);
   RavelCLocalTimeOffset entry(entryBytes.data());
-  ASSERT_STREQ("BRA", entry.GetCountryCode());
   EXPECT_EQ(kRavelErrInvalidArgument, entry.ParseRawData(nullptr));
   EXPECT_STREQ("", entry.GetCountryCode());
-  EXPECT_EQ(0, entry.GetCountryRegionId());
-  EXPECT_EQ(0, entry.GetLocalTimeOffsetPolarity());
-  EXPECT_EQ(0, entry.GetLocalTimeOffsetHour());
-  EXPECT_EQ(0, entry.GetTimeOfChange().iYear);
-  EXPECT_EQ(0, entry.GetTimeOfChange().iSecond);
-  EXPECT_EQ(0, entry.GetNextTimeOffsetHour());
+  EXPECT_EQ(std::vector<int>(6, 0), DateOf(entry.GetTimeOfChange()));
+  EXPECT_EQ(std::vector<int>(4, 0), (std::vector<int>{entry.GetCountryRegionId(), entry.GetLocalTimeOffsetPolarity(),
+                                                    entry.GetLocalTimeOffsetHour(), entry.GetNextTimeOffsetHour()}));
 }
 
 TEST(LocalTimeOffsetDescriptor, WalksThirteenByteEntries) {
@@ -210,29 +208,19 @@ TEST(LocalTimeOffsetDescriptor, LookupsMatchCountryIgnoringCaseThenRegion) {
   RavelCLocalTimeOffset* japan = d.GetLocalTimeOffset(1);
   RavelCLocalTimeOffset* third = d.GetLocalTimeOffset(2);
 
-  struct CountryCase {
+  struct Case {
     const char* country;
+    int regionId;  // -1: looked up by country only
     RavelCLocalTimeOffset* expected;
-  } byCountry[] = {
-      {"BRA", first}, {"bra", first}, {"Jpn", japan}, {"ARG", nullptr}, {"BR", nullptr}, {"BRAZ", nullptr},
-      {nullptr, nullptr},
+  } cases[] = {
+      {"BRA", -1, first},  {"bra", -1, first}, {"Jpn", -1, japan},  {"ARG", -1, nullptr}, {"BR", -1, nullptr},
+      {"BRAZ", -1, nullptr}, {nullptr, -1, nullptr}, {"bra", 1, first}, {"BRA", 2, third}, {"BRA", 3, nullptr},
+      {"JPN", 0, japan},   {"JPN", 1, nullptr}, {nullptr, 0, nullptr},
   };
-  for (const CountryCase& c : byCountry) {
-    SCOPED_TRACE(c.country ? c.country : "(null)");
-    EXPECT_EQ(c.expected, d.GetLocalTimeOffset(c.country));
-  }
-
-  struct RegionCase {
-    const char* country;
-    unsigned char regionId;
-    RavelCLocalTimeOffset* expected;
-  } byRegion[] = {
-      {"bra", 1, first}, {"BRA", 2, third}, {"BRA", 3, nullptr}, {"JPN", 0, japan}, {"JPN", 1, nullptr},
-      {nullptr, 0, nullptr},
-  };
-  for (const RegionCase& c : byRegion) {
-    SCOPED_TRACE(testing::Message() << (c.country ? c.country : "(null)") << " region " << int(c.regionId));
-    EXPECT_EQ(c.expected, d.GetLocalTimeOffset(c.country, c.regionId));
+  for (const Case& c : cases) {
+    SCOPED_TRACE(testing::Message() << (c.country ? c.country : "(null)") << " region " << c.regionId);
+    EXPECT_EQ(c.expected, c.regionId < 0 ? d.GetLocalTimeOffset(c.country)
+                                         : d.GetLocalTimeOffset(c.country, static_cast<unsigned char>(c.regionId)));
   }
 
   Bytes emptyRaw = RawDescriptor(0x58, 0, {});
@@ -259,7 +247,7 @@ TEST(CountryCodeRecord, KeepsOnlyCodesOfExactlyThreeLetters) {
   }
 }
 
-TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodes) {
+TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodesAndPanicsOutsideThem) {
   struct Case {
     const char* label;
     Bytes descriptor;
@@ -288,17 +276,13 @@ TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodes) {
       show.push_back("\t    " + c.codes[i] + "\n");
     }
     EXPECT_EQ(Dump(show), ShowLines(d));
-  }
-}
-
-TEST(CountryAvailabilityDescriptor, CodeIndexOutOfRangePanicsAndYieldsNull) {
-  Bytes raw = sb::Descriptor(0x49, sb::Cat({sb::U8(0x80), sb::Text("BRAARG")}));
-  RavelCCountryAvailabilityDescriptor d(raw.data());
-  for (int index : {-1, 2}) {
-    TraceRecorder recorder;
-    EXPECT_EQ(nullptr, d.GetCountryCode(index));
-    EXPECT_EQ(1, recorder.PanicCount());
-    EXPECT_EQ(BoundOverflow(index, 2), recorder.Lines());
+    // A code outside the list panics and yields null.
+    for (int index : {-1, d.GetNumOfCountryCodes()}) {
+      TraceRecorder recorder;
+      EXPECT_EQ(nullptr, d.GetCountryCode(index));
+      EXPECT_EQ(BoundOverflow(index, d.GetNumOfCountryCodes()), recorder.Lines());
+      EXPECT_EQ(1, recorder.PanicCount());
+    }
   }
 }
 

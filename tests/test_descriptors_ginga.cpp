@@ -28,43 +28,38 @@ std::string Field(const char* field, size_t size) { return std::string(field, st
 
 }  // namespace
 
+namespace {
+
+// profile, version major, minor and micro, service bound flag, visibility, priority, transport label.
+std::vector<int> ApplicationFields(const RavelCApplicationDescriptor& d) {
+  return {d.iApplicationProfile, d.iVersionMajor, d.iVersionMinor, d.iVersionMicro,
+          d.bServiceBoundFlag,   d.iVisibility,   d.iAppPriority,  d.iAppTransportLabel};
+}
+
+}  // namespace
+
 TEST(ApplicationDescriptor, ReadsOnlyTheFirstProfileAndStaysInsideItsLength) {
   struct Case {
     const char* label;
     Bytes body;
-    int profile;
-    int major, minor, micro, serviceBound, visibility, priority, label_;
+    std::vector<int> fields;
   } cases[] = {
       // The flags, priority and label come from the second profile's bytes.
-      {"two profiles",
-       sb::Cat({sb::U8(10), sb::U16(0x0002), Bytes{4, 5, 6}, sb::U16(0xC002), Bytes{7, 8, 9}, Bytes{0x3F, 0x10, 0x02}}),
-       2, 4, 5, 6, 1, 2, 0x02, 0x07},
+      {.label = "two profiles",
+       .body = sb::Cat({sb::U8(10), sb::U16(0x0002), Bytes{4, 5, 6}, sb::U16(0xC002), Bytes{7, 8, 9}, Bytes{0x3F, 0x10, 0x02}}),
+       .fields = {2, 4, 5, 6, 1, 2, 0x02, 0x07}},
       // Fields past descriptor_length read as 0, not from the bytes behind it.
-      {"truncated", sb::Cat({sb::U8(5), sb::U16(0x0007)}), 7, 0, 0, 0, 0, 0, 0, 0},
+      {.label = "truncated", .body = sb::Cat({sb::U8(5), sb::U16(0x0007)}), .fields = {7, 0, 0, 0, 0, 0, 0, 0}},
   };
   for (const Case& c : cases) {
     Bytes raw = sb::Descriptor(0x00, c.body);
     sb::Append(raw, Bytes(16, 0xFF));
     RavelCApplicationDescriptor d(raw.data());
-    EXPECT_EQ(c.profile, d.GetApplicationProfile()) << c.label;
-    EXPECT_EQ(c.major, d.iVersionMajor) << c.label;
-    EXPECT_EQ(c.minor, d.iVersionMinor) << c.label;
-    EXPECT_EQ(c.micro, d.iVersionMicro) << c.label;
-    EXPECT_EQ(c.serviceBound, d.bServiceBoundFlag) << c.label;
-    EXPECT_EQ(c.visibility, d.iVisibility) << c.label;
-    EXPECT_EQ(c.priority, d.iAppPriority) << c.label;
-    EXPECT_EQ(c.label_, d.iAppTransportLabel) << c.label;
+    EXPECT_EQ(c.fields, ApplicationFields(d)) << c.label;
+    // Null zeroes every field.
+    EXPECT_EQ(kRavelErrInvalidArgument, d.ParseRawData(nullptr));
+    EXPECT_EQ(std::vector<int>(8, 0), ApplicationFields(d));
   }
-  // Null zeroes every field.
-  Bytes first = sb::Descriptor(0x00, sb::Cat({sb::U8(5), sb::U16(0x0001), Bytes{1, 2, 3}, Bytes{0xBF, 0x3C, 0x01}}));
-  RavelCApplicationDescriptor d(first.data());
-  EXPECT_EQ(kRavelErrInvalidArgument, d.ParseRawData(nullptr));
-  EXPECT_EQ(0, d.iApplicationProfile);
-  EXPECT_EQ(0, d.iVersionMajor);
-  EXPECT_EQ(0, d.bServiceBoundFlag);
-  EXPECT_EQ(0, d.iVisibility);
-  EXPECT_EQ(0, d.iAppPriority);
-  EXPECT_EQ(0, d.iAppTransportLabel);
 }
 
 TEST(ApplicationNameDescriptor, ReadsLanguageAndNameWithinTheFieldAndTheLength) {
@@ -208,6 +203,12 @@ TEST(GingaAppDataComponentDescriptor, DecodesAndTracesEachValueAtInformationLeve
     if (!c.hasInfo) continue;
     EXPECT_EQ(c.hasCarousel, d.GetAdditionalGingaInfo()->GetData() != nullptr);
   }
+  // A record not parsed yet holds nothing.
+  const RavelCAdditionalGingaInfo fresh;
+  EXPECT_EQ(std::vector<unsigned int>(6, 0),
+            (std::vector<unsigned int>{fresh.GetTransmissionFormat(), fresh.GetApplicationIdentifierFlag(),
+                                       fresh.GetDocumentResolution(), fresh.GetIndependentFlag(),
+                                       fresh.iApplicationIdentifierOrgId, fresh.GetApplicationIdentifierAppId()}));
 }
 
 TEST(GingaAppDataComponentDescriptor, ShowsTheBaseLineOnly) {

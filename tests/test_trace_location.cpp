@@ -27,12 +27,14 @@ int LineOf(const std::string& path, const char* extension, const std::string& ma
   return 0;
 }
 
-Bytes EmptyPmt(uint8_t version) {
+Bytes Section(uint8_t tableId, const Bytes& body, uint8_t version = 0) {
   sb::SectionOptions options;
-  options.tableId = 0x02;
+  options.tableId = tableId;
   options.version = version;
-  return sb::LongSection(options, sb::Cat({sb::U16(0xE100), sb::Length12(0)}));
+  return sb::LongSection(options, body);
 }
+
+Bytes EmptyPmt(uint8_t version) { return Section(0x02, sb::Cat({sb::U16(0xE100), sb::Length12(0)}), version); }
 
 }  // namespace
 
@@ -45,72 +47,34 @@ TEST(TraceLocation, IsTheCallSiteOfTheTraceEvenThroughASharedHelper) {
     const char* extension;  // of that path's source
     const char* marker;     // text on the line of the call site
   } cases[] = {
+      // The message lies 8 bytes into its carousel section, as a receiver hands it.
       {.label = "a class's own trace",
-       .trigger =
-           [] {
-             // The message lies 8 bytes into its carousel section, as a receiver hands it.
-             sb::SectionOptions options;
-             options.tableId = 0x3B;
-             Bytes section = sb::LongSection(options, sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1),
-                                                                sb::U8(0xFF), sb::U8(0), sb::U16(0)}));
-             RavelCDsmccBase message(section.data() + 8);
-           },
-       .text = "Unknown DSMCC Type!",
-       .file = "SectionParser/source/Ravel_CDsmccMsgBase",
-       .extension = ".cpp",
+       .trigger = [] { Bytes s = Section(0x3B, sb::Cat({sb::U8(0x11), sb::U8(0x03), sb::U16(0x1001), sb::U32(1),
+                                                        sb::U8(0xFF), sb::U8(0), sb::U16(0)}));
+                       RavelCDsmccBase message(s.data() + 8); },
+       .text = "Unknown DSMCC Type!", .file = "SectionParser/source/Ravel_CDsmccMsgBase", .extension = ".cpp",
        .marker = "\"Unknown DSMCC Type!"},
       {.label = "the shared descriptor header parse, for the service descriptor",
-       .trigger =
-           [] {
-             Bytes descriptor = sb::Cat({sb::U8(0x49), sb::U8(0)});
-             RavelCServiceDescriptor service(descriptor.data());
-           },
-       .text = "This Descriptor isn't Service Descriptor!",
-       .file = "SectionParser/source/Ravel_CDescriptorService",
-       .extension = ".cpp",
-       .marker = "ParseHeader(raw, kKind, __LINE__)"},
+       .trigger = [] { Bytes d = sb::Cat({sb::U8(0x49), sb::U8(0)}); RavelCServiceDescriptor service(d.data()); },
+       .text = "This Descriptor isn't Service Descriptor!", .file = "SectionParser/source/Ravel_CDescriptorService",
+       .extension = ".cpp", .marker = "ParseHeader(raw, kKind, __LINE__)"},
       {.label = "the array template, from the line of the access check",
-       .trigger =
-           [] {
-             RavelCArray<int> empty;
-             empty[3];
-           },
-       .text = "Array Bound Overflow!",
-       .file = "SectionParser/../CommonUtility/include/Ravel_CArray",
-       .extension = ".h",
+       .trigger = [] { RavelCArray<int> empty; empty[3]; },
+       .text = "Array Bound Overflow!", .file = "SectionParser/../CommonUtility/include/Ravel_CArray", .extension = ".h",
        .marker = "RAVEL_CARRAY_TRACE(\"Array Bound Overflow!"},
       {.label = "the CRC check every table shares, for the PAT",
-       .trigger =
-           [] {
-             sb::SectionOptions options;
-             options.corruptCrc = true;
-             Bytes section = sb::LongSection(options, sb::Cat({sb::U16(1), sb::U16(0xE100)}));
-             RavelCPAT pat(section.data());
-           },
-       .text = "PAT Section: CRC Error!",
-       .file = "SectionParser/source/Ravel_CTablePAT",
-       .extension = ".cpp",
+       .trigger = [] { sb::SectionOptions o; o.corruptCrc = true;
+                       Bytes s = sb::LongSection(o, sb::Cat({sb::U16(1), sb::U16(0xE100)})); RavelCPAT pat(s.data()); },
+       .text = "PAT Section: CRC Error!", .file = "SectionParser/source/Ravel_CTablePAT", .extension = ".cpp",
        .marker = "\"PAT Section: CRC Error!"},
       {.label = "the header and time parse of TDT and TOT, for the TDT",
-       .trigger =
-           [] {
-             Bytes tot = sb::ShortSection(0x73, sb::UtcTime(2024, 5, 6, 7, 8, 9), true);
-             RavelCTDT tdt(tot.data());
-           },
-       .text = "Table ID isn't for TDT!",
-       .file = "SectionParser/source/Ravel_CTableTDT",
-       .extension = ".cpp",
+       .trigger = [] { Bytes tot = sb::ShortSection(0x73, sb::UtcTime(2024, 5, 6, 7, 8, 9), true); RavelCTDT tdt(tot.data()); },
+       .text = "Table ID isn't for TDT!", .file = "SectionParser/source/Ravel_CTableTDT", .extension = ".cpp",
        .marker = "RavelTimeTable_ParseHeaderAndTime("},
       {.label = "the version check of a join, for the PMT",
-       .trigger =
-           [] {
-             Bytes first = EmptyPmt(1), second = EmptyPmt(2);
-             RavelCPMT target(first.data()), other(second.data());
-             target += other;
-           },
-       .text = "Two PMT Information",
-       .file = "SectionParser/source/Ravel_CTablePMT",
-       .extension = ".cpp",
+       .trigger = [] { Bytes first = EmptyPmt(1), second = EmptyPmt(2);
+                       RavelCPMT target(first.data()), other(second.data()); target += other; },
+       .text = "Two PMT Information", .file = "SectionParser/source/Ravel_CTablePMT", .extension = ".cpp",
        .marker = "RAVEL_TABLE_MERGE_CHECK_VERSION(*this, other, \"PMT\")"},
   };
   for (const Case& c : cases) {
