@@ -336,11 +336,15 @@ TEST_F(RavelDumpTest, PacketSizesAndGarbageGiveTheSameTables) {
     Bytes stream;
     const char* inputLine;
   } cases[] = {
-      {"188", plain, "input: 6 packets of 188 bytes, 0 bytes skipped, 0 resyncs"},
-      {"192", Reframe(plain, 192), "input: 6 packets of 192 bytes, 0 bytes skipped, 0 resyncs"},
-      {"204", Reframe(plain, 204), "input: 6 packets of 204 bytes, 0 bytes skipped, 0 resyncs"},
-      {"garbage between packets", garbage, "input: 6 packets of 188 bytes, 77 bytes skipped, 1 resyncs"},
-      {"garbage before the first packet", leading, "input: 6 packets of 188 bytes, 77 bytes skipped, 0 resyncs"},
+      {/*what=*/"188", /*stream=*/plain, /*inputLine=*/"input: 6 packets of 188 bytes, 0 bytes skipped, 0 resyncs"},
+      {/*what=*/"192", /*stream=*/Reframe(plain, 192),
+       /*inputLine=*/"input: 6 packets of 192 bytes, 0 bytes skipped, 0 resyncs"},
+      {/*what=*/"204", /*stream=*/Reframe(plain, 204),
+       /*inputLine=*/"input: 6 packets of 204 bytes, 0 bytes skipped, 0 resyncs"},
+      {/*what=*/"garbage between packets", /*stream=*/garbage,
+       /*inputLine=*/"input: 6 packets of 188 bytes, 77 bytes skipped, 1 resyncs"},
+      {/*what=*/"garbage before the first packet", /*stream=*/leading,
+       /*inputLine=*/"input: 6 packets of 188 bytes, 77 bytes skipped, 0 resyncs"},
   };
   ToolRun reference = Run({Write("plain.ts", plain)});
   ASSERT_EQ(0, reference.status) << reference.err;
@@ -403,37 +407,37 @@ TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   ddb[8 + 10] = 0x01;  // messageLength: 256 more than the section holds
   sb::FixCrc(ddb);
   struct Case {
-    const char* what;
     Bytes section;
     const char* kind;
     const char* reason;
   } cases[] = {
-      {"PMT program info", sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(200)})), "PMT",
-       "loop runs past its parent's end at byte 10"},
-      {"PMT stream", sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
-                                                   sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
-       "PMT", "loop entry runs past its loop's end at byte 12"},
-      {"SDT service descriptor", sb::LongSection(sdt, sb::Cat({sb::U16(1), sb::U8(0xFF), sb::U16(1), sb::U8(0xFC),
-                                                              sb::U16(0x8000 | service.size()), service})),
-       "SDT", "descriptor runs past its loop's end at byte 16"},
-      {"EIT event", sb::LongSection(eit, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x4E), sb::U16(1),
+      {/*section=*/sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(200)})), /*kind=*/"PMT",
+       /*reason=*/"loop runs past its parent's end at byte 10"},
+      {/*section=*/sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
+                                                 sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
+       /*kind=*/"PMT", /*reason=*/"loop entry runs past its loop's end at byte 12"},
+      {/*section=*/sb::LongSection(sdt, sb::Cat({sb::U16(1), sb::U8(0xFF), sb::U16(1), sb::U8(0xFC),
+                                                 sb::U16(0x8000 | service.size()), service})),
+       /*kind=*/"SDT", /*reason=*/"descriptor runs past its loop's end at byte 16"},
+      {/*section=*/sb::LongSection(eit, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x4E), sb::U16(1),
                                                  sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
                                                  sb::U16(0x8000 | 60)})),
-       "EIT p/f", "loop entry runs past its loop's end at byte 14"},
-      {"AIT application loop", sb::LongSection(ait, sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | 90)})), "AIT",
-       "application loop runs past the section at byte 10"},
-      {"DII module list", sb::LongSection(dii, DsmccMessage(0x1002, 2, diiBody)), "DII",
-       "DII module record cut by the message end"},
-      {"DDB message", ddb, "DDB", "DSM-CC message runs past the section at byte 18"},
-      {"TOT loop", sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::Length12(20)}), true), "TOT",
-       "loop runs past its parent's end at byte 8"},
+       /*kind=*/"EIT p/f", /*reason=*/"loop entry runs past its loop's end at byte 14"},
+      {/*section=*/sb::LongSection(ait, sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | 90)})), /*kind=*/"AIT",
+       /*reason=*/"application loop runs past the section at byte 10"},
+      {/*section=*/sb::LongSection(dii, DsmccMessage(0x1002, 2, diiBody)), /*kind=*/"DII",
+       /*reason=*/"DII module record cut by the message end"},
+      {/*section=*/ddb, /*kind=*/"DDB", /*reason=*/"DSM-CC message runs past the section at byte 18"},
+      {/*section=*/sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::Length12(20)}), true),
+       /*kind=*/"TOT", /*reason=*/"loop runs past its parent's end at byte 8"},
   };
   for (const Case& c : cases) {
+    SCOPED_TRACE(c.reason);
     ToolRun run = Run({"--sections", Write("bad.sections", sb::Cat({PatSection(1, 0, {{1, 0x100}}), c.section}))});
-    ASSERT_EQ(0, run.status) << c.what << run.err;
-    EXPECT_EQ(std::string::npos, run.out.find(std::string("== ") + c.kind)) << c.what;
-    EXPECT_NE(std::string::npos, run.err.find(", 1 malformed,")) << c.what << run.err;
-    EXPECT_NE(std::string::npos, run.err.find(c.reason)) << c.what << run.err;
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_EQ(std::string::npos, run.out.find(std::string("== ") + c.kind));
+    EXPECT_NE(std::string::npos, run.err.find(", 1 malformed,")) << run.err;
+    EXPECT_NE(std::string::npos, run.err.find(c.reason)) << run.err;
   }
 }
 
@@ -527,10 +531,12 @@ TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
     std::vector<std::string> args;
     bool pat, ait;
   } cases[] = {
-      {{file}, true, false},  // nothing names PID 0x0100 as an AIT PID
-      {{"--pid", "0x100", file}, false, true}, {{"--pid", "0,0x100", file}, true, true},
-      {{"--pid", "0", "--pid", "256", file}, true, true}, {{"--pid", "0,0x100", "--table", "ait", file}, false, true},
-      {{"--pid", "0,0x100", "--table", "0x00", file}, true, false},
+      {/*args=*/{file}, /*pat=*/true, /*ait=*/false},  // nothing names PID 0x0100 as an AIT PID
+      {/*args=*/{"--pid", "0x100", file}, /*pat=*/false, /*ait=*/true},
+      {/*args=*/{"--pid", "0,0x100", file}, /*pat=*/true, /*ait=*/true},
+      {/*args=*/{"--pid", "0", "--pid", "256", file}, /*pat=*/true, /*ait=*/true},
+      {/*args=*/{"--pid", "0,0x100", "--table", "ait", file}, /*pat=*/false, /*ait=*/true},
+      {/*args=*/{"--pid", "0,0x100", "--table", "0x00", file}, /*pat=*/true, /*ait=*/false},
   };
   for (const Case& c : cases) {
     ToolRun run = Run(c.args);
@@ -583,8 +589,13 @@ TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
     unsigned received, total;
     bool complete;
     const Bytes* bytes;
-  } expected[] = {{1, 3, 3, true, &big}, {2, 1, 1, true, &small}, {3, 2, 3, false, nullptr},
-                  {4, 1, 2, false, nullptr}, {5, 0, 0, true, nullptr}};
+  } expected[] = {
+      {/*id=*/1, /*received=*/3, /*total=*/3, /*complete=*/true, /*bytes=*/&big},
+      {/*id=*/2, /*received=*/1, /*total=*/1, /*complete=*/true, /*bytes=*/&small},
+      {/*id=*/3, /*received=*/2, /*total=*/3, /*complete=*/false, /*bytes=*/nullptr},
+      {/*id=*/4, /*received=*/1, /*total=*/2, /*complete=*/false, /*bytes=*/nullptr},
+      {/*id=*/5, /*received=*/0, /*total=*/0, /*complete=*/true, /*bytes=*/&kNoBytes},
+  };
   const nlohmann::json& modules = carousels[0]["modules"];
   ASSERT_EQ(5u, modules.size());
   for (size_t i = 0; i < 5; ++i) {
@@ -595,8 +606,9 @@ TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
     ExpectMembers({{"id", e.id}, {"version", 5}, {"blocks_received", e.received}, {"blocks_total", e.total},
                    {"complete", e.complete}, {"file", e.complete ? nlohmann::json(file) : nlohmann::json()}},
                   modules[i]);
-    const Bytes want = e.bytes != nullptr ? *e.bytes : Bytes();
-    if (e.complete) EXPECT_EQ(std::string(want.begin(), want.end()), ReadFile(file)) << e.id;
+    if (e.complete) {
+      EXPECT_EQ(std::string(e.bytes->begin(), e.bytes->end()), ReadFile(file)) << e.id;
+    }
   }
   size_t files = 0;
   for (const auto& entry : fs::directory_iterator(out)) {

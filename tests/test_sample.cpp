@@ -199,16 +199,17 @@ TEST(SampleCapture, EverySectionAssemblesAndParsesWithTheClassOfItsTableId) {
     int pid;
     std::vector<Expected> sections;
   } cases[] = {
-      {0x0000, std::vector<Expected>(4, Expected{0x00, &kQuiet})},
-      {0x1FC8, std::vector<Expected>(4, Expected{0x02, &kQuiet})},
-      {0x0010, std::vector<Expected>(3, Expected{0x40, &kQuiet})},
-      {0x0011, std::vector<Expected>(3, Expected{0x42, &kQuiet})},
-      {0x0027, {{0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace}, {0x4E, &kPresentEitTrace},
-        {0x4E, &kFollowingEitTrace}}},
-      {0x0014, {{0x70, &kQuiet}, {0x73, &kQuiet}}}, {0x0024, {{0xC4, &kBitTrace}}},
-      {0x0188, std::vector<Expected>(2, Expected{0x74, &kAitTrace})},
-      {0x018A, {dsi, dii, ddb, ddb, ddb, ddb, dsi, dii, ddb, ddb, ddb, ddb}},
-      {0x018B, std::vector<Expected>(2, Expected{0x3D, &kStreamEventTrace})},
+      {/*pid=*/0x0000, /*sections=*/std::vector<Expected>(4, Expected{0x00, &kQuiet})},
+      {/*pid=*/0x1FC8, /*sections=*/std::vector<Expected>(4, Expected{0x02, &kQuiet})},
+      {/*pid=*/0x0010, /*sections=*/std::vector<Expected>(3, Expected{0x40, &kQuiet})},
+      {/*pid=*/0x0011, /*sections=*/std::vector<Expected>(3, Expected{0x42, &kQuiet})},
+      {/*pid=*/0x0027, /*sections=*/{{0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace},
+                                     {0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace}}},
+      {/*pid=*/0x0014, /*sections=*/{{0x70, &kQuiet}, {0x73, &kQuiet}}},
+      {/*pid=*/0x0024, /*sections=*/{{0xC4, &kBitTrace}}},
+      {/*pid=*/0x0188, /*sections=*/std::vector<Expected>(2, Expected{0x74, &kAitTrace})},
+      {/*pid=*/0x018A, /*sections=*/{dsi, dii, ddb, ddb, ddb, ddb, dsi, dii, ddb, ddb, ddb, ddb}},
+      {/*pid=*/0x018B, /*sections=*/std::vector<Expected>(2, Expected{0x3D, &kStreamEventTrace})},
   };
   size_t pidsWithSections = 0;
   for (const PidSections& c : cases) {
