@@ -280,6 +280,7 @@ TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
   Bytes zeroLength = Cat({U16(0x0002), U16(0x0003), Length12(7), ServiceList({{1, 1}}), Descriptor(0x40, {})});
   // A descriptor running past the length is still read whole, and ends the loop.
   Bytes pastLength = Cat({U16(0x0002), U16(0x0003), Length12(3), ServiceList({{1, 1}}), Descriptor(0x00, {})});
+  Bytes lastByte = Cat({U16(0x0002), U16(0x0003), Length12(6), ServiceList({{1, 1}}), TSInformation(1, "X")});
   struct Case {
     const char* label;
     Bytes* entry;
@@ -294,6 +295,8 @@ TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
        {{kWarning, Invalid(0x40, 0)}}, "tsid=0x0000 onid=0x0000 len=0"},
       {"the loop ends when the bytes consumed reach the length", &pastLength, kRavelOk, {},
        "tsid=0x0002 onid=0x0003 len=3 services=1"},
+      {"a descriptor starting in the last declared byte is read", &lastByte, kRavelOk, {},
+       "tsid=0x0002 onid=0x0003 len=6 services=1 tsname=X"},
       {"all four kinds", &full, kRavelOk, {}, fullSummary},
   };
   for (const Case& c : cases) {
