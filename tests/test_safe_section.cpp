@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "Captures.h"
+#include "CarouselBuilder.h"
 #include "Ravel_ByteOrder.h"
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
@@ -47,15 +48,6 @@ Bytes AitSection(const Bytes& body) {
   o.tableId = 0x74;
   o.tableIdExtension = 0x0010;
   return sb::LongSection(o, body);
-}
-
-// One Ginga application with a name and a location.
-Bytes GoodAit() {
-  Bytes name = sb::Descriptor(0x01, sb::Cat({sb::Text("por"), sb::U8(4), sb::Text("Jogo")}));
-  Bytes location = sb::Descriptor(
-      0x07, sb::Cat({sb::U8(4), sb::Text("/app"), sb::U8(0), sb::Text("main.ncl")}));
-  Bytes app = sb::Cat({sb::U32(0x0B), sb::U16(0x1AB5), sb::U8(0x01), sb::DescriptorLoop({name, location}, 0xC)});
-  return AitSection(sb::Cat({sb::DescriptorLoop({}), sb::DescriptorLoop({app})}));
 }
 
 // dsmccMessageHeader with `adaptation` bytes of adaptation header; the
@@ -127,7 +119,7 @@ Bytes StreamEvents() {
 // the shared captures are there.
 std::vector<Bytes> Fixtures() {
   std::vector<Bytes> fixtures = {Pat({{0, 0x10}, {3, 0x103}, {1, 0x1FC8}}),
-                                 GoodAit(),
+                                 cb::AitSection("Jogo", "/app", "main.ncl"),
                                  StreamEvents(),
                                  Carousel(0x3B, Message(0x1006, DsiBody(3, {1, 2, 3}))),
                                  Carousel(0x3B, GoodDii()),
@@ -526,7 +518,7 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
 }
 
 TEST(SafeSection, KeepsOneBufferOfTheSectionsSizeAndHandsTheTableOver) {
-  Bytes ait = GoodAit();
+  Bytes ait = cb::AitSection("Jogo", "/app", "main.ncl");
   Bytes pat = Pat({{1, 0x101}});
   RavelCSafeSection safe;
   TraceRecorder recorder;
