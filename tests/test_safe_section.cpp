@@ -467,11 +467,6 @@ TEST(SafeSection, ARefusalByTheTablesOwnParseLeavesNoTable) {
   RavelCTDT time(nullptr);
   EXPECT_EQ(kRavelSafeOk, safe.ParseInto(tdt.data(), static_cast<int>(tdt.size()), time));
   EXPECT_EQ(56, time.iSecond);
-  std::unique_ptr<RavelCTDT> taken;
-  ASSERT_EQ(kRavelSafeOk, safe.Parse(tdt.data(), static_cast<int>(tdt.size())));
-  taken.reset(safe.TakeTDT());
-  EXPECT_EQ(nullptr, safe.GetTDT());
-  EXPECT_EQ(12, taken->iHour);
 }
 
 TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
