@@ -62,6 +62,13 @@ std::string ParseLine(const unsigned char* section) {
   return text;
 }
 
+// The header lines of the table base's Show.
+TraceLines HeaderShown(RavelCAIT& ait) {
+  TraceRecorder recorder;
+  ait.RavelCTableBase::Show();
+  return recorder.Lines();
+}
+
 GingaAITApplicationType& At(RavelCAIT& ait, int index) { return (*ait.GetApplicationList())[index]; }
 
 }  // namespace
@@ -209,7 +216,6 @@ TEST(AitParse, FailuresLeaveNoApplications) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, ait.ParseRawData(section)) << c.label;
     EXPECT_EQ((TraceLines{{kInfo, ParseLine(section)}, {kError, c.message}}), recorder.Lines()) << c.label;
-    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableAIT", r.file);
     EXPECT_EQ(0, ait.GetApplicationList()->iCount) << c.label;
     EXPECT_EQ(c.tableId, ait.iTableId) << c.label;
     // CRC failures keep the previous header; a foreign table_id leaves the new one.
@@ -272,44 +278,33 @@ TEST(AitCopy, CopiesTheHeaderButNoApplicationsAndMergesNothing) {
   ASSERT_EQ(kRavelOk, source.ParseRawData(three.data()));
   source.iSession = 0x5A;
   source.SetTableName("AIT");
-
+  const TraceLines header = HeaderLines(0x74, "AIT", 1, static_cast<int>(three.size()) - 3, 0x0010, 6, 1, 0, 0, 0x5A);
   RavelCAIT copy(source);
   EXPECT_EQ(0, copy.GetApplicationList()->iCount);
   EXPECT_EQ(8, copy.GetApplicationList()->iMaxCount);
-  EXPECT_EQ(0x74, copy.iTableId);
-  EXPECT_EQ(6, copy.iVersionNumber);
-  EXPECT_EQ(0x0010, copy.iTableIdExtension);
-  EXPECT_EQ(source.iSectionLength, copy.iSectionLength);
-  EXPECT_EQ(0x5A, copy.iSession);
-  EXPECT_STREQ("AIT", copy.sTableName.GetString());
-
+  EXPECT_EQ(header, HeaderShown(copy));
   // Assignment takes the header and leaves the target's own applications.
   RavelCAIT target;
   ASSERT_EQ(kRavelOk, target.ParseRawData(two.data()));
   target = source;
-  EXPECT_EQ(6, target.iVersionNumber);
+  EXPECT_EQ(header, HeaderShown(target));
   ASSERT_EQ(2, target.GetApplicationList()->iCount);
-  EXPECT_EQ(8u, At(target, 0).iOrganizationId);
   EXPECT_EQ(9u, At(target, 1).iOrganizationId);
 
   struct Merge {
-    const char* label;
     uint8_t otherVersion;
     TraceLines traces;
   } merges[] = {
-      {"same version", 6, {}}, {"other version", 2, {{kError, "Two AIT Information have different information!\n"}}},
+      {/*otherVersion=*/6, /*traces=*/{}}, {2, {{kError, "Two AIT Information have different information!\n"}}},
   };
   for (const Merge& m : merges) {
     RavelCAIT other;
     ASSERT_EQ(kRavelOk, other.ParseRawData(Ait(AitBody({App(5, 5, 1, 0xC, {})}), m.otherVersion).data()));
     TraceRecorder recorder;
-    RavelCAIT& result = (source += other);
-    EXPECT_EQ(&source, &result) << m.label;
-    EXPECT_EQ(m.traces, recorder.Lines()) << m.label;
-    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableAIT", r.file);
-    ASSERT_EQ(3, source.GetApplicationList()->iCount) << m.label;
-    EXPECT_EQ(3u, At(source, 2).iOrganizationId) << m.label;
-    EXPECT_EQ(6, source.iVersionNumber) << m.label;
+    EXPECT_EQ(&source, &(source += other));
+    EXPECT_EQ(m.traces, recorder.Lines());
+    ASSERT_EQ(3, source.GetApplicationList()->iCount);
+    EXPECT_EQ(3u, At(source, 2).iOrganizationId);
   }
 }
 
@@ -333,29 +328,17 @@ TEST(AitCapture, RealSectionsParseAndYieldApplications) {
   Bytes stream;
   RAVEL_LOAD_CAPTURE_OR_SKIP("ait.ts", stream);
   std::set<std::string> names;
-  int applications = 0;
   for (unsigned int pid : {0x1EC5, 0x1EC6, 0x1EC7}) {  // named by the capture's PMTs
-    std::vector<Bytes> sections = captures::SectionsOfPid(stream, pid);
-    EXPECT_FALSE(sections.empty()) << "PID " << pid;
-    for (Bytes& section : sections) {
+    for (Bytes& section : captures::SectionsOfPid(stream, pid)) {
       RavelCAIT ait;
       TraceRecorder recorder;
       ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << "PID " << pid;
-      RavelCArray<GingaAITApplicationType>* list = ait.GetApplicationList();
-      EXPECT_GT(list->iCount, 0) << "PID " << pid;
-      applications += list->iCount;
-      for (int i = 0; i < list->iCount; ++i) {
-        const GingaAITApplicationType& app = (*list)[i];
-        names.insert(Field(app.szAppName, 255));
-        // DVB signalling: reserved bits all set, so no Ginga resolution.
-        EXPECT_EQ(0, app.iDocumentResolution);
-        EXPECT_LE(app.iApplicationId, 0xFFFFu);
-        EXPECT_LE(app.iApplicationControlCode, 0xFFu);
+      for (int i = 0; i < ait.GetApplicationList()->iCount; ++i) {
+        names.insert(Field(At(ait, i).szAppName, 255));
+        EXPECT_EQ(0, At(ait, i).iDocumentResolution);  // DVB signalling: reserved bits set, no Ginga resolution
       }
-      EXPECT_EQ(0, recorder.PanicCount());
     }
   }
-  EXPECT_GE(applications, 6);
   EXPECT_EQ(1u, names.count("Programmi TV BB SAT"));
   EXPECT_EQ(1u, names.count("Launcher SAT"));
 }
