@@ -2,26 +2,7 @@
 // rules of each class (the pattern they share is in test_descriptor_factory.cpp).
 #include <gtest/gtest.h>
 
-#include <cstring>
-#include <memory>
-#include <string>
-
-#include "BitWalk.h"
-#include "Ravel_CDescriptorCRC32.h"
-#include "Ravel_CDescriptorCompressionType.h"
-#include "Ravel_CDescriptorEstDownloadTime.h"
-#include "Ravel_CDescriptorGeneralEvent.h"
-#include "Ravel_CDescriptorInfo.h"
-#include "Ravel_CDescriptorLocation.h"
-#include "Ravel_CDescriptorModuleLink.h"
-#include "Ravel_CDescriptorNPTReference.h"
-#include "Ravel_CDescriptorName.h"
-#include "Ravel_CDescriptorType.h"
-#include "Ravel_ResultCode.h"
 #include "DescriptorShow.h"
-#include "StreamBuilder.h"
-#include "TestHelpers.h"
-#include "TraceRecorder.h"
 
 using namespace th;
 
@@ -156,8 +137,6 @@ TEST(GeneralEventDescriptor, PrivateDataIsReplacedOnlyByAMatchingTagAndCopiedAsT
 
 namespace {
 
-using Values = std::vector<int64_t>;
-
 Values GeneralEventFields(unsigned char* raw) {
   RavelCGeneralEventDescriptor d(raw);
   const RavelCDateTime& time = d.GetEventMsgMJDJSTTime();
@@ -193,7 +172,6 @@ Bytes GeneralEventBase(uint8_t mode) { return bitwalk::Base({0x40, 11, 0x00, 0x0
 }  // namespace
 
 TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
-  using bitwalk::Base;
   const bitwalk::Walk walks[] = {
       {"module link", Base({0x04, 3}, 5), 16, 40, {{"position", {{16, 8}}}, {"module id", {{24, 16}}}},
        [](unsigned char* raw) -> Values {
@@ -242,6 +220,5 @@ TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       {"general event mode 3", GeneralEventBase(3), 40, 104, GeneralEventLayout(3), GeneralEventFields},
       {"general event mode 5", GeneralEventBase(5), 56, 104, GeneralEventLayout(5), GeneralEventFields},
   };
-  TraceRecorder recorder;
-  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
+  RunWalks(walks);
 }

@@ -3,24 +3,7 @@
 // offset and country classes are in test_descriptors_event_rating.cpp).
 #include <gtest/gtest.h>
 
-#include <cstring>
-#include <string>
-#include <vector>
-
-#include "BitWalk.h"
-#include "Ravel_CDescriptorAudioComponent.h"
-#include "Ravel_CDescriptorComponent.h"
-#include "Ravel_CDescriptorContent.h"
-#include "Ravel_CDescriptorCopyright.h"
-#include "Ravel_CDescriptorDataComponent.h"
-#include "Ravel_CDescriptorExtendedEvent.h"
-#include "Ravel_CDescriptorSeries.h"
-#include "Ravel_CDescriptorShortEvent.h"
-#include "Ravel_CDescriptorTargetRegion.h"
 #include "DescriptorShow.h"
-#include "StreamBuilder.h"
-#include "TestHelpers.h"
-#include "TraceRecorder.h"
 
 using namespace th;
 using sb::Cat;
@@ -243,10 +226,6 @@ TEST(ContentDescriptor, SplitsGenresAndTracesEachOne) {
 
 namespace {
 
-using bitwalk::Base;
-using bitwalk::Field;
-using Values = std::vector<int64_t>;
-
 Values AudioComponentFields(unsigned char* raw) {
   RavelCAudioComponentDescriptor d(raw);
   return {d.GetStreamContent(),      d.GetComponentType(),     d.GetComponentTag(),
@@ -310,6 +289,5 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {d.GetCopyrightId()};
        }},
   };
-  TraceRecorder recorder;  // the content descriptor reports every genre
-  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
+  RunWalks(walks);
 }

@@ -2,27 +2,9 @@
 // pattern they share is in test_descriptor_factory.cpp).
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <memory>
-#include <string>
 
-#include "BitWalk.h"
-#include "Ravel_CDescriptorExtendedBroadcaster.h"
-#include "Ravel_CDescriptorLinkage.h"
-#include "Ravel_CDescriptorLogoTransmission.h"
-#include "Ravel_CDescriptorPartialReception.h"
-#include "Ravel_CDescriptorService.h"
-#include "Ravel_CDescriptorServiceList.h"
-#include "Ravel_CDescriptorStreamIdentifier.h"
-#include "Ravel_CDescriptorSystemManagement.h"
-#include "Ravel_CDescriptorTSInformation.h"
-#include "Ravel_CDescriptorTerrDeliverySystem.h"
-#include "Ravel_CTxType.h"
-#include "Ravel_ResultCode.h"
 #include "DescriptorShow.h"
-#include "StreamBuilder.h"
-#include "TestHelpers.h"
-#include "TraceRecorder.h"
 
 using namespace th;
 using sb::Cat;
@@ -395,10 +377,6 @@ TEST(PartialReceptionDescriptor, KeepsOnlyTheHighByteOfEachServiceId) {
 
 namespace {
 
-using bitwalk::Base;
-using bitwalk::Field;
-using Values = std::vector<int64_t>;
-
 // The TS name and its records are read from 'A' bytes, so that a name length
 // bit shows in the name's length (and a record has 0x41 services).
 Bytes TsInformationBase() {
@@ -486,6 +464,5 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {d.GetBroadcastingFlag(), d.GetBroadcastingIdentifier(), d.GetAdditionalBroadcastingIdentification()};
        }},
   };
-  TraceRecorder recorder;
-  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
+  RunWalks(walks);
 }

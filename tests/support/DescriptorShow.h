@@ -1,14 +1,23 @@
-// What the descriptor tests share: the body of a descriptor's Show dump and a
-// descriptor placed in its section ahead of zeros.
+// What the descriptor tests share: every descriptor class, the body of a
+// descriptor's Show dump, a descriptor placed in its section ahead of zeros and
+// the bit walks of the fixed fields.
 #ifndef RAVEL_TESTS_DESCRIPTORSHOW_H
 #define RAVEL_TESTS_DESCRIPTORSHOW_H
 
 #include <algorithm>
+#include <cstring>
+#include <string>
+#include <vector>
 
-#include "Ravel_CDescriptorBase.h"
+#include "BitWalk.h"
+#include "RavelSectionParser.h"
 #include "TestHelpers.h"
 
 namespace th {
+
+using Values = std::vector<int64_t>;
+using bitwalk::Base;
+using bitwalk::Field;
 
 // The lines of Show after the banner and the base line.
 inline TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
@@ -18,6 +27,13 @@ inline TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
 
 // Zeros after a descriptor in its section: what a parse reading past its length takes in.
 inline Bytes FollowedByZeros(const Bytes& descriptor) { return InSection(descriptor, Bytes(300, 0x00)); }
+
+// Runs every walk with the parses' own traces kept out of the test's output.
+template <size_t N>
+void RunWalks(const bitwalk::Walk (&walks)[N]) {
+  TraceRecorder quiet;
+  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
+}
 
 }  // namespace th
 
