@@ -3,38 +3,23 @@
 // they share is in test_descriptor_factory.cpp).
 #include <gtest/gtest.h>
 
-#include <cstring>
 #include <memory>
-#include <string>
 
-#include "BitWalk.h"
-#include "Ravel_CAdditionalGingaInfo.h"
-#include "Ravel_CDescriptorApplication.h"
-#include "Ravel_CDescriptorApplicationName.h"
-#include "Ravel_CDescriptorGingaApp.h"
-#include "Ravel_CDescriptorGingaAppDataComponent.h"
-#include "Ravel_CDescriptorGingaAppLoc.h"
-#include "Ravel_CObjectCarouselTransmissionFormat.h"
-#include "Ravel_ResultCode.h"
-#include "StreamBuilder.h"
-#include "TestHelpers.h"
-#include "TraceRecorder.h"
+#include "DescriptorShow.h"
+
+using namespace th;
 
 namespace {
 
-const unsigned int kInfo = th::kWarning;  // the information level of these classes
-
-std::string Field(const char* field, size_t size) { return std::string(field, strnlen(field, size)); }
-
-}  // namespace
-
-namespace {
+std::string FieldText(const char* field, size_t size) { return std::string(field, strnlen(field, size)); }
 
 // profile, version major, minor and micro, service bound flag, visibility, priority, transport label.
 std::vector<int> ApplicationFields(const RavelCApplicationDescriptor& d) {
   return {d.iApplicationProfile, d.iVersionMajor, d.iVersionMinor, d.iVersionMicro,
           d.bServiceBoundFlag,   d.iVisibility,   d.iAppPriority,  d.iAppTransportLabel};
 }
+
+Bytes DataComponent(uint8_t tag, const Bytes& info) { return sb::Descriptor(tag, sb::Cat({sb::U16(0x00A0), info})); }
 
 }  // namespace
 
@@ -84,7 +69,7 @@ TEST(ApplicationNameDescriptor, ReadsLanguageAndNameWithinTheFieldAndTheLength) 
   for (Case& c : cases) {
     RavelCApplicationNameDescriptor d(c.raw.data());
     EXPECT_EQ(c.language, d.GetISOLanguageCode()) << c.label;
-    EXPECT_EQ(c.name, Field(d.szApplicationName, sizeof(d.szApplicationName))) << c.label;
+    EXPECT_EQ(c.name, FieldText(d.szApplicationName, sizeof(d.szApplicationName))) << c.label;
     for (size_t i = c.name.size(); i < sizeof(d.szApplicationName); ++i) {
       ASSERT_EQ(0, d.szApplicationName[i]) << c.label << " byte " << i;
     }
@@ -116,16 +101,12 @@ TEST(GingaAppLocDescriptor, SplitsThreeTextsNeverOverrunsAndShowsThemTerminated)
   };
   for (Case& c : cases) {
     RavelCGingaAppLocDescriptor d(c.raw.data());
-    EXPECT_EQ(c.base, Field(d.sBaseDirectory, sizeof(d.sBaseDirectory))) << c.label;
-    EXPECT_EQ(c.classPath, Field(d.sClassPath, sizeof(d.sClassPath))) << c.label;
-    EXPECT_EQ(c.initial, Field(d.sInicialClassName, sizeof(d.sInicialClassName))) << c.label;
-    TraceRecorder recorder;
-    d.Show();
-    ASSERT_EQ(3u, recorder.Records().size());
-    EXPECT_EQ("\t  sBaseDirectory = " + c.base + ", sClassPath = " + c.classPath + ", sInicialClassName = " +
-                  c.initial + " \n",
-              recorder.Records()[2].text)
-        << c.label;
+    EXPECT_EQ(c.base, FieldText(d.sBaseDirectory, sizeof(d.sBaseDirectory))) << c.label;
+    EXPECT_EQ(c.classPath, FieldText(d.sClassPath, sizeof(d.sClassPath))) << c.label;
+    EXPECT_EQ(c.initial, FieldText(d.sInicialClassName, sizeof(d.sInicialClassName))) << c.label;
+    EXPECT_EQ(At(kWarning, {"\t  sBaseDirectory = " + c.base + ", sClassPath = " + c.classPath +
+                                ", sInicialClassName = " + c.initial + " \n"}),
+              BodyLines(d)) << c.label;
   }
 }
 
@@ -142,22 +123,11 @@ TEST(GingaAppDescriptor, NeverFillsItsParameterButClearsItOnNull) {
   EXPECT_STREQ("", d.szParameter);
   // A parameter that fills the field prints as its 255 bytes only.
   std::memset(d.szParameter, 'p', sizeof(d.szParameter));
-  TraceRecorder recorder;
-  d.Show();
-  ASSERT_EQ(3u, recorder.Records().size());
-  EXPECT_EQ("\t iParameter " + std::string(255, 'p') + " \n", recorder.Records()[2].text);
+  EXPECT_EQ(At(kWarning, {"\t iParameter " + std::string(255, 'p') + " \n"}), BodyLines(d));
 }
 
-namespace {
-
-Bytes DataComponent(uint8_t tag, const Bytes& info) {
-  return sb::Descriptor(tag, sb::Cat({sb::U16(0x00A0), info}));
-}
-
-}  // namespace
-
-// The values themselves are walked bit by bit below; here, which records exist
-// and the information trace of each value.
+// The values themselves are walked bit by bit below; here, which records exist,
+// the information trace of each value and the Show dump.
 TEST(GingaAppDataComponentDescriptor, DecodesAndTracesEachValueAtInformationLevel) {
   struct Case {
     const char* label;
@@ -197,9 +167,11 @@ TEST(GingaAppDataComponentDescriptor, DecodesAndTracesEachValueAtInformationLeve
     RavelCGingaAppDataComponentDescriptor d(cases[0].raw.data());
     TraceRecorder recorder;
     EXPECT_EQ(c.result, d.ParseRawData(c.raw.data()));
-    EXPECT_EQ(th::At(kInfo, c.traces), recorder.Lines());
+    EXPECT_EQ(At(kWarning, c.traces), recorder.Lines());
     EXPECT_EQ(c.hasInfo ? 0x00A0 : 0, d.iDataComponentId);
     ASSERT_EQ(c.hasInfo, d.GetAdditionalGingaInfo() != nullptr);
+    // Show prints the base line only, none of the records.
+    EXPECT_EQ(Dump({BaseLine(c.raw[0], c.raw[1], "Unknown Descriptor")}), ShowLines(d));
     if (!c.hasInfo) continue;
     EXPECT_EQ(c.hasCarousel, d.GetAdditionalGingaInfo()->GetData() != nullptr);
   }
@@ -209,12 +181,6 @@ TEST(GingaAppDataComponentDescriptor, DecodesAndTracesEachValueAtInformationLeve
             (std::vector<unsigned int>{fresh.GetTransmissionFormat(), fresh.GetApplicationIdentifierFlag(),
                                        fresh.GetDocumentResolution(), fresh.GetIndependentFlag(),
                                        fresh.iApplicationIdentifierOrgId, fresh.GetApplicationIdentifierAppId()}));
-}
-
-TEST(GingaAppDataComponentDescriptor, ShowsTheBaseLineOnly) {
-  Bytes raw = DataComponent(0xFD, sb::Cat({sb::U8(0x86), sb::U32(1), sb::U8(0)}));
-  RavelCGingaAppDataComponentDescriptor d(raw.data());
-  EXPECT_EQ(th::Dump({th::BaseLine(0xFD, 8, "Unknown Descriptor")}), th::ShowLines(d));
 }
 
 TEST(GingaAppDataComponentDescriptor, CopiesOwnTheirRecords) {
@@ -251,8 +217,6 @@ TEST(GingaAppDataComponentDescriptor, CopiesOwnTheirRecords) {
 
 namespace {
 
-using Values = std::vector<int64_t>;
-
 // The data component id, the additional Ginga information from byte 4 and,
 // for transmission format 2, its object carousel record (zeros without one).
 Values GingaDataComponentFields(unsigned char* raw) {
@@ -286,7 +250,6 @@ std::vector<bitwalk::Field> GingaDataComponentLayout(bool identified, bool carou
 }  // namespace
 
 TEST(GingaDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
-  using bitwalk::Base;
   const bitwalk::Walk walks[] = {
       // The profiles length is read and dropped; one profile is read whatever it says.
       {"application", Base({0x00, 9}, 12), 16, 88, {{"application profile", {{24, 16}}}, {"version major", {{40, 8}}},
@@ -307,6 +270,5 @@ TEST(GingaDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       {"object carousel after the identifier", Base({0xFD, 0x20, 0, 0, 0xA0}, 40), 88, 128,
        GingaDataComponentLayout(true, true), GingaDataComponentFields},
   };
-  TraceRecorder recorder;  // the Ginga data component traces every value it reads
-  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
+  RunWalks(walks);
 }
