@@ -2,18 +2,7 @@
 // and their lookups, and country availability with its code records.
 #include <gtest/gtest.h>
 
-#include <string>
-#include <vector>
-
-#include "BitWalk.h"
-#include "Ravel_CDescriptorCountryAvailability.h"
-#include "Ravel_CDescriptorLocalTimeOffset.h"
-#include "Ravel_CDescriptorParentalRating.h"
-#include "Ravel_Cfg.h"
 #include "DescriptorShow.h"
-#include "StreamBuilder.h"
-#include "TestHelpers.h"
-#include "TraceRecorder.h"
 
 using namespace th;
 
@@ -29,6 +18,7 @@ Bytes Offset(const char* country, uint8_t regionByte, uint16_t offset, const Byt
 }  // namespace
 
 TEST(ParentalRatingAge, FollowsTheStandardInForceAtParseTime) {
+  const int brazil = RAVEL_STANDARD_BRAZIL, japan = RAVEL_STANDARD_JAPAN;
   struct Case {
     int standard;
     uint8_t rating;
@@ -36,19 +26,15 @@ TEST(ParentalRatingAge, FollowsTheStandardInForceAtParseTime) {
     unsigned int minimumAge;
     const char* trace;  // null: nothing traced
   } cases[] = {
-      // Brazil: content in the upper nibble, age selector in the lower.
-      {RAVEL_STANDARD_BRAZIL, 0x01, 0, 0, nullptr},  // "L": free for all ages
-      {RAVEL_STANDARD_BRAZIL, 0x12, 1, 10, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x23, 2, 12, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x34, 3, 14, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x45, 4, 16, nullptr},
-      {RAVEL_STANDARD_BRAZIL, 0x56, 5, 18, nullptr}, {RAVEL_STANDARD_BRAZIL, 0x00, 0, 0, "Unknown ageSelector=[0]\n"},
-      {RAVEL_STANDARD_BRAZIL, 0x67, 6, 0, "Unknown ageSelector=[7]\n"},
+      // Brazil: content in the upper nibble, age selector in the lower (1: "L", free for all ages).
+      {brazil, 0x01, 0, 0, nullptr}, {brazil, 0x12, 1, 10, nullptr}, {brazil, 0x23, 2, 12, nullptr},
+      {brazil, 0x34, 3, 14, nullptr}, {brazil, 0x45, 4, 16, nullptr}, {brazil, 0x56, 5, 18, nullptr},
+      {brazil, 0x00, 0, 0, "Unknown ageSelector=[0]\n"}, {brazil, 0x67, 6, 0, "Unknown ageSelector=[7]\n"},
       // Any standard other than 1 follows the Brazilian table.
       {7, 0x23, 2, 12, nullptr},
       // Japan: rating + 3 for 1 to 15, otherwise 0; content never set.
-      {RAVEL_STANDARD_JAPAN, 0x00, 0, 0, nullptr}, {RAVEL_STANDARD_JAPAN, 0x01, 0, 4, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x05, 0, 8, nullptr}, {RAVEL_STANDARD_JAPAN, 0x0F, 0, 18, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0x10, 0, 0, nullptr}, {RAVEL_STANDARD_JAPAN, 0x23, 0, 0, nullptr},
-      {RAVEL_STANDARD_JAPAN, 0xFF, 0, 0, nullptr},
+      {japan, 0x00, 0, 0, nullptr}, {japan, 0x01, 0, 4, nullptr}, {japan, 0x05, 0, 8, nullptr},
+      {japan, 0x0F, 0, 18, nullptr}, {japan, 0x10, 0, 0, nullptr}, {japan, 0xFF, 0, 0, nullptr},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(testing::Message() << "standard " << c.standard << " rating 0x" << std::hex << int(c.rating));
@@ -61,9 +47,7 @@ TEST(ParentalRatingAge, FollowsTheStandardInForceAtParseTime) {
     EXPECT_STREQ("bra", entry->GetCountryCode());
     EXPECT_EQ(c.content, entry->GetContent());
     EXPECT_EQ(c.minimumAge, entry->GetMinimumAge());
-    TraceLines expected;
-    if (c.trace) expected.push_back(std::make_pair(kWarning, std::string(c.trace)));
-    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ(c.trace ? At(kWarning, {c.trace}) : TraceLines(), recorder.Lines());
   }
 }
 
@@ -291,10 +275,6 @@ TEST(CountryAvailabilityDescriptor, ReadsTheFlagAndThreeByteCodesAndPanicsOutsid
 
 namespace {
 
-using bitwalk::Base;
-using bitwalk::Field;
-using Values = std::vector<int64_t>;
-
 // The first entry of a local time offset descriptor, whose entry starts at byte
 // 2: everything but the MJD of the time of change (bytes 8 and 9), which is no
 // sum of its bits. The BCD digits count ten times in their tens place.
@@ -336,6 +316,5 @@ TEST(RatingDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {d.GetCountryAvailabilityFlag()};
        }},
   };
-  TraceRecorder recorder;
-  for (const bitwalk::Walk& walk : walks) bitwalk::Run(walk);
+  RunWalks(walks);
 }
