@@ -3,17 +3,11 @@
 // class, and the factory and copier over their one tag table.
 #include <gtest/gtest.h>
 
-#include <algorithm>
 #include <cstdio>
-#include <memory>
 #include <map>
-#include <string>
+#include <memory>
 
-#include "RavelSectionParser.h"
 #include "DescriptorShow.h"
-#include "StreamBuilder.h"
-#include "TestHelpers.h"
-#include "TraceRecorder.h"
 
 using namespace th;
 
@@ -81,7 +75,6 @@ const std::vector<ClassCase>& Classes() {
        .refusal = kOwnRule},
       {CLASS(RavelCServiceDescriptor), .displayName = "Service Descriptor", .wrongText = Wrong("Service Descriptor"),
        .banner = Banner("Service Descriptor"), .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}),
-       .richBody = Dump({"\tService Type=[0x01]\n", "\tService Provider Name=[ABC]\n", "\tService Name=[TV]\n"}),
        .refusal = kOwnRule, .copiesEverything = false},
       {CLASS(RavelCLinkageDescriptor), .displayName = "Linkage Descriptor", .wrongText = Wrong("Linkage Descriptor"),
        .banner = Banner("Linkage Descriptor"),
