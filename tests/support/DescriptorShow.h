@@ -37,4 +37,7 @@ void RunWalks(const bitwalk::Walk (&walks)[N]) {
 
 }  // namespace th
 
+// A walk's reader: the values `fields` (over the object `d`) of a fresh object of class T.
+#define RAVEL_WALK_READER(T, ...) [](unsigned char* raw) -> th::Values { T d(raw); return {__VA_ARGS__}; }
+
 #endif
