@@ -388,21 +388,17 @@ Bytes TsInformationBase() {
   return raw;
 }
 
-Values ExtendedBroadcasterHeader(unsigned char* raw) {
-  RavelCExtendedBroadcasterDescriptor d(raw);
-  return {d.GetBroadcasterType(), d.GetTerrestrialBroadcasterId(), d.GetNumberOfAffiliationIds(),
-          d.GetNumberOfBroadcasterIds()};
-}
+const bitwalk::Reader ExtendedBroadcasterHeader =
+    RAVEL_WALK_READER(RavelCExtendedBroadcasterDescriptor, d.GetBroadcasterType(), d.GetTerrestrialBroadcasterId(),
+                      d.GetNumberOfAffiliationIds(), d.GetNumberOfBroadcasterIds());
 
 const std::vector<Field> kExtendedBroadcasterHeader = {
     {"broadcaster type", {{16, 4}}}, {"terrestrial broadcaster id", {{24, 16}}}, {"affiliation id count", {{40, 4}}},
     {"broadcaster id count", {{44, 4}}},
 };
 
-Values LogoFields(unsigned char* raw) {
-  RavelCLogoTransmissionDescriptor d(raw);
-  return {d.GetLogoId(), d.GetLogoVersion(), d.GetDownloadDataId()};
-}
+const bitwalk::Reader LogoFields =
+    RAVEL_WALK_READER(RavelCLogoTransmissionDescriptor, d.GetLogoId(), d.GetLogoVersion(), d.GetDownloadDataId());
 
 }  // namespace
 
@@ -410,17 +406,12 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
       {"linkage", Base({0x4A, 7}, 9), 16, 72, {{"transport stream id", {{16, 16}}}, {"original network id", {{32, 16}}},
         {"service id", {{48, 16}}}, {"linkage type", {{64, 8}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCLinkageDescriptor d(raw);
-         return {d.GetTransportStreamId(), d.GetOriginalNetworkId(), d.GetServiceId(), d.GetLinkageType()};
-       }},
+       RAVEL_WALK_READER(RavelCLinkageDescriptor, d.GetTransportStreamId(), d.GetOriginalNetworkId(), d.GetServiceId(),
+                         d.GetLinkageType())},
       {"TS information", TsInformationBase(), 16, 32,
        {{"remote control key id", {{16, 8}}}, {"TS name length", {{24, 6}}}, {"transmission type count", {{30, 2}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCTSInformationDescriptor d(raw);
-         return {d.GetRemoteControlKeyId(), static_cast<int64_t>(std::strlen(d.GetTsName())),
-                 d.GetTransmissionTypeCount()};
-       }},
+       RAVEL_WALK_READER(RavelCTSInformationDescriptor, d.GetRemoteControlKeyId(),
+                         static_cast<int64_t>(std::strlen(d.GetTsName())), d.GetTransmissionTypeCount())},
       // Types 0 to 15; only types 1 and 2 read more, from zeros here.
       {"extended broadcaster type", Base({0xCE, 0x20, 0x00}, 40), 16, 24, kExtendedBroadcasterHeader,
        ExtendedBroadcasterHeader},
@@ -434,35 +425,26 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       {"extended broadcaster loops", Base({0xCE, 0x20, 0x10, 0x00, 0x00, 0x22}, 40), 48, 112,
        {{"affiliation id 0", {{48, 8}}}, {"affiliation id 1", {{64, 8}}}, {"original network id 0", {{64, 16}}},
         {"broadcaster id 0", {{80, 8}}}, {"original network id 1", {{88, 16}}}, {"broadcaster id 1", {{104, 8}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCExtendedBroadcasterDescriptor d(raw);
-         return {d.GetAffiliationId(0), d.GetAffiliationId(1), d.GetOriginalNetworkId(0),
-                 d.GetBroadcasterId(0),  d.GetOriginalNetworkId(1), d.GetBroadcasterId(1)};
-       }},
+       RAVEL_WALK_READER(RavelCExtendedBroadcasterDescriptor, d.GetAffiliationId(0), d.GetAffiliationId(1),
+                         d.GetOriginalNetworkId(0), d.GetBroadcasterId(0), d.GetOriginalNetworkId(1),
+                         d.GetBroadcasterId(1))},
       {"logo transmission type 1", Base({0xCF, 7, 0x01}, 9), 24, 72,
        {{"logo id", {{31, 9}}}, {"logo version", {{44, 12}}}, {"download data id", {{56, 16}}}}, LogoFields},
       {"logo transmission type 2", Base({0xCF, 7, 0x02}, 9), 24, 72,
        {{"logo id", {{31, 9}}}, {"logo version", {}}, {"download data id", {}}}, LogoFields},
       {"terrestrial delivery system", Base({0xFA, 2}, 4), 16, 32,
        {{"area code", {{16, 12}}}, {"guard interval", {{28, 2}}}, {"transmission mode", {{30, 2}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCTerrDeliverySystemDescriptor d(raw);
-         return {d.GetAreaCode(), d.GetGuardInterval(), d.GetTransmissionMode()};
-       }},
+       RAVEL_WALK_READER(RavelCTerrDeliverySystemDescriptor, d.GetAreaCode(), d.GetGuardInterval(),
+                         d.GetTransmissionMode())},
       // Only the high byte of each service id is kept.
       {"partial reception", Base({0xFB, 4}, 6), 16, 48, {{"service id 0", {{16, 8}}}, {"service id 1", {{32, 8}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCPartialReceptionDescriptor d(raw);
-         return {d.GetServiceId(0), d.GetServiceId(1)};
-       }},
+       RAVEL_WALK_READER(RavelCPartialReceptionDescriptor, d.GetServiceId(0), d.GetServiceId(1))},
       // The flag is the two lowest bits, inside the identifier; the two top bits
       // of the byte are read by nobody.
       {"system management", Base({0xFE, 2}, 4), 16, 32, {{"broadcasting flag", {{22, 2}}},
         {"broadcasting identifier", {{18, 6}}}, {"additional broadcasting identification", {{24, 8}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCSystemManagementDescriptor d(raw);
-         return {d.GetBroadcastingFlag(), d.GetBroadcastingIdentifier(), d.GetAdditionalBroadcastingIdentification()};
-       }},
+       RAVEL_WALK_READER(RavelCSystemManagementDescriptor, d.GetBroadcastingFlag(), d.GetBroadcastingIdentifier(),
+                         d.GetAdditionalBroadcastingIdentification())},
   };
   RunWalks(walks);
 }
