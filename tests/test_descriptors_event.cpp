@@ -226,13 +226,11 @@ TEST(ContentDescriptor, SplitsGenresAndTracesEachOne) {
 
 namespace {
 
-Values AudioComponentFields(unsigned char* raw) {
-  RavelCAudioComponentDescriptor d(raw);
-  return {d.GetStreamContent(),      d.GetComponentType(),     d.GetComponentTag(),
-          d.GetStreamType(),         d.GetSimulcastGroupTag(), d.GetESMultiLingualFlag(),
-          d.GetMainComponentFlag(),  d.GetQualityIndicator(),  d.GetSampleRate(),
-          d.GetISO639LanguageCode(), d.GetISO639LanguageCode2()};
-}
+const bitwalk::Reader AudioComponentFields =
+    RAVEL_WALK_READER(RavelCAudioComponentDescriptor, d.GetStreamContent(), d.GetComponentType(), d.GetComponentTag(),
+                      d.GetStreamType(), d.GetSimulcastGroupTag(), d.GetESMultiLingualFlag(), d.GetMainComponentFlag(),
+                      d.GetQualityIndicator(), d.GetSampleRate(), d.GetISO639LanguageCode(),
+                      d.GetISO639LanguageCode2());
 
 const std::vector<Field> kAudioComponentFields = {
     {"stream content", {{20, 4}}},          {"component type", {{24, 8}}},
@@ -249,16 +247,11 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
       {"extended event", Base({0x4E, 5}, 8), 16, 24,
        {{"descriptor number", {{16, 4}}}, {"last descriptor number", {{20, 4}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCExtendedEventDescriptor d(raw);
-         return {d.GetDescriptorNumber(), d.GetLastDescriptorNumber()};
-       }},
+       RAVEL_WALK_READER(RavelCExtendedEventDescriptor, d.GetDescriptorNumber(), d.GetLastDescriptorNumber())},
       {"component", Base({0x50, 6}, 8), 16, 64, {{"stream content", {{20, 4}}}, {"component type", {{24, 8}}},
         {"component tag", {{32, 8}}}, {"ISO 639 language code", {{40, 24}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCComponentDescriptor d(raw);
-         return {d.GetStreamContent(), d.GetComponentType(), d.GetComponentTag(), d.GetISO639LanguageCode()};
-       }},
+       RAVEL_WALK_READER(RavelCComponentDescriptor, d.GetStreamContent(), d.GetComponentType(), d.GetComponentTag(),
+                         d.GetISO639LanguageCode())},
       // The ES multi-lingual bit alone reads a second code, from zeros here.
       {"audio component", Base({0xC4, 0x20}, 40), 16, 88, kAudioComponentFields, AudioComponentFields},
       {"audio component, second code", Base({0xC4, 0x20, 0, 0, 0, 0, 0, 0x80}, 40), 88, 112, kAudioComponentFields,
@@ -272,22 +265,15 @@ TEST(EventDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
          return {level1, level2, d.GetUserGenre(0)};
        }},
       {"data component", Base({0xFD, 2}, 4), 16, 32, {{"data component id", {{16, 16}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCDataComponentDescriptor d(raw);
-         return {d.GetDataComponentId()};
-       }},
+       RAVEL_WALK_READER(RavelCDataComponentDescriptor, d.GetDataComponentId())},
       {"series", Base({0xD5, 8}, 12), 16, 80, {{"series id", {{16, 16}}}, {"repeat label", {{32, 4}}},
         {"program pattern", {{36, 3}}}, {"expire date valid flag", {{39, 1}}}, {"expire date", {{40, 16}}},
         {"episode number", {{56, 12}}}, {"last episode number", {{68, 12}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCSeriesDescriptor d(raw);
-         return {d.GetSeriesId(),   d.GetRepeatLabel(),     d.GetProgramPattern(),     d.GetExpireDateValidFlag(),
-                 d.GetExpireDate(), d.GetEpisodeNumber(), d.GetLastEpisodeNumber()};
-       }},
-      {"copyright", Base({0x0D, 4}, 12), 16, 48, {{"copyright id", {{16, 32}}}}, [](unsigned char* raw) -> Values {
-         RavelCCopyrightDescriptor d(raw);
-         return {d.GetCopyrightId()};
-       }},
+       RAVEL_WALK_READER(RavelCSeriesDescriptor, d.GetSeriesId(), d.GetRepeatLabel(), d.GetProgramPattern(),
+                         d.GetExpireDateValidFlag(), d.GetExpireDate(), d.GetEpisodeNumber(),
+                         d.GetLastEpisodeNumber())},
+      {"copyright", Base({0x0D, 4}, 12), 16, 48, {{"copyright id", {{16, 32}}}},
+       RAVEL_WALK_READER(RavelCCopyrightDescriptor, d.GetCopyrightId())},
   };
   RunWalks(walks);
 }
