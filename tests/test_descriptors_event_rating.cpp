@@ -302,19 +302,14 @@ TEST(RatingDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       // Selector 1 ("L", age 0) stays; the content nibble above it is walked.
       {"parental rating content", Base({0x55, 4, 'B', 'R', 'A', 0x01}, 8), 40, 44,
        {{"content", {{40, 4}}}, {"minimum age", {}}},
-       [](unsigned char* raw) -> Values {
-         RavelCParentalRatingDescriptor d(raw);
-         return {d.GetParentalRating(0)->GetContent(), d.GetParentalRating(0)->GetMinimumAge()};
-       }},
+       RAVEL_WALK_READER(RavelCParentalRatingDescriptor, d.GetParentalRating(0)->GetContent(),
+                         d.GetParentalRating(0)->GetMinimumAge())},
       {"local time offset region and offset", Base({0x58, 13, 'B', 'R', 'A'}, 16), 40, 64, kLocalTimeOffsetFields,
        LocalTimeOffsetFields},
       {"local time offset change and next offset", Base({0x58, 13, 'B', 'R', 'A'}, 16), 80, 120,
        kLocalTimeOffsetFields, LocalTimeOffsetFields},
       {"country availability", Base({0x49, 1}, 4), 16, 24, {{"country availability flag", {{16, 1}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCCountryAvailabilityDescriptor d(raw);
-         return {d.GetCountryAvailabilityFlag()};
-       }},
+       RAVEL_WALK_READER(RavelCCountryAvailabilityDescriptor, d.GetCountryAvailabilityFlag())},
   };
   RunWalks(walks);
 }
