@@ -255,11 +255,9 @@ TEST(GingaDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
       {"application", Base({0x00, 9}, 12), 16, 88, {{"application profile", {{24, 16}}}, {"version major", {{40, 8}}},
         {"version minor", {{48, 8}}}, {"version micro", {{56, 8}}}, {"service bound flag", {{64, 1}}},
         {"visibility", {{65, 2}}}, {"application priority", {{72, 8}}}, {"transport protocol label", {{80, 8}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCApplicationDescriptor d(raw);
-         return {d.GetApplicationProfile(), d.GetVersionMajor(),     d.GetVersionMinor(),    d.GetVersionMicro(),
-                 d.GetServiceBoundFlag(),   d.GetVisibility(),       d.GetAppPriority(),     d.GetAppTransportLabel()};
-       }},
+       RAVEL_WALK_READER(RavelCApplicationDescriptor, d.GetApplicationProfile(), d.GetVersionMajor(),
+                         d.GetVersionMinor(), d.GetVersionMicro(), d.GetServiceBoundFlag(), d.GetVisibility(),
+                         d.GetAppPriority(), d.GetAppTransportLabel())},
       // The flags byte; the identifier and the carousel record then come from zeros.
       {"ginga data component", Base({0xFD, 0x20}, 40), 16, 40, GingaDataComponentLayout(false, false),
        GingaDataComponentFields},
