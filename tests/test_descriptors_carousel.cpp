@@ -174,30 +174,16 @@ Bytes GeneralEventBase(uint8_t mode) { return bitwalk::Base({0x40, 11, 0x00, 0x0
 TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
       {"module link", Base({0x04, 3}, 5), 16, 40, {{"position", {{16, 8}}}, {"module id", {{24, 16}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCModuleLinkDescriptor d(raw);
-         return {d.GetPosition(), d.GetModuleId()};
-       }},
+       RAVEL_WALK_READER(RavelCModuleLinkDescriptor, d.GetPosition(), d.GetModuleId())},
       {"CRC32", Base({0x05, 4}, 6), 16, 48,
        {{"CRC byte 0", {{16, 8}}}, {"CRC byte 1", {{24, 8}}}, {"CRC byte 2", {{32, 8}}}, {"CRC byte 3", {{40, 8}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCCRC32Descriptor d(raw);
-         return {d.GetCRC32()[0], d.GetCRC32()[1], d.GetCRC32()[2], d.GetCRC32()[3]};
-       }},
-      {"location", Base({0x06, 1}, 3), 16, 24, {{"location tag", {{16, 8}}}}, [](unsigned char* raw) -> Values {
-         RavelCLocationDescriptor d(raw);
-         return {d.GetLocationTag()};
-       }},
+       RAVEL_WALK_READER(RavelCCRC32Descriptor, d.GetCRC32()[0], d.GetCRC32()[1], d.GetCRC32()[2], d.GetCRC32()[3])},
+      {"location", Base({0x06, 1}, 3), 16, 24, {{"location tag", {{16, 8}}}},
+       RAVEL_WALK_READER(RavelCLocationDescriptor, d.GetLocationTag())},
       {"estimated download time", Base({0x07, 4}, 6), 16, 48, {{"estimated download time", {{16, 32}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCEstDownloadTimeDescriptor d(raw);
-         return {d.GetEstDownloadTime()};
-       }},
+       RAVEL_WALK_READER(RavelCEstDownloadTimeDescriptor, d.GetEstDownloadTime())},
       {"compression type", Base({0xC2, 5}, 7), 16, 56, {{"compression type", {{16, 8}}}, {"original size", {{24, 32}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCCompressionTypeDescriptor d(raw);
-         return {d.GetCompressionType(), d.GetOriginalSize()};
-       }},
+       RAVEL_WALK_READER(RavelCCompressionTypeDescriptor, d.GetCompressionType(), d.GetOriginalSize())},
       // Bytes 8 to 10 and the top seven bits of bytes 3 and 11 are read by nobody.
       {"NPT reference", Base({0x17, 18}, 20), 16, 160, {{"post discontinuity indicator", {{16, 1}}},
         {"content id", {{17, 7}}}, {"STC reference bit 32", {{31, 1}}}, {"STC reference byte 1", {{32, 8}}},
