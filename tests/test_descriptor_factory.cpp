@@ -30,15 +30,18 @@ void Assign(RavelCDescriptorBase* target, RavelCDescriptorBase* source) {
 // What a refused parse (null or a foreign tag) leaves of a parsed object's fields.
 enum Refusal { kEmptied, kKept, kOwnRule };
 
+std::string Wrong(const std::string& words) { return "This Descriptor isn't " + words + "! Descriptor Tag=[0x99]\n"; }
+
+// The refusal text and the banner name the class as its display name does unless a row says otherwise.
 struct ClassCase {
   const char* name;
   RavelCDescriptorBase* (*make)(unsigned char*);
   RavelCDescriptorBase* (*copy)(RavelCDescriptorBase*);
   void (*assign)(RavelCDescriptorBase*, RavelCDescriptorBase*);
   std::string displayName;
-  std::string wrongText = "";  // for tag 0x99; "": every tag is taken silently
+  std::string wrongText = Wrong(displayName);  // for tag 0x99; "": every tag is taken silently
   unsigned int wrongMask = kWarning;
-  std::string banner = "";  // "": Show prints the base line only
+  std::string banner = Banner(displayName);  // "": Show prints the base line only
   unsigned int bannerMask = kDump;
   bool tracesNull = false;  // "Invalid Argument!\n" at the error level
   Bytes rich;
@@ -48,8 +51,6 @@ struct ClassCase {
   bool pinEmptyBody = false;
   std::vector<std::string> emptyBody = {};  // the own Show lines of an empty object
 };
-
-std::string Wrong(const std::string& words) { return "This Descriptor isn't " + words + "! Descriptor Tag=[0x99]\n"; }
 
 const std::vector<ClassCase>& Classes() {
   using sb::Cat;
@@ -65,62 +66,56 @@ const std::vector<ClassCase>& Classes() {
   static const std::vector<ClassCase> classes = {
       // Network, service and transmission descriptors: most refusals have rules of their own.
       {CLASS(RavelCNetworkNameDescriptor), .displayName = "Network Name Descriptor",
-       .wrongText = Wrong("Network Name Descriptor"), .banner = Banner("Network Descriptor"),
-       .rich = Descriptor(0x40, Text("Rede X")), .richBody = Dump({"\tNetwork Name=[Rede X]\n"}), .refusal = kOwnRule},
+       .banner = Banner("Network Descriptor"), .rich = Descriptor(0x40, Text("Rede X")),
+       .richBody = Dump({"\tNetwork Name=[Rede X]\n"}), .refusal = kOwnRule},
       {CLASS(RavelCServiceListDescriptor), .displayName = "Service List Descriptor",
-       .wrongText = Wrong("Service List Descriptor"), .banner = Banner("Service List Descriptor"),
        .rich = Descriptor(0x41, Bytes{0x00, 0x01, 0x01, 0x12, 0x34, 0xC0}),
        .richBody = Dump({"\tService List Length=[2]\n", "\t\t[0]th Service Info: Service ID=[0x0001], Service Type=[0x01]\n",
-                         "\t\t[1]th Service Info: Service ID=[0x1234], Service Type=[0xc0]\n"}),
-       .refusal = kOwnRule},
-      {CLASS(RavelCServiceDescriptor), .displayName = "Service Descriptor", .wrongText = Wrong("Service Descriptor"),
-       .banner = Banner("Service Descriptor"), .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}),
-       .refusal = kOwnRule, .copiesEverything = false},
-      {CLASS(RavelCLinkageDescriptor), .displayName = "Linkage Descriptor", .wrongText = Wrong("Linkage Descriptor"),
-       .banner = Banner("Linkage Descriptor"),
+                         "\t\t[1]th Service Info: Service ID=[0x1234], Service Type=[0xc0]\n"}), .refusal = kOwnRule},
+      {CLASS(RavelCServiceDescriptor), .displayName = "Service Descriptor",
+       .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}), .refusal = kOwnRule,
+       .copiesEverything = false},
+      {CLASS(RavelCLinkageDescriptor), .displayName = "Linkage Descriptor",
        .rich = Descriptor(0x4A, Cat({U16(0x7ED0), U16(0x0001), U16(0x4800), U8(0x02), U8(0xAA)})),
-       .richBody = Dump({"\tTransportStreamId=[0x7ed0], OrginalNetworkId=[0x0001], ServiceId=[0x4800], LinkageType=[0x02]\n"}),},
+       .richBody = Dump({"\tTransportStreamId=[0x7ed0], OrginalNetworkId=[0x0001], ServiceId=[0x4800], LinkageType=[0x02]\n"})},
       {CLASS(RavelCStreamIdentifierDescriptor), .displayName = "Stream Id Descriptor",
        .wrongText = Wrong("Stream Identifier Descriptor"), .banner = Banner("Stream Identifier Descriptor"),
        .rich = Descriptor(0x52, Bytes{0x81}), .richBody = Dump({"\tComponent Tag = [0x81]\n"})},
       {CLASS(RavelCTSInformationDescriptor), .displayName = "TS Information Descriptor",
-       .wrongText = Wrong("TS Information Descriptor"), .banner = Banner("TS Information Descriptor"),
        .rich = Descriptor(0xCD, Cat({Bytes{0x05, (3 << 2) | 2}, Text("TVA"), Bytes{0x0F, 2}, U16(0x4800), U16(0x4801),
                                      Bytes{0xAF, 1}, U16(0x4980)})),
        .richBody = Dump({"\tRemote Control Key Id=[0x05], Ts Name=[TVA], Tx Type Count=[2]\n",
                          "\t\tTramsmission Type Info=[0x0f], Num of Service=[2]\n", "\t\t\tTS Info: Service Id=[0x4800]\n",
                          "\t\t\tTS Info: Service Id=[0x4801]\n", "\t\tTramsmission Type Info=[0xaf], Num of Service=[1]\n",
-                         "\t\t\tTS Info: Service Id=[0x4980]\n"}),
-       .refusal = kOwnRule},
+                         "\t\t\tTS Info: Service Id=[0x4980]\n"}), .refusal = kOwnRule},
       {CLASS(RavelCExtendedBroadcasterDescriptor), .displayName = "Extended Braodcaster Descriptor",
        .wrongText = Wrong("Extended Broadcaster Descriptor"), .banner = Banner("Extended Broadcaster Descriptor"),
        .rich = Descriptor(0xCE, Bytes{0x1F, 0x01, 0x23, 0x21, 0x0A, 0x0B, 0x7E, 0xD0, 0x05}),
        .richBody = Dump({"\tiBroadcasterType=[0x1], Affiliation ID Nums=[2], Broadcaster ID Nums=[1]\n",
                          "\t\t[0]th Affiliation Id=[10]\n", "\t\t[1]th Affiliation Id=[126]\n",
-                         "\t\t[0]th Org Network Id=[32464], Broadcaster ID=[5]\n"}),
-       .refusal = kOwnRule},
+                         "\t\t[0]th Org Network Id=[32464], Broadcaster ID=[5]\n"}), .refusal = kOwnRule},
       {CLASS(RavelCLogoTransmissionDescriptor), .displayName = "Logo Transmission Descriptor",
        .wrongText = Wrong("LogoTransmission Descriptor"), .banner = Banner("LogoTransmission Descriptor"),
        .rich = Descriptor(0xCF, Bytes{0x01, 0xFF, 0x23, 0xF4, 0x56, 0x78, 0x9A}),
-       .richBody = Dump({"\tLogoTransmission Type=[0x01]\n", "\tLogo version=[1110]\n", "\tDownload ID=[30874]\n"}), .refusal = kKept},
+       .richBody = Dump({"\tLogoTransmission Type=[0x01]\n", "\tLogo version=[1110]\n", "\tDownload ID=[30874]\n"}),
+       .refusal = kKept},
       {CLASS(RavelCTerrDeliverySystemDescriptor), .displayName = "Terrestrial Delivery System Descriptor",
-       .wrongText = Wrong("Terrestrial Delivery System Descriptor"), .banner = Banner("Terrestrial Delivery Descriptor"),
-       .tracesNull = true, .rich = Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234), U16(0x0D4A)})),
+       .banner = Banner("Terrestrial Delivery Descriptor"), .tracesNull = true,
+       .rich = Descriptor(0xFA, Cat({Bytes{0x80, 0x1B}, U16(0x1234), U16(0x0D4A)})),
        .richBody = Dump({"\tArea Code=[0x0801], Guard Interval=[0x02], Tx Mode=[0x03], Num Of Freq=[2]\n",
                          "\t\tTerrDelSys: Frequency=[4660]\n", "\t\tTerrDelSys: Frequency=[3402]\n"}),
        .refusal = kOwnRule, .pinEmptyBody = true,
        .emptyBody = {"\tArea Code=[0x0000], Guard Interval=[0x00], Tx Mode=[0x00], Num Of Freq=[0]\n"}},
       {CLASS(RavelCPartialReceptionDescriptor), .displayName = "Partial Reception Descriptor",
-       .wrongText = Wrong("Partial Reception Descriptor"), .banner = Banner("Partial Reception Descriptor", 21),
-       .rich = Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)})),
+       .banner = Banner("Partial Reception Descriptor", 21), .rich = Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)})),
        .richBody = Dump({"\tService Id [0] = 18\n", "\tService Id [1] = 86\n"}), .refusal = kOwnRule},
-      {CLASS(RavelCSystemManagementDescriptor), .displayName = "System Management Descriptor",
-       .wrongText = Wrong("System Management Descriptor"), .banner = Banner("System Management Descriptor"),
-       .tracesNull = true, .rich = Descriptor(0xFE, Bytes{0xC5, 0x02, 0xFF}),
-       .richBody = Dump({"\tBroadcasting Flag=[0x01], Broadcasting Id=[0x05], Additional Ids=[0x02]\n"}), .refusal = kKept},
+      {CLASS(RavelCSystemManagementDescriptor), .displayName = "System Management Descriptor", .tracesNull = true,
+       .rich = Descriptor(0xFE, Bytes{0xC5, 0x02, 0xFF}),
+       .richBody = Dump({"\tBroadcasting Flag=[0x01], Broadcasting Id=[0x05], Additional Ids=[0x02]\n"}),
+       .refusal = kKept},
       // Event, content and rating descriptors: a refusal empties them; their Show
       // lines are pinned by their own tests.
-      {CLASS(RavelCCopyrightDescriptor), .displayName = "Copyright Descriptor", .wrongText = Wrong("Copyright Descriptor"),
+      {CLASS(RavelCCopyrightDescriptor), .displayName = "Copyright Descriptor",
        .banner = Banner("Copyright Descriptor", 21), .rich = Descriptor(0x0D, Cat({U32(0x80000001), Text("(C) TV")})),
        // The id goes through %d.
        .richBody = Dump({"\t Copyright id: -2147483647 \n", "\t Copyright info: (C) TV \n"}), .pinEmptyBody = true,
@@ -130,16 +125,13 @@ const std::vector<ClassCase>& Classes() {
        .rich = Descriptor(0x49, Cat({U8(0x80), Text("BRAARG")})), .pinEmptyBody = true,
        .emptyBody = {"\t Ability flag = 0\n", "\t Codes: \n"}},
       {CLASS(RavelCShortEventDescriptor), .displayName = "Short Event Descriptor",
-       .wrongText = Wrong("Short Event Descriptor"), .banner = Banner("Short Event Descriptor"),
        .rich = Descriptor(0x4D, Cat({Text("por"), U8(6), Text("Jornal"), U8(4), Text("News")})), .pinEmptyBody = true,
        .emptyBody = {"\tLanguageCode=[]\n", "\tEventName=[(null)]\n", "\tEventDescription=[(null)]\n"}},
       {CLASS(RavelCExtendedEventDescriptor), .displayName = "Extended Event Descriptor",
-       .wrongText = Wrong("Extended Event Descriptor"), .banner = Banner("Extended Event Descriptor"),
        .rich = Descriptor(0x4E, Cat({U8(0x13), Text("por"), U8(14), U8(5), Text("Actor"), U8(3), Text("Ana"), U8(3),
-                                     Text("Dir"), U8(1), Text("B"), U8(3), Text("ABC")})),
-       .pinEmptyBody = true, .emptyBody = {"\tDescriptorNumber=[0]\n", "\tLastDescriptorNumber=[0]\n"}},
-      {CLASS(RavelCComponentDescriptor), .displayName = "Component Descriptor", .wrongText = Wrong("Component Descriptor"),
-       .banner = Banner("Component Descriptor"),
+                                     Text("Dir"), U8(1), Text("B"), U8(3), Text("ABC")})), .pinEmptyBody = true,
+       .emptyBody = {"\tDescriptorNumber=[0]\n", "\tLastDescriptorNumber=[0]\n"}},
+      {CLASS(RavelCComponentDescriptor), .displayName = "Component Descriptor",
        .rich = Descriptor(0x50, Cat({U8(0xF5), U8(0xB3), U8(0x10), Text("por"), Text("HD")})),
        .richBody = Dump({"\tiStreamContent=[0x5], iComponentType=[0xb3], iComponentTag=[0x10], ISO Language Code=[0x706f72]\n"}),
        .pinEmptyBody = true,
@@ -150,11 +142,9 @@ const std::vector<ClassCase>& Classes() {
        .richBody = Dump({"\tiStreamContent=[0x2], iComponentType=[0x3], iComponentTag=[0x11],iStreamType=[0xf], "
                          "iSimulcastGroupTag=[0x1], iESMultiLingualFlag=[0x1], iMainComponentFlag=[0x1], "
                          "iQualityIndicator=[0x2], iSampleRate=[0x5], ISO Language Code=[0x706f72], ISO Language "
-                         "Code2=[0x737061]\n"}),
-       .pinEmptyBody = true, .emptyBody = {audioZero}},
-      {CLASS(RavelCContentDescriptor), .displayName = "Content Descriptor", .wrongText = Wrong("Content Descriptor"),
-       .banner = Banner("Content Descriptor", 21), .rich = Descriptor(0x54, Bytes{0x12, 0x34, 0xF0, 0x0F}),
-       .pinEmptyBody = true},
+                         "Code2=[0x737061]\n"}), .pinEmptyBody = true, .emptyBody = {audioZero}},
+      {CLASS(RavelCContentDescriptor), .displayName = "Content Descriptor", .banner = Banner("Content Descriptor", 21),
+       .rich = Descriptor(0x54, Bytes{0x12, 0x34, 0xF0, 0x0F}), .pinEmptyBody = true},
       {CLASS(RavelCParentalRatingDescriptor), .displayName = "Parental Rating Descriptor",
        .wrongText = Wrong("ParentalRating Descriptor"), .banner = Banner("Parental Rating Descriptor", 21),
        .rich = Descriptor(0x55, Cat({Text("BRA"), U8(0x23)})), .pinEmptyBody = true},
@@ -167,84 +157,74 @@ const std::vector<ClassCase>& Classes() {
        .rich = Descriptor(0xC6, Cat({U8(1), Text("SP-RJ")})),
        .richBody = Dump({"\t Region Spec Type: 1 \n", "\t Region Spec: SP-RJ \n"}), .pinEmptyBody = true,
        .emptyBody = {"\t Region Spec Type: 0 \n", "\t Region Spec: (null) \n"}},
-      {CLASS(RavelCSeriesDescriptor), .displayName = "Series Descriptor", .wrongText = Wrong("Series Descriptor"),
-       .banner = Banner("Series Descriptor"),
+      {CLASS(RavelCSeriesDescriptor), .displayName = "Series Descriptor",
        .rich = Descriptor(0xD5, Cat({U16(0x0102), U8(0xA7), U16(0xC079), sb::U24(0x00A00C), Text("Novela")})),
        .pinEmptyBody = true,
        .emptyBody = {"\tSeriesId=[0]\n", "\tRepeatLabel=[0]\n", "\tProgramPattern=[0]\n", "\tExpireDateValidFlag=[0]\n",
                      "\tExpireDate=[0]\n", "\tEpisodeNumber=[0]\n", "\tLastEpisodeNumber=[0]\n", "\tSeriesName=[(null)]\n"}},
       {CLASS(RavelCDataComponentDescriptor), .displayName = "Data Component Descriptor",
-       .wrongText = Wrong("Data Component Descriptor"), .banner = Banner("Data Component Descriptor"),
        .rich = Descriptor(0xFD, Cat({U16(0x00A0), U8(0x33)})), .richBody = Dump({"\tiDataComponentId=[0x00a0]\n"}),
        .pinEmptyBody = true, .emptyBody = {"\tiDataComponentId=[0x0000]\n"}},
       // Module info and stream descriptor section descriptors.
-      {CLASS(RavelCTypeDescriptor), .displayName = "Type Descriptor", .wrongText = Wrong("Type Descriptor"),
-       .banner = Banner("Type Descriptor"), .rich = Descriptor(0x01, Text("text/html")),
+      {CLASS(RavelCTypeDescriptor), .displayName = "Type Descriptor", .rich = Descriptor(0x01, Text("text/html")),
        .richBody = Dump({"\tiType=[text/html]\n"})},
-      {CLASS(RavelCNameDescriptor), .displayName = "Name Descriptor", .wrongText = Wrong("Name Descriptor"),
-       .banner = Banner("Name Descriptor"), .rich = Descriptor(0x02, Text("index.bml")),
+      {CLASS(RavelCNameDescriptor), .displayName = "Name Descriptor", .rich = Descriptor(0x02, Text("index.bml")),
        .richBody = Dump({"\tiFileName=[index.bml]\n"})},
       // The one descriptor that reports a foreign tag with the utility module bit.
-      {CLASS(RavelCInfoDescriptor), .displayName = "Info Descriptor", .wrongText = Wrong("Info Descriptor"),
-       .wrongMask = kUtilWarning, .banner = Banner("Info Descriptor"), .rich = Descriptor(0x03, Cat({Text("por"), Text("Guia")})),
+      {CLASS(RavelCInfoDescriptor), .displayName = "Info Descriptor", .wrongMask = kUtilWarning,
+       .rich = Descriptor(0x03, Cat({Text("por"), Text("Guia")})),
        .richBody = Dump({"\tiISO639LangCode=[por], ipTextChar=[Guia]\n"})},
       // The module id is printed in decimal under its label.
       {CLASS(RavelCModuleLinkDescriptor), .displayName = "Module Link Descriptor",
-       .wrongText = Wrong("Module Link Descriptor"), .banner = Banner("Module Link Descriptor"),
        .rich = Descriptor(0x04, Bytes{0x02, 0x12, 0x34}), .richBody = Dump({"\tiPosition=[2], iModuleId=[4660]\n"})},
-      {CLASS(RavelCCRC32Descriptor), .displayName = "CRC32 Descriptor", .wrongText = Wrong("CRC32 Descriptor"),
-       .banner = Banner("CRC32 Descriptor"), .rich = Descriptor(0x05, Bytes{0xDE, 0xAD, 0x0B, 0xEF}),
-       .richBody = Dump({"\tCRC32=[0xde 0xad 0x0b 0xef]\n"})},
-      {CLASS(RavelCLocationDescriptor), .displayName = "Location Descriptor", .wrongText = Wrong("Location Descriptor"),
-       .banner = Banner("Location Descriptor"), .rich = Descriptor(0x06, Bytes{0x81}),
+      {CLASS(RavelCCRC32Descriptor), .displayName = "CRC32 Descriptor",
+       .rich = Descriptor(0x05, Bytes{0xDE, 0xAD, 0x0B, 0xEF}), .richBody = Dump({"\tCRC32=[0xde 0xad 0x0b 0xef]\n"})},
+      {CLASS(RavelCLocationDescriptor), .displayName = "Location Descriptor", .rich = Descriptor(0x06, Bytes{0x81}),
        .richBody = Dump({"\tiLocationTag=[129]\n"})},
       // Misspelt display name; the 32-bit value goes through %d.
       {CLASS(RavelCEstDownloadTimeDescriptor), .displayName = "Estimated Donwload Time Descriptor",
        .wrongText = Wrong("Estimated Download Time Descriptor"), .banner = Banner("EST Download Time Descriptor"),
        .rich = Descriptor(0x07, U32(0x80000001u)), .richBody = Dump({"\tiEstDownloadTime=[-2147483647]\n"})},
       {CLASS(RavelCCompressionTypeDescriptor), .displayName = "Compression Type Descriptor",
-       .wrongText = Wrong("Compression Type Descriptor"), .banner = Banner("Compression Type Descriptor"),
        .rich = Descriptor(0xC2, Cat({U8(0x01), U32(756113)})),
        .richBody = Dump({"\tiCompressionType=[1], iOriginalSize=[756113]\n"})},
       // Two blanks after "isn't" in these two, which keep their fields when refused.
       // Reserved bits set around both references must not leak into them.
       {CLASS(RavelCNPTReferenceDescriptor), .displayName = "NPT Reference Descriptor",
-       .wrongText = Wrong(" NPT Reference Descriptor"), .banner = Banner("NPT Reference Descriptor"), .tracesNull = true,
+       .wrongText = Wrong(" NPT Reference Descriptor"), .tracesNull = true,
        .rich = Descriptor(0x17, Bytes{0xD5, 0xFF, 0x23, 0x45, 0x67, 0x89, 0xFF, 0xFF, 0xFF, 0xFE, 0x89, 0xAB, 0xCD, 0xEF,
                                       0x00, 0x03, 0x03, 0xE9}),
        .richBody = Dump({"\t Post Discontinuity Indicator=[1], Dsm_ContentID=[85]\n",
                          "\t STC_Reference=[0x01 0x23 0x45 0x67 0x89]\n", "\t NPT_Reference=[0x00 0x89 0xab 0xcd 0xef]\n",
-                         "\t Scale Numerator=[3], Scale Denominator=[1001]\n"}),
-       .refusal = kKept},
+                         "\t Scale Numerator=[3], Scale Denominator=[1001]\n"}), .refusal = kKept},
       {CLASS(RavelCGeneralEventDescriptor), .displayName = "General Event Descriptor",
-       .wrongText = Wrong(" General Event Descriptor"), .banner = Banner("General Event Descriptor"),
+       .wrongText = Wrong(" General Event Descriptor"),
        .rich = Descriptor(0x40, Bytes{0xAB, 0xC0, 2, 0xFE, 0x12, 0x34, 0x56, 0x78, 0x07, 0x01, 0x02, 'a', 'b'}),
        .richBody = Dump({"\t EventMsgGroupID=[2748], TimeMode=[2]\n", "\t EventMsg_NPT=[0x00 0x12 0x34 0x56 0x78]\n",
-                         "\t EventMsgType=[7], EventMsgID=[0x0102]\n"}),
-       .refusal = kKept},
+                         "\t EventMsgType=[7], EventMsgID=[0x0102]\n"}), .refusal = kKept},
       // Application-loop descriptors take any tag; banner and fields at the information level.
-      {CLASS(RavelCApplicationDescriptor), .displayName = "Application Descriptor",
-       .banner = Banner("Application Descriptor"), .bannerMask = kWarning,
+      {CLASS(RavelCApplicationDescriptor), .displayName = "Application Descriptor", .wrongText = "",
+       .bannerMask = kWarning,
        .rich = Descriptor(0x00, Cat({U8(5), U16(0x0001), Bytes{1, 2, 3}, Bytes{0xBF, 0x3C, 0x01}})),
        .richBody = At(kWarning, {"\t iApplicationProfile=1, iVersionMajor=1, iVersionMinor=2, iVersionMicro 3, "
                                  "bServiceBoundFlag=1, iVisibility=1, iAppPriority=60, iAppTransportLabel=1 \n"}),
        .refusal = kOwnRule},
       // The name descriptor takes the application descriptor's name.
-      {CLASS(RavelCApplicationNameDescriptor), .displayName = "Application Descriptor",
+      {CLASS(RavelCApplicationNameDescriptor), .displayName = "Application Descriptor", .wrongText = "",
        .banner = Banner("Application Name Descriptor"), .bannerMask = kWarning,
        .rich = Descriptor(0x01, Cat({Text("por"), U8(5), Text("Hello")})),
        .richBody = At(kWarning, {"\t iISOLanguageCode=por, iApplicationName=Hello"}), .refusal = kOwnRule},
-      {CLASS(RavelCGingaAppDescriptor), .displayName = "Ginga Application Descriptor",
-       .banner = Banner("Ginga Application Descriptor"), .bannerMask = kWarning, .rich = Descriptor(0x06, Cat({U8(3), Text("abc")})),
+      {CLASS(RavelCGingaAppDescriptor), .displayName = "Ginga Application Descriptor", .wrongText = "",
+       .bannerMask = kWarning, .rich = Descriptor(0x06, Cat({U8(3), Text("abc")})),
        .richBody = At(kWarning, {"\t iParameter  \n"}), .refusal = kOwnRule},
-      {CLASS(RavelCGingaAppLocDescriptor), .displayName = "Ginga Application Location Descriptor",
-       .banner = Banner("Ginga Application Location Descriptor"), .bannerMask = kWarning,
+      {CLASS(RavelCGingaAppLocDescriptor), .displayName = "Ginga Application Location Descriptor", .wrongText = "",
+       .bannerMask = kWarning,
        .rich = Descriptor(0x07, Cat({U8(4), Text("/app"), U8(3), Text("lib"), Text("main.ncl")})),
        .richBody = At(kWarning, {"\t  sBaseDirectory = /app, sClassPath = lib, sInicialClassName = main.ncl \n"}),
        .refusal = kOwnRule},
       // Named "Unknown Descriptor" even when the tag matches, and no banner.
       {CLASS(RavelCGingaAppDataComponentDescriptor), .displayName = "Unknown Descriptor",
-       .wrongText = Wrong("Ginga Application Data Component"),
+       .wrongText = Wrong("Ginga Application Data Component"), .banner = "",
        .rich = Descriptor(0xFD, Cat({U16(0x00A0), U8(0xB9), U32(0x10), U16(0x42), U32(0x12345678), U8(0xA0)})),
        .refusal = kOwnRule},
   };
