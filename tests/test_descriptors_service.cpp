@@ -72,23 +72,6 @@ TEST(ServiceDescriptor, ReadsBothNamesAndLeavesEmptyOnesNull) {
   }
 }
 
-TEST(ServiceDescriptor, CopyKeepsHeaderAndTypeButLosesBothNames) {
-  Bytes raw = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'});
-  Bytes other = Descriptor(0x48, Bytes{0x02, 1, 'X', 1, 'Y'});
-  RavelCServiceDescriptor source(raw.data());
-  RavelCServiceDescriptor constructed(source);
-  RavelCServiceDescriptor assigned(other.data());
-  assigned = source;
-  for (RavelCServiceDescriptor* copy : {&constructed, &assigned}) {
-    EXPECT_EQ(Dump({Banner("Service Descriptor"), BaseLine(0x48, 8, "Service Descriptor"), "\tService Type=[0x01]\n",
-                    "\tService Provider Name=[(null)]\n", "\tService Name=[(null)]\n"}),
-              ShowLines(*copy));
-    EXPECT_EQ(nullptr, copy->GetServiceName());
-  }
-  EXPECT_STREQ("ABC", source.GetServiceProviderName());
-  EXPECT_STREQ("TV", source.GetServiceName());
-}
-
 // Linkage, stream identifier, system management and type-1 logo refusals are in
 // the descriptor pattern table.
 TEST(ServiceDescriptorFailure, TsInfoZeroesOnNullOnlyAndTheOthersKeepScalarsButNotLists) {
