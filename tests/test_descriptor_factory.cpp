@@ -201,8 +201,7 @@ const std::vector<ClassCase>& Classes() {
       {CLASS(RavelCGeneralEventDescriptor), .displayName = "General Event Descriptor",
        .wrongText = Wrong(" General Event Descriptor"),
        .rich = Descriptor(0x40, Bytes{0xAB, 0xC0, 2, 0xFE, 0x12, 0x34, 0x56, 0x78, 0x07, 0x01, 0x02, 'a', 'b'}),
-       .richBody = Dump({"\t EventMsgGroupID=[2748], TimeMode=[2]\n", "\t EventMsg_NPT=[0x00 0x12 0x34 0x56 0x78]\n",
-                         "\t EventMsgType=[7], EventMsgID=[0x0102]\n"}), .refusal = kKept},
+       .refusal = kKept},
       // Application-loop descriptors take any tag; banner and fields at the information level.
       {CLASS(RavelCApplicationDescriptor), .displayName = "Application Descriptor", .wrongText = "",
        .bannerMask = kWarning,
@@ -220,9 +219,7 @@ const std::vector<ClassCase>& Classes() {
        .richBody = At(kWarning, {"\t iParameter  \n"}), .refusal = kOwnRule},
       {CLASS(RavelCGingaAppLocDescriptor), .displayName = "Ginga Application Location Descriptor", .wrongText = "",
        .bannerMask = kWarning,
-       .rich = Descriptor(0x07, Cat({U8(4), Text("/app"), U8(3), Text("lib"), Text("main.ncl")})),
-       .richBody = At(kWarning, {"\t  sBaseDirectory = /app, sClassPath = lib, sInicialClassName = main.ncl \n"}),
-       .refusal = kOwnRule},
+       .rich = Descriptor(0x07, Cat({U8(4), Text("/app"), U8(3), Text("lib"), Text("main.ncl")})), .refusal = kOwnRule},
       // Named "Unknown Descriptor" even when the tag matches, and no banner.
       {CLASS(RavelCGingaAppDataComponentDescriptor), .displayName = "Unknown Descriptor",
        .wrongText = Wrong("Ginga Application Data Component"), .banner = "",
