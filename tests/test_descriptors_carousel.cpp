@@ -89,6 +89,11 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
     Add(expected, Dump({"\t EventMsgType=[66], EventMsgID=[0xbeef]\n"}));
     EXPECT_EQ(expected, BodyLines(d));
   }
+  // Built over nothing, it shows every field as zero.
+  RavelCGeneralEventDescriptor empty(nullptr);
+  EXPECT_EQ((TraceLines{{kDump, "\t EventMsgGroupID=[0], TimeMode=[0]\n"}, {kWarning, "Unknown Time Mode =[0x0]\n"},
+                        {kDump, "\t EventMsgType=[0], EventMsgID=[0x0000]\n"}}),
+            BodyLines(empty));
 }
 
 TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {
