@@ -478,9 +478,9 @@ TEST(DsmccDII, DumpsCopiesDeeplyAndParsesAgainFromScratch) {
   EXPECT_EQ(kRavelErrInvalidArgument, dii.ParseRawData(nullptr));
   EXPECT_TRUE(recorder.Records().empty());
   EXPECT_EQ(0, dii.GetNumberOfModules());
-  EXPECT_EQ(0u, dii.GetDownloadId());
-  EXPECT_EQ(0, dii.GetBlockSize());
-  EXPECT_EQ(0u, dii.GetTCDownloadScenario());
+  EXPECT_EQ((std::vector<unsigned int>(6, 0)),
+            (std::vector<unsigned int>{dii.GetDownloadId(), dii.GetBlockSize(), dii.GetWindowSize(), dii.GetAckPeriod(),
+                                       dii.GetTCDownloadWindow(), dii.GetTCDownloadScenario()}));
   EXPECT_EQ(1, copy.GetNumberOfModules());  // the copy is unaffected
 
   RavelCModuleInfo empty(nullptr);
