@@ -150,12 +150,7 @@ TEST_F(BroadcastText, StandardIsDetectedFromTheCapture) {
       {.capture = "isdbt-japan-psi.sections", .sections = true, .standard = "japan",
        .reason = "NIT network id 0x7ED0 in the ARIB terrestrial range"},
       {.capture = "isdb-signalling-mix.sections", .sections = true, .standard = "brazil", .reason = "no sign"},
-      {.capture = "object-carousel.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
-      {.capture = "stream-events-1.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
-      {.capture = "stream-events-2.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
-      {.capture = "ait.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
       {.capture = "dvb-epg.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
-      {.capture = "dvb-live.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
   };
   for (const Case& c : cases) {
     std::string path = *c.capture ? captures::Path(c.capture) : SamplePath();

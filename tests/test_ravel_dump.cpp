@@ -103,7 +103,6 @@ TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
       {/*args=*/{"@"}, /*file=*/&text, /*message=*/"not a transport stream"},
       {/*args=*/{"--sections", "@"}, /*file=*/&text, /*message=*/"not a file of raw sections"},
       {/*args=*/{"--sections", "@"}, /*file=*/&SamplePatStream(), /*message=*/"a transport stream, not raw sections"},
-      {/*args=*/{"--sections", "@"}, /*file=*/&kNoBytes, /*message=*/"empty input"},
       {/*args=*/{"udp://239.1.1.1"}, /*file=*/nullptr, /*message=*/"udp://239.1.1.1: no port"},
       {/*args=*/{"udp://@:99999"}, /*file=*/nullptr, /*message=*/"bad port '99999'"},
       {/*args=*/{"udp://tuner:1234"}, /*file=*/nullptr, /*message=*/"'tuner' is not an IPv4 address"},
@@ -185,8 +184,6 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
       {{"--summary", "--json", file}, "--summary and --json each choose what is printed"},
       {{"--json", "--epg", file}, "--json and --epg each choose what is printed"},
       {{"--summary", "--jsonl", file}, "--summary and --jsonl each choose what is printed"},
-      {{"--jsonl", "--json", file}, "--json and --jsonl each choose what is printed"},
-      {{"--jsonl", "--epg", file}, "--jsonl and --epg each choose what is printed"},
       {{"--json", "--table", "pat", file}, "--table chooses the tables of the dump"},
       {{"--xmltv", "", file}, "--xmltv needs a file"},
   };
@@ -954,17 +951,12 @@ TEST_F(RavelDumpTest, JsonLinesTellEachEventOnce) {
   struct Case {
     const char* what;
     nlohmann::json members;
-    size_t count;
   } cases[] = {
-      {.what = "first PAT", .members = {{"event", "table"}, {"kind", "PAT"}, {"change", false}, {"version", 0}},
-       .count = 1},
-      {.what = "changed PAT", .members = {{"event", "table"}, {"kind", "PAT"}, {"change", true}, {"version", 1}},
-       .count = 1},
-      {.what = "module", .members = {{"event", "module"}, {"pid", 0x018A}, {"module_id", 1}, {"version", 1}},
-       .count = 1},
-      {.what = "time", .members = {{"event", "time"}, {"kind", "TOT"}, {"time", "2024-05-14 22:30:01"}}, .count = 1},
-      {.what = "problem", .members = {{"event", "problem"}, {"problem", "PID 0x0012 table_id 0x00: CRC failure"}},
-       .count = 1},
+      {.what = "first PAT", .members = {{"event", "table"}, {"kind", "PAT"}, {"change", false}, {"version", 0}}},
+      {.what = "changed PAT", .members = {{"event", "table"}, {"kind", "PAT"}, {"change", true}, {"version", 1}}},
+      {.what = "module", .members = {{"event", "module"}, {"pid", 0x018A}, {"module_id", 1}, {"version", 1}}},
+      {.what = "time", .members = {{"event", "time"}, {"kind", "TOT"}, {"time", "2024-05-14 22:30:01"}}},
+      {.what = "problem", .members = {{"event", "problem"}, {"problem", "PID 0x0012 table_id 0x00: CRC failure"}}},
   };
   for (const Case& c : cases) {
     size_t count = 0;
@@ -973,7 +965,7 @@ TEST_F(RavelDumpTest, JsonLinesTellEachEventOnce) {
       for (const auto& member : c.members.items()) match = match && event.value(member.key(), nlohmann::json()) == member.value();
       count += match;
     }
-    EXPECT_EQ(c.count, count) << c.what << "\n" << run.out;
+    EXPECT_EQ(1u, count) << c.what << "\n" << run.out;
   }
 }
 

@@ -79,10 +79,7 @@ TEST_F(RavelDumpGuideTest, GuideHoldsEveryEventOfPresentFollowingAndScheduleActu
     for (const json& e : epg) {
       if (e["service_id"] != c.serviceId || e["event_id"] != c.eventId) continue;
       ++found;
-      EXPECT_EQ(c.tableId, e["table_id"]) << c.name;
-      EXPECT_EQ(c.name, e["name"]) << c.name;
-      EXPECT_EQ(c.start, e["start"]) << c.name;
-      EXPECT_EQ(c.stop, e["stop"]) << c.name;
+      ExpectMembers({{"table_id", c.tableId}, {"name", c.name}, {"start", c.start}, {"stop", c.stop}}, e);
       EXPECT_EQ(c.extended, !e["extended_text"].get<std::string>().empty() || !e["items"].empty()) << c.name;
     }
     EXPECT_EQ(1, found) << c.name;
@@ -104,9 +101,7 @@ TEST_F(RavelDumpGuideTest, ScheduleSectionsTheLibraryRefusesJoinTheirExtendedEve
     sb::Append(body, items);
     body.push_back(static_cast<uint8_t>(text.size()));
     body.insert(body.end(), text.begin(), text.end());
-    Bytes descriptor = {0x4E, static_cast<uint8_t>(body.size())};
-    sb::Append(descriptor, body);
-    return descriptor;
+    return sb::Descriptor(0x4E, body);
   };
   Bytes descriptors = {0x4D, 9, 'p', 'o', 'r', 3, 'F', 'i', 'm', 1, 'x'};
   sb::Append(descriptors, extended(1, 1, {0, 3, 'i', 's', 't'}, "B"));             // the item goes on
@@ -125,14 +120,9 @@ TEST_F(RavelDumpGuideTest, ScheduleSectionsTheLibraryRefusesJoinTheirExtendedEve
   ASSERT_EQ(0, run.status) << run.err;
   const json epg = json::parse(run.out)["epg"];
   ASSERT_EQ(1u, epg.size()) << run.out;
-  ExpectMembers({{"table_id", 0x51},
-                 {"service_id", 0x0641},
-                 {"event_id", 0x42},
-                 {"name", "Fim"},
-                 {"start", "2024-05-14T20:00:00-03:00"},
-                 {"stop", "2024-05-14T21:30:00-03:00"},
-                 {"items", json::array({{{"description", "Cast"}, {"item", "Alist"}}})},
-                 {"extended_text", "AB"}},
+  ExpectMembers({{"table_id", 0x51}, {"service_id", 0x0641}, {"event_id", 0x42}, {"name", "Fim"},
+                 {"start", "2024-05-14T20:00:00-03:00"}, {"stop", "2024-05-14T21:30:00-03:00"},
+                 {"items", json::array({{{"description", "Cast"}, {"item", "Alist"}}})}, {"extended_text", "AB"}},
                 epg[0]);
 }
 
