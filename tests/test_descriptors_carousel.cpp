@@ -35,9 +35,9 @@ TEST(InfoDescriptor, KeepsTheTextWithTwoZeroBytesAndCopiesItUpToTheFirstZero) {
   };
   for (Case& c : cases) {
     SCOPED_TRACE(c.what);
-    // The language code is read from bytes 2 to 4 whatever the length: zeros
-    // follow the descriptor in its section.
-    Bytes section = InSection(sb::Descriptor(0x03, c.body), Bytes(16, 0x00));
+    // The language code is read from bytes 2 to 4 whatever the length, and no
+    // text byte from past a short descriptor: a zero, then letters, follow it.
+    Bytes section = InSection(sb::Descriptor(0x03, c.body), sb::Cat({Bytes{0x00}, Bytes(15, 'Z')}));
     RavelCInfoDescriptor d(DescriptorIn(section));
     EXPECT_STREQ(c.language, d.GetLanguageCode());
     ASSERT_NE(nullptr, d.GetText());

@@ -47,8 +47,8 @@ TEST(PCRReader, TakesTheFlagsFromTheLengthByteAndTheClockFromBytesTwoToSix) {
       {"top bit of A[2] becomes bit 32, not bit 32 of the low word", 0x30, {0x10, 0x00, 0x80, 0x00, 0x00, 0x00, 0x00},
        47721858,
        {{kError, "PCR = 47721858\n"}}},
-      {"A[5] unshifted and ORed with the top bit of A[6]", 0x30, {0x10, 0x00, 0x00, 0x00, 0x00, 0xB3, 0x80}, 1,
-       {{kError, "PCR = 1\n"}}},
+      {"A[5] unshifted and ORed with the top bit of A[6]", 0x30, {0x10, 0x00, 0x00, 0x00, 0x00, 0xB4, 0x80}, 2,
+       {{kError, "PCR = 2\n"}}},
       {"every bit set", 0x3F, {0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF, 0xFF}, 95443714,
        {{kError, "PCR = 95443714\n"}, {kError, "OPCR = 95443714\n"}}},
   };

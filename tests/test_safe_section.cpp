@@ -257,6 +257,10 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
       {longSection(0x01, {}), "CAT", kRavelSafeUnknownTable, 0, 0},
       {Carousel(0x3B, GoodDii()), "DII", kRavelSafeOk, 0, 0},
       {Carousel(0x3C, Message(0x1001, DdbBody({}))), "DSM-CC other", kRavelSafeUnknownTable, 0, 0},
+      {longSection(0x75, {}), "other", kRavelSafeUnknownTable, 0, 0},
+      // A TOT marked long has no stream ids; its loop length is still read from byte 8 (here the date).
+      {longSection(0x73, sb::Cat({sb::UtcTime(2019, 1, 22, 12, 51, 9), sb::Length12(0)})), "TOT", kRavelSafeMalformed,
+       0, 0},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.kind);
@@ -271,6 +275,11 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
     TraceRecorder recorder;
     EXPECT_EQ(c.result, safe.Parse(bytes.get(), count));
   }
+  // The header alone is enough for the stream ids.
+  const Bytes sdt = cases[2].section;
+  RavelSectionHeader header;
+  ASSERT_TRUE(RavelCSafeSection::ReadHeader(Exactly(sdt, 10).get(), 10, header));
+  EXPECT_EQ(0x0421u, header.iStreamIds);
 }
 
 TEST(SafeSection, ParsesAsADirectParseWouldWithTheSameTraces) {

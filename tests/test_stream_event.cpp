@@ -94,6 +94,7 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
     std::vector<int> held;
   } cases[] = {
       {"section_length 9: no descriptors", {}, kRavelOk, {}, {-1}},
+      {"section_length 10: its one byte is a tag", {Bytes{0x1B}}, kRavelOk, {{kWarning, Unknown(0x1B)}}, {-1}},
       // Each NPT reference is built empty first, and that traces.
       {"one of each", {Npt(5), Event(1)}, kRavelOk, {kEmptyNpt}, {5, 1}},
       {"events in section order", {Event(3), Event(1), Event(2)}, kRavelOk, {}, {-1, 3, 1, 2}},
