@@ -89,16 +89,14 @@ TEST(PATProgramList, SortsByProgramNumberAndPutsTheFirstOneSegPMTLast) {
 
 TEST(PATParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes good = PatSection({{1, 0x101}});
-  sb::SectionOptions corruptOptions;
-  corruptOptions.corruptCrc = true;
-  Bytes badCrc = sb::LongSection(corruptOptions, PatBody({{1, 0x101}}));
-  sb::SectionOptions pmtOptions;
-  pmtOptions.tableId = 0x02;
-  pmtOptions.tableIdExtension = 0x4800;
-  Bytes pmtId = sb::LongSection(pmtOptions, PatBody({{1, 0x101}}));
-  sb::SectionOptions bothOptions = pmtOptions;
-  bothOptions.corruptCrc = true;
-  Bytes bothBad = sb::LongSection(bothOptions, PatBody({{1, 0x101}}));
+  auto section = [](uint8_t tableId, uint16_t tableIdExtension, bool corruptCrc) {
+    sb::SectionOptions o;
+    o.tableId = tableId;
+    o.tableIdExtension = tableIdExtension;
+    o.corruptCrc = corruptCrc;
+    return sb::LongSection(o, PatBody({{1, 0x101}}));
+  };
+  Bytes badCrc = section(0x00, 0x0001, true), pmtId = section(0x02, 0x4800, false), bothBad = section(0x02, 0x4800, true);
 
   struct Case {
     const char* label;
