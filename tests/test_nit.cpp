@@ -125,14 +125,12 @@ TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
     Bytes* section;
     int result;
     TraceLines traces;
-    const char* name;  // after the call
   } cases[] = {
-      {"null", nullptr, kRavelErrInvalidArgument, {}, "NIT Actual"},
-      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "NIT Section: CRC Error!\n"}}, "NIT Actual"},
-      {"SDT table_id", &sdtId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for NIT! Table ID=[0x42]\n"}},
-       "NIT Actual"},
+      {"null", nullptr, kRavelErrInvalidArgument, {}},
+      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "NIT Section: CRC Error!\n"}}},
+      {"SDT table_id", &sdtId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for NIT! Table ID=[0x42]\n"}}},
       {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
-       {{kWarning, "NIT Section: CRC Error!\n"}}, "NIT Actual"},
+       {{kWarning, "NIT Section: CRC Error!\n"}}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
@@ -144,7 +142,7 @@ TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
     for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", r.file);
     EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
     EXPECT_EQ(0, nit.GetTSInfoCount());
-    EXPECT_STREQ(c.name, nit.sTableName.GetString());
+    EXPECT_STREQ("NIT Actual", nit.sTableName.GetString());  // the name of the last good parse
     if (c.section != nullptr && c.result == kRavelErrInvalidArgument) {
       EXPECT_EQ((*c.section)[0], nit.iTableId);  // the header was read
     }
