@@ -12,6 +12,7 @@
 #include "Ravel_CTableNIT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -120,35 +121,19 @@ TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes sdtId = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}), 0x42);
   bad.tableId = 0x46;
   Bytes bothBad = sb::LongSection(bad, NitBody({}, {}));
-  struct Case {
-    const char* label;
-    Bytes* section;
-    int result;
-    TraceLines traces;
-    const char* name;  // after the call
-  } cases[] = {
-      {"null", nullptr, kRavelErrInvalidArgument, {}, "NIT Actual"},
-      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "NIT Section: CRC Error!\n"}}, "NIT Actual"},
-      {"SDT table_id", &sdtId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for NIT! Table ID=[0x42]\n"}},
-       "NIT Actual"},
-      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
-       {{kWarning, "NIT Section: CRC Error!\n"}}, "NIT Actual"},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCNIT nit(good.data());
-    ASSERT_EQ(1, nit.GetTSInfoCount());
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, nit.ParseRawData(c.section ? c.section->data() : nullptr));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    for (const TraceRecord& r : recorder.Records()) EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", r.file);
-    EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
-    EXPECT_EQ(0, nit.GetTSInfoCount());
-    EXPECT_STREQ(c.name, nit.sTableName.GetString());
-    if (c.section != nullptr && c.result == kRavelErrInvalidArgument) {
-      EXPECT_EQ((*c.section)[0], nit.iTableId);  // the header was read
-    }
-  }
+  ASSERT_EQ(1, RavelCNIT(good.data()).GetTSInfoCount());
+  tc::ExpectRefusals<RavelCNIT>(good, tc::Refusals("NIT", badCrc, sdtId, "0x42", bothBad),
+                                [](RavelCNIT& nit, const tc::Refusal& r, TraceRecorder& recorder) {
+                                  for (const TraceRecord& t : recorder.Records()) {
+                                    EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", t.file);
+                                  }
+                                  EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
+                                  EXPECT_EQ(0, nit.GetTSInfoCount());
+                                  EXPECT_STREQ("NIT Actual", nit.sTableName.GetString());  // of the last good parse
+                                  if (r.section != nullptr && r.result == kRavelErrInvalidArgument) {
+                                    EXPECT_EQ((*r.section)[0], nit.iTableId);  // the header was read
+                                  }
+                                });
 }
 
 TEST(NITNetworkLoop, OnlyTagZeroFailsAndTheLastOfATagWins) {

@@ -11,6 +11,7 @@
 #include "Ravel_CTablePAT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -89,44 +90,23 @@ TEST(PATProgramList, SortsByProgramNumberAndPutsTheFirstOneSegPMTLast) {
 
 TEST(PATParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes good = PatSection({{1, 0x101}});
-  sb::SectionOptions corruptOptions;
-  corruptOptions.corruptCrc = true;
-  Bytes badCrc = sb::LongSection(corruptOptions, PatBody({{1, 0x101}}));
-  sb::SectionOptions pmtOptions;
-  pmtOptions.tableId = 0x02;
-  pmtOptions.tableIdExtension = 0x4800;
-  Bytes pmtId = sb::LongSection(pmtOptions, PatBody({{1, 0x101}}));
-  sb::SectionOptions bothOptions = pmtOptions;
-  bothOptions.corruptCrc = true;
-  Bytes bothBad = sb::LongSection(bothOptions, PatBody({{1, 0x101}}));
-
-  struct Case {
-    const char* label;
-    Bytes* section;
-    int result;
-    TraceLines traces;
-    unsigned char tableId;  // after the call
-    unsigned short tableIdExtension;
-  } cases[] = {
-      {"null", nullptr, kRavelErrInvalidArgument, {}, 0x00, 0x7ED0},  // the header is not looked at
-      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "PAT Section: CRC Error!\n"}}, 0x00, 0x7ED0},
-      {"PMT table_id, printed in decimal", &pmtId, kRavelErrInvalidArgument,
-       {{kError, "Table ID isn't for PAT! Table ID=[2]\n"}}, 0x02, 0x4800},
-      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
-       {{kWarning, "PAT Section: CRC Error!\n"}}, 0x00, 0x7ED0},
+  auto section = [](uint8_t tableId, uint16_t tableIdExtension, bool corruptCrc) {
+    sb::SectionOptions o;
+    o.tableId = tableId;
+    o.tableIdExtension = tableIdExtension;
+    o.corruptCrc = corruptCrc;
+    return sb::LongSection(o, PatBody({{1, 0x101}}));
   };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCPAT pat(good.data());
-    ASSERT_EQ(1, pat.GetProgramCount());
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, pat.ParseRawData(c.section ? c.section->data() : nullptr));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(0, pat.GetProgramCount());
-    if (c.section == nullptr) continue;
-    EXPECT_EQ(c.tableId, pat.iTableId);
-    EXPECT_EQ(c.tableIdExtension, pat.iTableIdExtension);
-  }
+  Bytes badCrc = section(0x00, 0x0001, true), pmtId = section(0x02, 0x4800, false), bothBad = section(0x02, 0x4800, true);
+  ASSERT_EQ(1, RavelCPAT(good.data()).GetProgramCount());
+  // The foreign table_id is printed in decimal.
+  tc::ExpectRefusals<RavelCPAT>(good, tc::Refusals("PAT", badCrc, pmtId, "2", bothBad),
+                                [&](RavelCPAT& pat, const tc::Refusal& r, TraceRecorder&) {
+                                  EXPECT_EQ(0, pat.GetProgramCount());
+                                  if (r.section == nullptr) return;  // the header is not looked at
+                                  EXPECT_EQ(r.section == &pmtId ? 0x02 : 0x00, pat.iTableId);
+                                  EXPECT_EQ(r.section == &pmtId ? 0x4800 : 0x7ED0, pat.iTableIdExtension);
+                                });
 }
 
 TEST(PATParse, EntriesAreReadInFoursUntilTheFirstCrcByte) {

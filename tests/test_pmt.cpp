@@ -11,6 +11,7 @@
 #include "Ravel_CTablePMT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -189,35 +190,16 @@ TEST(PMTParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes badCrc = sb::LongSection(PmtOptions(0x1234, 3, 0x02, true), body);
   Bytes sdtId = sb::LongSection(PmtOptions(0x1234, 3, 0x42), body);
   Bytes bothBad = sb::LongSection(PmtOptions(0x1234, 3, 0x00, true), body);
-  struct Case {
-    const char* label;
-    Bytes* section;
-    int result;
-    TraceLines traces;
-    unsigned char tableId;  // after the call
-    unsigned short tableIdExtension;
-  } cases[] = {
-      {"null", nullptr, kRavelErrInvalidArgument, {}, 0x02, 0x4800},
-      {"bad CRC", &badCrc, kRavelErrCorruptSection, {{kWarning, "PMT Section: CRC Error!\n"}}, 0x02, 0x4800},
-      {"SDT table_id", &sdtId, kRavelErrInvalidArgument, {{kError, "Table ID isn't for PMT! Table ID=[0x42]\n"}}, 0x42,
-       0x1234},
-      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
-       {{kWarning, "PMT Section: CRC Error!\n"}}, 0x02, 0x4800},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCPMT pmt(good.data());
-    ASSERT_NE(nullptr, pmt.GetParentalRating());
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, pmt.ParseRawData(c.section ? c.section->data() : nullptr));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(0, pmt.GetMapInfoCount());
-    EXPECT_EQ(nullptr, pmt.GetParentalRating());
-    EXPECT_EQ(0, pmt.GetPCRPID());
-    EXPECT_EQ(0, pmt.GetProgramInfoLength());
-    EXPECT_EQ(c.tableId, pmt.iTableId);
-    EXPECT_EQ(c.tableIdExtension, pmt.iTableIdExtension);
-  }
+  ASSERT_NE(nullptr, RavelCPMT(good.data()).GetParentalRating());
+  tc::ExpectRefusals<RavelCPMT>(good, tc::Refusals("PMT", badCrc, sdtId, "0x42", bothBad),
+                                [&](RavelCPMT& pmt, const tc::Refusal& r, TraceRecorder&) {
+                                  EXPECT_EQ(0, pmt.GetMapInfoCount());
+                                  EXPECT_EQ(nullptr, pmt.GetParentalRating());
+                                  EXPECT_EQ(0, pmt.GetPCRPID());
+                                  EXPECT_EQ(0, pmt.GetProgramInfoLength());
+                                  EXPECT_EQ(r.section == &sdtId ? 0x42 : 0x02, pmt.iTableId);
+                                  EXPECT_EQ(r.section == &sdtId ? 0x1234 : 0x4800, pmt.iTableIdExtension);
+                                });
 }
 
 TEST(PMTProgramInfoLoop, FailsOnAMalformedDescriptorAndKeepsTheLastParentalRating) {

@@ -553,3 +553,44 @@ TEST(SafeSection, TakesTheWholeRealObjectCarousel) {
   EXPECT_EQ(3u, messages.size());
   EXPECT_GT(messages[0x1003], 100);
 }
+
+TEST(SafeSection, TellsEachDescriptorInTheOrderTheParseReadsThem) {
+  struct Told {
+    int offset, tag, length;
+    bool operator==(const Told& o) const { return offset == o.offset && tag == o.tag && length == o.length; }
+  };
+  sb::SectionOptions pmt;
+  pmt.tableId = 0x02;
+  auto stream = [](unsigned int pid, const std::vector<Bytes>& descriptors) {
+    return sb::Cat({sb::U8(0x1B), sb::U16(0xE000 | pid), sb::DescriptorLoop(descriptors)});
+  };
+  const Bytes twoStreams = sb::LongSection(
+      pmt, sb::Cat({sb::U16(0xE100), sb::DescriptorLoop({sb::Descriptor(0x09, {1, 2})}),
+                    stream(0x111, {sb::Descriptor(0x52, {7})}), stream(0x112, {sb::Descriptor(0xFD, {1, 2, 3})})}));
+  // Program-info loop of 6 bytes whose second descriptor says 5.
+  const Bytes overrun =
+      sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(6), sb::Descriptor(0x09, {1, 2}), Bytes{0x0A, 5}}));
+  sb::SectionOptions cat;
+  cat.tableId = 0x01;
+  struct Case {
+    const char* name;
+    Bytes section;
+    bool walked;
+    std::vector<Told> told;
+  } cases[] = {
+      {/*name=*/"PMT program info then each stream", /*section=*/twoStreams, /*walked=*/true,
+       /*told=*/{{12, 0x09, 2}, {21, 0x52, 1}, {29, 0xFD, 3}}},
+      {"second descriptor past its loop", overrun, false, {{12, 0x09, 2}}},
+      {"table_id without a walk", sb::LongSection(cat, sb::Descriptor(0x09, {1, 2})), false, {}},
+      {"bytes shorter than the section", Bytes(twoStreams.begin(), twoStreams.end() - 1), false, {}},
+  };
+  for (const Case& c : cases) {
+    std::vector<Told> told;
+    auto visit = [](int offset, unsigned char tag, unsigned char length, void* context) {
+      static_cast<std::vector<Told>*>(context)->push_back({offset, tag, length});
+    };
+    const int count = static_cast<int>(c.section.size());
+    EXPECT_EQ(c.walked, RavelCSafeSection::EachDescriptor(c.section.data(), count, visit, &told)) << c.name;
+    EXPECT_TRUE(told == c.told) << c.name << ": " << told.size() << " told";
+  }
+}
