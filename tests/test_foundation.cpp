@@ -149,6 +149,9 @@ TEST(TraceSink, FormatsOnlyForListenersAndPassesLocation) {
   std::string longText(3000, 'a');
   RavelPGL_TraceOut(0x10000020u, "%s", longText.c_str());
   EXPECT_EQ(longText, recorder.Records()[1].text);
+  std::string bufferSized(1024, 'b');  // one more than the local buffer holds with its NUL
+  RavelPGL_TraceOut(0x10000020u, "%s", bufferSized.c_str());
+  EXPECT_EQ(bufferSized, recorder.Records()[2].text);
 }
 
 struct Item {

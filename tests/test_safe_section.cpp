@@ -483,6 +483,8 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
   pmt.tableId = 0x02;
   sb::SectionOptions eitSchedule;
   eitSchedule.tableId = 0x51;
+  sb::SectionOptions nit;
+  nit.tableId = 0x40;
   struct Case {
     const char* label;
     Bytes section;
@@ -499,6 +501,8 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
        sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
                                      sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
        kRavelSafeMalformed, "loop entry runs past its loop's end", 12},
+      {"NIT transport stream loop over the CRC_32", sb::LongSection(nit, sb::Cat({sb::Length12(0), sb::Length12(4)})),
+       kRavelSafeMalformed, "loop runs past its parent's end", 10},
       {"EIT schedule without a class is still walked",
        sb::LongSection(eitSchedule, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51), sb::U16(1),
                                              sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),

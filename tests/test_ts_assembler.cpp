@@ -140,6 +140,8 @@ TEST(TSPktStore, IdleStoreHandlesSectionStartsOfOnePacket) {
       {"continuation without a start is dropped silently", {{Pkt(3, false, s103), 0, {}, kIdle, {}}}},
       {"section after an adaptation field",
        {{Pkt(3, true, sb::Cat({{0}, s100}), 3, Filler(10)), 1, {s100}, kIdle, {}}}},
+      {"a payload of one byte: its pointer field points past it",
+       {{Pkt(3, true, {7}, 3, Filler(182)), 0, {}, kIdle, {{kError, "Section Pointer Field Invalid! =>[7]\n"}}}}},
       {"adaptation field filling the packet: no pointer field",
        {{Pkt(3, true, {}, 3, Filler(183)), 0, {}, kIdle, {{kError, "Section Pointer Field Invalid! =>[0]\n"}}}}},
       {"adaptation_field_length 200 is never followed out of the packet",
