@@ -94,6 +94,8 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
   EXPECT_EQ((TraceLines{{kDump, "\t EventMsgGroupID=[0], TimeMode=[0]\n"}, {kWarning, "Unknown Time Mode =[0x0]\n"},
                         {kDump, "\t EventMsgType=[0], EventMsgID=[0x0000]\n"}}),
             BodyLines(empty));
+  const RavelCEventRelativeTime& relative = empty.GetEventMsgRelativeTime();
+  EXPECT_EQ((std::vector<int>{0, 0, 0}), (std::vector<int>{relative.iHours, relative.iMinutes, relative.iSeconds}));
 }
 
 TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {

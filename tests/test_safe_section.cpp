@@ -485,6 +485,8 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
   eitSchedule.tableId = 0x51;
   sb::SectionOptions nit;
   nit.tableId = 0x40;
+  sb::SectionOptions streamEvents;
+  streamEvents.tableId = 0x3D;
   struct Case {
     const char* label;
     Bytes section;
@@ -503,6 +505,8 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
        kRavelSafeMalformed, "loop entry runs past its loop's end", 12},
       {"NIT transport stream loop over the CRC_32", sb::LongSection(nit, sb::Cat({sb::Length12(0), sb::Length12(4)})),
        kRavelSafeMalformed, "loop runs past its parent's end", 10},
+      {"stream descriptor past the section", sb::LongSection(streamEvents, Bytes{0x17, 0x0A, 1, 2}),
+       kRavelSafeMalformed, "descriptor runs past its loop's end", 8},
       {"EIT schedule without a class is still walked",
        sb::LongSection(eitSchedule, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51), sb::U16(1),
                                              sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
