@@ -286,6 +286,9 @@ TEST(TerrDeliverySystemDescriptor, CountsWholeFrequenciesAndPanicsOutsideThem) {
     const int count = static_cast<int>(c.frequencies.size());
     ASSERT_EQ(count, d.GetFrequencyCount());
     for (int i = 0; i < count; ++i) EXPECT_EQ(c.frequencies[i], d.GetFrequency(i));
+    RavelCTerrDeliverySystemDescriptor copy(d);  // its own array, or none at all
+    EXPECT_EQ(count == 0, copy.pFrequencies == 0);
+    for (int i = 0; i < count; ++i) EXPECT_EQ(c.frequencies[i], copy.GetFrequency(i));
     for (int index : {-1, count}) {
       TraceRecorder recorder;
       EXPECT_EQ(0, d.GetFrequency(index)) << index;
