@@ -59,17 +59,12 @@ TEST(DateTime, OrdersInstantsTotally) {
   RavelCDateTime a, b;
   a.iYear = 2012; a.iMonth = 12; a.iDay = 32;
   b.iYear = 2013; b.iMonth = 1; b.iDay = 2;
-  EXPECT_TRUE(a < b);
-  EXPECT_TRUE(a <= b);
-  EXPECT_FALSE(a > b);
-  EXPECT_FALSE(a >= b);
+  auto relations = [&] { return std::vector<bool>{(a < b) != 0, (a <= b) != 0, (a > b) != 0, (a >= b) != 0}; };
+  EXPECT_EQ((std::vector<bool>{true, true, false, false}), relations());
   b = a;
+  EXPECT_EQ((std::vector<bool>{false, true, false, true}), relations());
   b.iSecond = 1;
   EXPECT_TRUE(a < b);
-  b = a;
-  EXPECT_FALSE(a < b);
-  EXPECT_TRUE(a <= b);
-  EXPECT_TRUE(a >= b);
 }
 
 TEST(BitInputStream, ReadsMsbFirstAndNeverPastItsBuffer) {
@@ -163,30 +158,20 @@ struct Item {
 TEST(CArray, GrowsByEightAndChecksItsBounds) {
   TraceRecorder recorder;
   RavelCArray<int> array;
-  EXPECT_EQ(8, array.iMaxCount);
   EXPECT_EQ(8, array.iGrowSize);
-  int expectedCapacity[] = {8, 8, 8, 8, 8, 8, 8, 8, 16, 16, 16, 16, 16, 16, 16, 16, 24};
   for (int i = 0; i < 17; ++i) {
-    array.Append(i);
-    EXPECT_EQ(expectedCapacity[i], array.iMaxCount) << i;
+    EXPECT_EQ(i < 8 ? 8 : i < 16 ? 16 : 24, (array.Append(i), array.iMaxCount)) << i;
   }
   EXPECT_EQ(0, array.Insert(99, array.iCount));
-  EXPECT_EQ(99, array[17]);
   EXPECT_EQ(0, array.Insert(-5, 0));
-  EXPECT_EQ(-5, array[0]);
-  EXPECT_EQ(0, array[1]);
+  EXPECT_EQ((std::vector<int>{-5, 0, 99}), (std::vector<int>{array[0], array[1], array[18]}));
   EXPECT_TRUE(recorder.Records().empty());
 
-  struct BadCase {
-    int pos;
-  } inserts[] = {{-1}, {array.iCount + 1}};
-  for (const BadCase& c : inserts) {
+  for (int pos : {-1, array.iCount + 1}) {
     recorder.Clear();
-    int count = array.iCount;
-    EXPECT_EQ(kRavelErrInvalidArgument, array.Insert(1, c.pos));
-    EXPECT_EQ(count, array.iCount);
-    EXPECT_EQ(th::At(th::kUtilWarning, {"Argument Invalid! aPos=[" + std::to_string(c.pos) + "], iCount=[" +
-                                            std::to_string(count) + "]\n"}),
+    EXPECT_EQ(kRavelErrInvalidArgument, array.Insert(1, pos));
+    EXPECT_EQ(19, array.iCount);
+    EXPECT_EQ(th::At(th::kUtilWarning, {"Argument Invalid! aPos=[" + std::to_string(pos) + "], iCount=[19]\n"}),
               recorder.Lines());
     EXPECT_EQ(0, recorder.PanicCount());
   }

@@ -9,11 +9,9 @@
 #include <string>
 #include <vector>
 
-#include "Captures.h"
 #include "Ravel_CDescriptorExtendedEvent.h"
 #include "Ravel_CDescriptorShortEvent.h"
 #include "Ravel_CDsmccDDB.h"
-#include "Ravel_CDsmccDII.h"
 #include "Ravel_CTSPktAssembler.h"
 #include "Ravel_CTableEIT.h"
 #include "Ravel_CTableTOT.h"
@@ -61,27 +59,6 @@ Bytes Eit(uint8_t tableId, int events) {
 }
 
 }  // namespace
-
-TEST(ReceiversPath, ObjectCarouselDiiParsesOverTheStoreBuffer) {
-  Bytes stream;
-  RAVEL_LOAD_CAPTURE_OR_SKIP("object-carousel.ts", stream);
-  Records records = Assemble(captures::PacketsOfPid(stream, 0x076A));
-  int diiCount = 0;
-  for (const std::unique_ptr<RavelCSectionData>& record : records) {
-    for (int i = 0; i < record->iSectionCount; ++i) {
-      unsigned char* section = record->pSection[i];
-      if (section[0] != 0x3B || section[10] != 0x10 || section[11] != 0x02) continue;
-      TraceRecorder recorder;
-      RavelCDsmccDII dii(MessageOf(section));
-      ASSERT_EQ(3, dii.GetNumberOfModules());
-      for (int m = 0; m < 3; ++m) EXPECT_EQ(28, dii.GetModuleInfo(m)->GetModuleInfoLength());
-      RavelCDsmccDII copy(dii);
-      copy.Show();
-      ++diiCount;
-    }
-  }
-  EXPECT_GT(diiCount, 0);
-}
 
 TEST(ReceiversPath, TotLoopLongerThanItsSectionStopsAtTheSectionEnd) {
   // No CRC_32 check protects the TOT: a loop length of 0xFFF in 14 bytes.

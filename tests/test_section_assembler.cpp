@@ -81,12 +81,23 @@ std::vector<Bytes> Packed(const std::vector<Bytes>& sections, uint8_t firstCount
   writer.AddPackedSections(sections);
   return writer.Packets();
 }
-std::vector<Bytes> LongThenA() { return Packed({kLong, kA}); }
-std::vector<Bytes> Concat(std::vector<std::vector<Bytes>> parts) {
-  std::vector<Bytes> all;
-  for (const auto& p : parts) all.insert(all.end(), p.begin(), p.end());
-  return all;
+// kLong then kA, with packet `index` sent `times` times (0: lost).
+std::vector<Bytes> LongThenA(size_t index = 0, int times = 1) {
+  std::vector<Bytes> p = Packed({kLong, kA});
+  if (times == 0) {
+    p.erase(p.begin() + index);
+  } else {
+    p.insert(p.begin() + index, times - 1, Bytes(p[index]));
+  }
+  return p;
 }
+// kLong then kA, with `extra` sent after the first packet.
+std::vector<Bytes> LongThenAWith(const Bytes& extra) {
+  std::vector<Bytes> p = LongThenA();
+  p.insert(p.begin() + 1, extra);
+  return p;
+}
+std::vector<Bytes> Packets(const std::vector<Bytes>& packets) { return packets; }
 
 struct Case {
   const char* name;
@@ -106,120 +117,71 @@ const Case kCases[] = {
      .sections = std::vector<Bytes>(12, kTdt),
      .counters = {.delivered = 12}},
     {.name = "a section over three packets, the next starting where it ends",
-     .packets = LongThenA,
+     .packets = [] { return LongThenA(); },
      .sections = {kLong, kA},
      .counters = {.delivered = 2}},
     {.name = "a long section starting in the packet where a short one ends",
      .packets = [] { return Packed({kA, kLong}); },
      .sections = {kA, kLong},
      .counters = {.delivered = 2}},
-    {.name = "section header split over two packets",
-     .packets =
-         [] {
-           Bytes filler = SectionOfSize(182, 5);  // leaves one byte of the first packet
-           return Concat({{Pkt(0, true, sb::Cat({sb::U8(0), filler, Head(kA, 1)}))},
-                          {Pkt(1, false, Tail(kA, 1))}});
-         },
+    {.name = "section header split over two packets",  // the 182-byte section leaves one byte of the first packet
+     .packets = [] {
+       return Packets({Pkt(0, true, sb::Cat({sb::U8(0), SectionOfSize(182, 5), Head(kA, 1)})),
+                       Pkt(1, false, Tail(kA, 1))});
+     },
      .sections = {SectionOfSize(182, 5), kA},
      .counters = {.delivered = 2}},
     {.name = "a repeated packet is dropped once",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           p.insert(p.begin() + 1, p[1]);
-           return p;
-         },
+     .packets = [] { return LongThenA(1, 2); },
      .sections = {kLong, kA},
      .counters = {.delivered = 2, .repeated = 1}},
     {.name = "a packet sent three times breaks continuity and cuts the section",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           p.insert(p.begin() + 1, 2, p[1]);
-           return p;
-         },
+     .packets = [] { return LongThenA(1, 3); },
      .sections = {kA},
      .counters = {.delivered = 1, .cut = 1, .repeated = 1, .breaks = 1, .withoutStart = 184 + 133}},
     {.name = "a lost packet cuts the section; the next one is whole",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           p.erase(p.begin() + 1);
-           return p;
-         },
+     .packets = [] { return LongThenA(1, 0); },
      .sections = {kA},
      .counters = {.delivered = 1, .cut = 1, .breaks = 1, .withoutStart = 133}},
     {.name = "an announced discontinuity is no break, but the section in progress is lost",
-     .packets =
-         [] {
-           Bytes announced = Pkt(9, false, Mid(kLong, 183, 183), 3, Bytes{0x80});
-           return std::vector<Bytes>{Pkt(0, true, sb::Cat({sb::U8(0), kLong})), announced,
-                                     Pkt(10, true, sb::Cat({sb::U8(0), kA}))};
-         },
+     .packets = [] {
+       return Packets({Pkt(0, true, sb::Cat({sb::U8(0), kLong})), Pkt(9, false, Mid(kLong, 183, 183), 3, Bytes{0x80}),
+                       Pkt(10, true, sb::Cat({sb::U8(0), kA}))});
+     },
      .sections = {kA},
      .counters = {.delivered = 1, .cut = 1, .withoutStart = 182}},
     {.name = "a packet with transport_error_indicator is ignored",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           p.insert(p.begin() + 1, WithTransportError(Pkt(7, true, Bytes{0x00, 0x42})));
-           return p;
-         },
+     .packets = [] { return LongThenAWith(WithTransportError(Pkt(7, true, Bytes{0x00, 0x42}))); },
      .sections = {kLong, kA},
      .counters = {.delivered = 2, .transportError = 1}},
     {.name = "adaptation-only packets neither carry bytes nor step the counter",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           Bytes stuffing(183, 0xFF);
-           stuffing[0] = 0x00;
-           p.insert(p.begin() + 1, Pkt(1, false, Bytes(), 2, stuffing));
-           return p;
-         },
+     .packets = [] { return LongThenAWith(Pkt(1, false, Bytes(), 2, sb::Cat({sb::U8(0), Bytes(182, 0xFF)}))); },
      .sections = {kLong, kA},
      .counters = {.delivered = 2}},
     {.name = "a payload after an adaptation field",
-     .packets =
-         [] {
-           sb::PacketWriter writer(streams::kAssemblerPid);
-           writer.AddSectionWithAdaptation(kA, 20);
-           return writer.Packets();
-         },
+     .packets = [] { return Packets({Pkt(0, true, sb::Cat({sb::U8(0), kA}), 3, sb::Cat({sb::U8(0), Bytes(19, 0xFF)}))}); },
      .sections = {kA},
      .counters = {.delivered = 1}},
     {.name = "a section still short when the next one starts is cut",
-     .packets =
-         [] {
-           return std::vector<Bytes>{Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})),
-                                     Pkt(1, true, sb::Cat({sb::U8(10), Mid(kLong, 183, 10), kA}))};
-         },
+     .packets = [] {
+       return Packets({Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})),
+                       Pkt(1, true, sb::Cat({sb::U8(10), Mid(kLong, 183, 10), kA}))});
+     },
      .sections = {kA},
      .counters = {.delivered = 1, .cut = 1}},
     {.name = "joining a stream in the middle of a section",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           p.erase(p.begin());
-           return p;
-         },
+     .packets = [] { return LongThenA(0, 0); },
      .sections = {kA},
      .counters = {.delivered = 1, .withoutStart = 184 + 133}},
     {.name = "a pointer_field past the packet end makes it invalid",
-     .packets =
-         [] {
-           Bytes bad = Pkt(1, true, Bytes{0xB8});
-           return Concat({{Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})), bad},
-                          {Pkt(2, true, sb::Cat({sb::U8(0), kA}))}});
-         },
+     .packets = [] {
+       return Packets({Pkt(0, true, sb::Cat({sb::U8(0), Head(kLong, 183)})), Pkt(1, true, Bytes{0xB8}),
+                       Pkt(2, true, sb::Cat({sb::U8(0), kA}))});
+     },
      .sections = {kA},
      .counters = {.delivered = 1, .cut = 1, .invalid = 1}},
     {.name = "a section cut by the end of the input is counted",
-     .packets =
-         [] {
-           auto p = LongThenA();
-           p.resize(2);
-           return p;
-         },
+     .packets = [] { return LongThenA(2, 0); },
      .endOfInput = true,
      .sections = {},
      .counters = {.cut = 1}},

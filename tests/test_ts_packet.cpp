@@ -13,7 +13,6 @@
 
 namespace {
 
-const unsigned int kDump = th::kDump;
 const unsigned int kError = th::kError;
 
 // A packet with the given header bytes; byte 4 is `byte4`, the rest a pattern.
@@ -122,18 +121,11 @@ TEST(TSPacketHeader, FailuresClearKeepOrPartlyKeepTheMembers) {
   }
 }
 
-TEST(TSPacketHeader, ConstructorParsesAndTracesFromItsSourceFile) {
-  Bytes packet = RawPacket(0x40, 0x10, 0x1C);
-  RavelCTSPacket parsed(packet.data());
-  EXPECT_EQ(0x0010u, parsed.iPID);
-  EXPECT_EQ(12, parsed.iContinuityCounter);
-  EXPECT_EQ(packet.data() + 4, parsed.pPayloadStartPtr);
-
+TEST(TSPacketHeader, ConstructorClearsOnFailureAndTracesFromItsSourceFile) {
   TraceRecorder recorder;
   Bytes bad = RawPacket(0x40, 0x10, 0x1C, 0x00, 0x46);
   RavelCTSPacket rejected(bad.data());  // the result is dropped; the object stays cleared
-  EXPECT_EQ(0u, rejected.iPID);
-  EXPECT_EQ(nullptr, rejected.pPayloadStartPtr);
+  EXPECT_EQ((std::vector<long>{0, 0, 0, 0, 0, 0, 0, -1, -1}), Members(rejected, bad));
   ASSERT_EQ(1u, recorder.Records().size());
   EXPECT_EQ("SectionParser/source/Ravel_CTSPacket", recorder.Records()[0].file);
   EXPECT_EQ("Invalid TS Packet Start Byte=[0x46]\n", recorder.Records()[0].text);
@@ -141,32 +133,25 @@ TEST(TSPacketHeader, ConstructorParsesAndTracesFromItsSourceFile) {
 
 TEST(TSPacketHeader, ShowDumpsTheMembersWithAddressesAsNumbers) {
   struct Case {
+    bool parsed;
     uint8_t b1, b2, b3;
     std::string flagsLine, fieldsLine;
   } cases[] = {
-      {0xE0, 0x21, 0x75, "Transport Error Indicator=[1], Payload Unit Start Indicator=[1], Transport Pritoriry=[1]\n",
+      {true, 0xE0, 0x21, 0x75, "Transport Error Indicator=[1], Payload Unit Start Indicator=[1], Transport Pritoriry=[1]\n",
        "PID=[0x21], Transport Scrambling Control=[1], Adaptation Field Control=[3], Contiuity Index=[5]\n"},
-      {0x07, 0x6A, 0x1F, "Transport Error Indicator=[0], Payload Unit Start Indicator=[0], Transport Pritoriry=[0]\n",
+      {true, 0x07, 0x6A, 0x1F, "Transport Error Indicator=[0], Payload Unit Start Indicator=[0], Transport Pritoriry=[0]\n",
        "PID=[0x76a], Transport Scrambling Control=[0], Adaptation Field Control=[1], Contiuity Index=[15]\n"},
+      {false, 0, 0, 0, "Transport Error Indicator=[0], Payload Unit Start Indicator=[0], Transport Pritoriry=[0]\n",
+       "PID=[0x00], Transport Scrambling Control=[0], Adaptation Field Control=[0], Contiuity Index=[0]\n"},
   };
   for (const Case& c : cases) {
     Bytes packet = RawPacket(c.b1, c.b2, c.b3, 0x02);
-    RavelCTSPacket header(packet.data());
-    TraceRecorder recorder;
-    header.Show();
-    TraceLines expected = {
-        {kDump, "#################################################\n"}, {kDump, "#### TS Packet Header Information\n"},
-        {kDump, c.flagsLine}, {kDump, c.fieldsLine},
-        {kDump, "Adaptation Field Start Ptr Addr=[" + Hex32(header.pAdaptionFieldStartPtr) +
-                    "], Payload Start Ptr Addr=[" + Hex32(header.pPayloadStartPtr) + "]\n"},
-        {kDump, "#################################################\n"},
-    };
-    EXPECT_EQ(expected, recorder.Lines());
+    RavelCTSPacket header(c.parsed ? packet.data() : nullptr);
+    const std::string rule(49, '#');
+    EXPECT_EQ(th::Dump({rule + "\n", "#### TS Packet Header Information\n", c.flagsLine, c.fieldsLine,
+                        "Adaptation Field Start Ptr Addr=[" + Hex32(header.pAdaptionFieldStartPtr) +
+                            "], Payload Start Ptr Addr=[" + Hex32(header.pPayloadStartPtr) + "]\n",
+                        rule + "\n"}),
+              th::ShowLines(header));
   }
-  RavelCTSPacket empty(nullptr);
-  TraceRecorder recorder;
-  empty.Show();
-  ASSERT_EQ(6u, recorder.Records().size());
-  EXPECT_EQ("Adaptation Field Start Ptr Addr=[0x00000000], Payload Start Ptr Addr=[0x00000000]\n",
-            recorder.Records()[4].text);
 }

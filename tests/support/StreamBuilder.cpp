@@ -146,25 +146,6 @@ void PacketWriter::AddPackedSections(const std::vector<Bytes>& sections) {
   }
 }
 
-void PacketWriter::AddSectionWithAdaptation(const Bytes& section, uint8_t adaptationLength) {
-  Bytes adaptation(adaptationLength, 0xFF);
-  if (adaptationLength > 0) adaptation[0] = 0x00;
-  Bytes payload{0x00};
-  size_t room = 188 - 4 - 1 - adaptationLength - 1;
-  size_t take = std::min(room, section.size());
-  payload.insert(payload.end(), section.begin(), section.begin() + take);
-  MakePacket(true, payload, 3, adaptation);
-  if (take < section.size()) {
-    Bytes rest(section.begin() + take, section.end());
-    size_t offset = 0;
-    while (offset < rest.size()) {
-      size_t n = std::min<size_t>(184, rest.size() - offset);
-      MakePacket(false, Bytes(rest.begin() + offset, rest.begin() + offset + n));
-      offset += n;
-    }
-  }
-}
-
 Bytes PacketWriter::Stream() const { return Cat(packets_); }
 
 }  // namespace sb

@@ -63,14 +63,11 @@ class PacketWriter {
   // Sections packed back to back: a section may start in the packet where the
   // previous one ends (the pointer_field says where).
   void AddPackedSections(const std::vector<Bytes>& sections);
-  // One packet with an adaptation field of `adaptationLength` bytes before the payload.
-  void AddSectionWithAdaptation(const Bytes& section, uint8_t adaptationLength);
 
   // A raw packet of this PID built from the given fields (payload padded with 0xFF).
   Bytes MakePacket(bool pusi, const Bytes& payload, uint8_t adaptationControl = 1,
                    const Bytes& adaptation = Bytes());
 
-  uint8_t NextCounter() const { return counter_; }
   void SetCounter(uint8_t counter) { counter_ = counter & 0x0F; }
   const std::vector<Bytes>& Packets() const { return packets_; }
   Bytes Stream() const;
