@@ -23,6 +23,8 @@ Bytes Pkt(uint8_t counter, bool pusi, const Bytes& payload, uint8_t adaptationCo
   sb::PacketWriter writer(streams::kAssemblerPid, counter);
   return writer.MakePacket(pusi, payload, adaptationControl, adaptation);
 }
+// An adaptation field of `size` bytes: no flags, then stuffing.
+Bytes Stuffing(size_t size) { return sb::Cat({sb::U8(0), Bytes(size - 1, 0xFF)}); }
 Bytes WithTransportError(Bytes packet) {
   packet[1] |= 0x80;
   return packet;
@@ -54,20 +56,6 @@ Counters CountersOf(const RavelCSectionAssembler& a) {
 // The handler a receiver would write: keeps a copy of each section.
 void Keep(void* context, unsigned char* section, int size) {
   static_cast<std::vector<Bytes>*>(context)->push_back(Bytes(section, section + size));
-}
-
-struct Assembled {
-  std::vector<Bytes> sections;
-  Counters counters;
-  unsigned int reported = 0;  // the sum of what AddTSPacket returned
-};
-Assembled Assemble(const std::vector<Bytes>& packets, bool endOfInput) {
-  Assembled run;
-  RavelCSectionAssembler assembler(Keep, &run.sections);
-  for (const Bytes& packet : packets) run.reported += static_cast<unsigned int>(assembler.AddTSPacket(packet.data()));
-  if (endOfInput) assembler.ClearPacketBuffer();
-  run.counters = CountersOf(assembler);
-  return run;
 }
 
 const Bytes kA = SectionOfSize(40, 1);
@@ -155,11 +143,11 @@ const Case kCases[] = {
      .sections = {kLong, kA},
      .counters = {.delivered = 2, .transportError = 1}},
     {.name = "adaptation-only packets neither carry bytes nor step the counter",
-     .packets = [] { return LongThenAWith(Pkt(1, false, Bytes(), 2, sb::Cat({sb::U8(0), Bytes(182, 0xFF)}))); },
+     .packets = [] { return LongThenAWith(Pkt(1, false, Bytes(), 2, Stuffing(183))); },
      .sections = {kLong, kA},
      .counters = {.delivered = 2}},
     {.name = "a payload after an adaptation field",
-     .packets = [] { return Packets({Pkt(0, true, sb::Cat({sb::U8(0), kA}), 3, sb::Cat({sb::U8(0), Bytes(19, 0xFF)}))}); },
+     .packets = [] { return Packets({Pkt(0, true, sb::Cat({sb::U8(0), kA}), 3, Stuffing(20))}); },
      .sections = {kA},
      .counters = {.delivered = 1}},
     {.name = "a section still short when the next one starts is cut",
@@ -190,10 +178,14 @@ const Case kCases[] = {
 TEST(SectionAssembler, DeliversWholeSectionsAndCountsWhatItDrops) {
   for (const Case& c : kCases) {
     SCOPED_TRACE(c.name);
-    Assembled run = Assemble(c.packets(), c.endOfInput);
-    EXPECT_EQ(c.sections, run.sections);
-    EXPECT_EQ(c.counters, run.counters);
-    EXPECT_EQ(run.sections.size(), run.reported);  // a dropped packet completes nothing
+    std::vector<Bytes> sections;
+    RavelCSectionAssembler assembler(Keep, &sections);
+    unsigned int reported = 0;  // the sum of what AddTSPacket returned
+    for (const Bytes& packet : c.packets()) reported += static_cast<unsigned>(assembler.AddTSPacket(packet.data()));
+    if (c.endOfInput) assembler.ClearPacketBuffer();
+    EXPECT_EQ(c.sections, sections);
+    EXPECT_EQ(c.counters, CountersOf(assembler));
+    EXPECT_EQ(sections.size(), reported);  // a dropped packet completes nothing
   }
 }
 
