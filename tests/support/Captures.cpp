@@ -50,7 +50,7 @@ std::vector<Bytes> SectionsOfPid(const Bytes& stream, unsigned int pid) {
     RavelCSectionData out;
     store.AddTSPacket(packet.data(), out);
     for (int i = 0; i < out.iSectionCount; ++i) {
-      sections.push_back(Bytes(out.pSection[i], out.pSection[i] + out.iSectionSize[i]));
+      sections.emplace_back(out.pSection[i], out.pSection[i] + out.iSectionSize[i]);
     }
   }
   return sections;

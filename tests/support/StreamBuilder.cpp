@@ -26,9 +26,7 @@ Bytes U32(unsigned int value) {
 Bytes Text(const std::string& text) { return Bytes(text.begin(), text.end()); }
 
 Bytes Descriptor(uint8_t tag, const Bytes& body) {
-  Bytes d{tag, static_cast<uint8_t>(body.size())};
-  Append(d, body);
-  return d;
+  return Cat({U8(tag), U8(static_cast<unsigned int>(body.size())), body});
 }
 
 Bytes Length12(unsigned int length, uint8_t reserved) {
@@ -37,9 +35,7 @@ Bytes Length12(unsigned int length, uint8_t reserved) {
 
 Bytes DescriptorLoop(const std::vector<Bytes>& descriptors, uint8_t reserved) {
   Bytes body = Cat(descriptors);
-  Bytes loop = Length12(static_cast<unsigned int>(body.size()), reserved);
-  Append(loop, body);
-  return loop;
+  return Cat({Length12(static_cast<unsigned int>(body.size()), reserved), body});
 }
 
 unsigned int Mjd(int year, int month, int day) {
@@ -57,11 +53,7 @@ unsigned int Mjd(int year, int month, int day) {
 uint8_t Bcd(int value) { return static_cast<uint8_t>(((value / 10) << 4) | (value % 10)); }
 
 Bytes UtcTime(int year, int month, int day, int hour, int minute, int second) {
-  Bytes t = U16(Mjd(year, month, day));
-  t.push_back(Bcd(hour));
-  t.push_back(Bcd(minute));
-  t.push_back(Bcd(second));
-  return t;
+  return Cat({U16(Mjd(year, month, day)), Bytes{Bcd(hour), Bcd(minute), Bcd(second)}});
 }
 
 void FixCrc(Bytes& section) {
@@ -73,17 +65,10 @@ void FixCrc(Bytes& section) {
 
 Bytes LongSection(const SectionOptions& o, const Bytes& body) {
   unsigned int sectionLength = 5 + static_cast<unsigned int>(body.size()) + 4;
-  Bytes s;
-  s.push_back(o.tableId);
-  s.push_back(static_cast<uint8_t>((o.syntaxIndicator ? 0x80 : 0) | (o.privateIndicator ? 0x40 : 0) | 0x30 |
-                                   ((sectionLength >> 8) & 0x0F)));
-  s.push_back(static_cast<uint8_t>(sectionLength));
-  Append(s, U16(o.tableIdExtension));
-  s.push_back(static_cast<uint8_t>(0xC0 | ((o.version & 0x1F) << 1) | (o.currentNext ? 1 : 0)));
-  s.push_back(o.sectionNumber);
-  s.push_back(o.lastSectionNumber);
-  Append(s, body);
-  Append(s, U32(0));
+  const uint8_t flags = static_cast<uint8_t>((o.syntaxIndicator ? 0x80 : 0) | (o.privateIndicator ? 0x40 : 0) | 0x30);
+  const uint8_t versionByte = static_cast<uint8_t>(0xC0 | ((o.version & 0x1F) << 1) | (o.currentNext ? 1 : 0));
+  Bytes s = Cat({U8(o.tableId), U16(flags << 8 | (sectionLength & 0x0FFF)), U16(o.tableIdExtension),
+                 Bytes{versionByte, o.sectionNumber, o.lastSectionNumber}, body, U32(0)});
   FixCrc(s);
   if (o.corruptCrc) s.back() ^= 0x01;
   return s;
@@ -125,15 +110,10 @@ void PacketWriter::AddSection(const Bytes& section) { AddPackedSections(std::vec
 
 void PacketWriter::AddPackedSections(const std::vector<Bytes>& sections) {
   Bytes data = Cat(sections);
-  std::vector<size_t> starts;
-  size_t at = 0;
-  for (size_t i = 0; i < sections.size(); ++i) {
-    starts.push_back(at);
-    at += sections[i].size();
-  }
-  size_t offset = 0;
+  std::vector<size_t> starts;  // of each section in `data`
+  for (size_t i = 0, at = 0; i < sections.size(); at += sections[i++].size()) starts.push_back(at);
   size_t nextStart = 0;
-  while (offset < data.size()) {
+  for (size_t offset = 0; offset < data.size();) {
     // Does a section start inside the next 183 bytes?
     while (nextStart < starts.size() && starts[nextStart] < offset) ++nextStart;
     bool pusi = nextStart < starts.size() && starts[nextStart] < offset + 183;

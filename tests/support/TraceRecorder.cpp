@@ -18,21 +18,21 @@ TraceRecorder::~TraceRecorder() {
 
 TraceLines TraceRecorder::Lines() const {
   TraceLines lines;
-  for (size_t i = 0; i < records_.size(); ++i) lines.push_back(std::make_pair(records_[i].mask, records_[i].text));
+  for (const TraceRecord& record : records_) lines.push_back(std::make_pair(record.mask, record.text));
   return lines;
 }
 
 std::vector<std::string> TraceRecorder::TextsAt(unsigned int mask) const {
   std::vector<std::string> texts;
-  for (size_t i = 0; i < records_.size(); ++i) {
-    if (records_[i].mask == mask) texts.push_back(records_[i].text);
+  for (const TraceRecord& record : records_) {
+    if (record.mask == mask) texts.push_back(record.text);
   }
   return texts;
 }
 
 std::string TraceRecorder::Joined() const {
   std::string all;
-  for (size_t i = 0; i < records_.size(); ++i) all += records_[i].text;
+  for (const TraceRecord& record : records_) all += record.text;
   return all;
 }
 
