@@ -45,17 +45,24 @@ Records AssembleSections(const std::vector<Bytes>& sections) {
 
 unsigned char* MessageOf(unsigned char* section) { return section + 8; }
 
-// One EIT event without descriptors: event_id, start time, duration, status and loop length.
-Bytes Event(unsigned int id) {
-  return sb::Cat({sb::U16(id), sb::UtcTime(2020, 5, 4, 20, 0, 0), Bytes{0x01, 0x00, 0x00}, sb::Length12(0, 0x8)});
-}
-
-Bytes Eit(uint8_t tableId, int events) {
+// An EIT section with `events` events whose descriptor loops hold `descriptors`,
+// as broadcast: their lengths may run past the section.
+Bytes Eit(uint8_t tableId, int events, const Bytes& descriptors = Bytes()) {
   Bytes body = sb::Cat({sb::U16(0x0421), sb::U16(0x0422), sb::U8(0), sb::U8(tableId)});
-  for (int i = 0; i < events; ++i) sb::Append(body, Event(0x1000 + i));
+  for (int i = 0; i < events; ++i) {
+    sb::Append(body, sb::Cat({sb::U16(0x1000 + i), sb::UtcTime(2020, 5, 4, 20, 0, 0), Bytes{0x01, 0x00, 0x00},
+                              sb::Length12(static_cast<unsigned int>(descriptors.size()), 0x8), descriptors}));
+  }
   sb::SectionOptions options;
   options.tableId = tableId;
   return sb::LongSection(options, body);
+}
+
+// The text a descriptor keeps from 200 bytes at `at` in `section`: bytes
+// beyond the section read as 0, so the text ends at the first of them.
+std::string TextAt(const Bytes& section, const Bytes::const_iterator& at) {
+  Bytes text(at, at + std::min<size_t>(200, static_cast<size_t>(section.end() - at)));
+  return std::string(text.begin(), std::find(text.begin(), text.end(), 0));
 }
 
 }  // namespace
@@ -117,45 +124,21 @@ TEST(ReceiversPath, SectionHandedOutWithTheSizeOfTheOneBeforeFailsItsCrcInsideIt
   }
 }
 
-namespace {
-
-// An EIT present/following section with one event whose descriptor loop is
-// `descriptors`, as broadcast: its lengths may run past the section.
-Bytes EitWithEventDescriptors(const Bytes& descriptors) {
-  Bytes event = sb::Cat({sb::U16(0x2000), sb::UtcTime(2020, 5, 4, 20, 0, 0), Bytes{0x01, 0x00, 0x00},
-                         sb::Length12(static_cast<unsigned int>(descriptors.size()), 0x8), descriptors});
-  sb::SectionOptions options;
-  options.tableId = 0x4E;
-  return sb::LongSection(options, sb::Cat({sb::U16(0x0421), sb::U16(0x0422), sb::U8(0), sb::U8(0x4E), event}));
-}
-
-// The text a descriptor keeps from `count` bytes at `at` in `section`: bytes
-// beyond the section read as 0, so the text ends at the first of them.
-std::string TextAt(const Bytes& section, const Bytes::const_iterator& at, size_t count) {
-  Bytes text(at, at + std::min<size_t>(count, static_cast<size_t>(section.end() - at)));
-  return std::string(text.begin(), std::find(text.begin(), text.end(), 0));
-}
-
-}  // namespace
-
 TEST(ReceiversPath, DescriptorsRunningPastTheirSectionReadZerosThereAndStopTheirLoops) {
   const Bytes name = sb::Text("Jornal");  // the last bytes of the descriptor in the section
   struct Case {
     const char* what;
     Bytes descriptors;  // the last one declares more than the section holds
-    size_t declaredText;
     const char* (*keptText)(RavelCEventInfo& event);   // the text that starts with `name`
     const char* (*textAfter)(RavelCEventInfo& event);  // the next text, whose length lies beyond
   } cases[] = {
       {/*what=*/"short event: event_name_length 200",
        /*descriptors=*/sb::Cat({Bytes{0x4D, 0xF0}, sb::Text("por"), sb::U8(200), name}),
-       /*declaredText=*/200,
        /*keptText=*/[](RavelCEventInfo& e) { return e.pShortEventDescriptor->GetEventName(); },
        /*textAfter=*/[](RavelCEventInfo& e) { return e.pShortEventDescriptor->GetEventDescription(); }},
       {/*what=*/"extended event: an item of 200 bytes in an item loop of 250, which stops after it",
        /*descriptors=*/
        sb::Cat({Bytes{0x4E, 0xF0, 0x01}, sb::Text("por"), sb::U8(250), sb::U8(1), sb::Text("A"), sb::U8(200), name}),
-       /*declaredText=*/200,
        /*keptText=*/
        [](RavelCEventInfo& e) {
          RavelCExtendedEventDescriptor* d = e.pExtendedEventDescriptor;
@@ -164,7 +147,7 @@ TEST(ReceiversPath, DescriptorsRunningPastTheirSectionReadZerosThereAndStopTheir
        /*textAfter=*/[](RavelCEventInfo& e) { return e.pExtendedEventDescriptor->GetText(); }},
   };
   for (const Case& c : cases) {
-    Bytes section = EitWithEventDescriptors(c.descriptors);
+    Bytes section = Eit(0x4E, 1, c.descriptors);
     Records records = AssembleSections({section});
     ASSERT_EQ(1u, records.size()) << c.what;
     ASSERT_EQ(static_cast<int>(section.size()), records[0]->iSectionSize[0]) << c.what;
@@ -173,7 +156,7 @@ TEST(ReceiversPath, DescriptorsRunningPastTheirSectionReadZerosThereAndStopTheir
     ASSERT_EQ(1, eit.GetEventCount()) << c.what;
     // The text takes the section's last bytes (its CRC_32), then zeros.
     Bytes::const_iterator textStart = std::search(section.begin(), section.end(), name.begin(), name.end());
-    EXPECT_EQ(TextAt(section, textStart, c.declaredText), c.keptText(*eit.GetEventInfo(0))) << c.what;
+    EXPECT_EQ(TextAt(section, textStart), c.keptText(*eit.GetEventInfo(0))) << c.what;
     EXPECT_STREQ("", c.textAfter(*eit.GetEventInfo(0))) << c.what;
     RavelCEIT copy(eit);
     copy.Show();
