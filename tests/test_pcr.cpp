@@ -14,12 +14,8 @@ const unsigned int kError = 0x80000020u;
 // A packet of PID 0x0021 whose bytes from 4 on start with `adaptation`
 // (adaptation_field_length first); `control` is header byte 3.
 Bytes PcrPacket(uint8_t control, const Bytes& adaptation, uint8_t sync = 0x47) {
-  Bytes p(188, 0xFF);
-  p[0] = sync;
-  p[1] = 0x00;
-  p[2] = 0x21;
-  p[3] = control;
-  for (size_t i = 0; i < adaptation.size(); ++i) p[4 + i] = adaptation[i];
+  Bytes p = sb::Cat({{sync, 0x00, 0x21, control}, adaptation});
+  p.resize(188, 0xFF);
   return p;
 }
 
@@ -66,19 +62,18 @@ TEST(PCRReader, TakesTheFlagsFromTheLengthByteAndTheClockFromBytesTwoToSix) {
 TEST(PCRReader, FailuresKeepTheEarlierValue) {
   struct Case {
     const char* name;
-    bool nullPacket;
-    Bytes packet;
+    Bytes packet;  // none: a null packet
     int result;
     TraceLines traces;
   } cases[] = {
-      {"null packet", true, {}, kRavelErrNullSection, {}},
-      {"bad sync byte", false, PcrPacket(0x30, {0x10, 0, 0, 0, 0x5A, 0, 0}, 0x48), kRavelErrPcr,
+      {"null packet", {}, kRavelErrNullSection, {}},
+      {"bad sync byte", PcrPacket(0x30, {0x10, 0, 0, 0, 0x5A, 0, 0}, 0x48), kRavelErrPcr,
        {{kError, "Invalid TS Packet Start Byte=[0x48]\n"}, {kError, "TS Packet Parsing Fail! iResult=[-7]\n"}}},
-      {"reserved adaptation field control", false, PcrPacket(0x00, {0x10, 0, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
+      {"reserved adaptation field control", PcrPacket(0x00, {0x10, 0, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
        {{kError, "Invalid Adaptation Field Control! => 0x0]"}, {kError, "TS Packet Parsing Fail! iResult=[-8]\n"}}},
-      {"payload only", false, PcrPacket(0x10, {0x10, 0, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
+      {"payload only", PcrPacket(0x10, {0x10, 0, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
        {{kError, "pAdaptionFieldStartPtr is null\n"}, {kError, "iAdaptationFieldControl(1)\n"}}},
-      {"adaptation_field_length 0", false, PcrPacket(0x30, {0x00, 0x10, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
+      {"adaptation_field_length 0", PcrPacket(0x30, {0x00, 0x10, 0, 0, 0x5A, 0, 0}), kRavelErrPcr,
        {{kError, "iAdaptationLen(0)\n"}}},
   };
   for (const Case& c : cases) {
@@ -86,7 +81,7 @@ TEST(PCRReader, FailuresKeepTheEarlierValue) {
     RavelCPCR reader(nullptr);
     reader.mPCR = kEarlier;
     TraceRecorder recorder;
-    EXPECT_EQ(c.result, reader.ParseRawData(c.nullPacket ? nullptr : const_cast<uint8_t*>(c.packet.data())));
+    EXPECT_EQ(c.result, reader.ParseRawData(c.packet.empty() ? nullptr : const_cast<uint8_t*>(c.packet.data())));
     EXPECT_EQ(kEarlier, reader.mPCR);
     EXPECT_EQ(c.traces, recorder.Lines());
   }

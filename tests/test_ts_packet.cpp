@@ -17,13 +17,8 @@ const unsigned int kError = th::kError;
 
 // A packet with the given header bytes; byte 4 is `byte4`, the rest a pattern.
 Bytes RawPacket(uint8_t b1, uint8_t b2, uint8_t b3, uint8_t byte4 = 0x00, uint8_t sync = 0x47) {
-  Bytes p(188);
-  for (size_t i = 0; i < p.size(); ++i) p[i] = static_cast<uint8_t>(i * 7 + 3);
-  p[0] = sync;
-  p[1] = b1;
-  p[2] = b2;
-  p[3] = b3;
-  p[4] = byte4;
+  Bytes p = {sync, b1, b2, b3, byte4};
+  for (size_t i = p.size(); i < 188; ++i) p.push_back(static_cast<uint8_t>(i * 7 + 3));
   return p;
 }
 
@@ -92,25 +87,23 @@ TEST(TSPacketHeader, PacksScramblingAdaptationAndCounterIntoOneByte) {
 TEST(TSPacketHeader, FailuresClearKeepOrPartlyKeepTheMembers) {
   struct Case {
     const char* name;
-    bool nullPacket;
-    uint8_t sync, b1, b2, b3;
+    Bytes packet;  // none: a null packet
     int result;
     std::vector<long> members;  // offsets into the earlier packet
     TraceLines traces;
   } cases[] = {
-      {"null packet: cleared", true, 0, 0, 0, 0, kRavelErrInvalidArgument, {0, 0, 0, 0, 0, 0, 0, -1, -1}, {}},
-      {"sync byte 0x48: unchanged", false, 0x48, 0x41, 0x00, 0x13, kRavelErrSyncByte, {0, 1, 0, 0x1FFE, 0, 3, 7, 4, 10},
-       {{kError, "Invalid TS Packet Start Byte=[0x48]\n"}}},
-      {"reserved adaptation field control: header kept, pointers null", false, 0x47, 0x81, 0x23, 0xC9,
+      {"null packet: cleared", {}, kRavelErrInvalidArgument, {0, 0, 0, 0, 0, 0, 0, -1, -1}, {}},
+      {"sync byte 0x48: unchanged", RawPacket(0x41, 0x00, 0x13, 0x00, 0x48), kRavelErrSyncByte,
+       {0, 1, 0, 0x1FFE, 0, 3, 7, 4, 10}, {{kError, "Invalid TS Packet Start Byte=[0x48]\n"}}},
+      {"reserved adaptation field control: header kept, pointers null", RawPacket(0x81, 0x23, 0xC9),
        kRavelErrInvalidArgument, {1, 0, 0, 0x0123, 3, 0, 9, -1, -1}, {{kError, "Invalid Adaptation Field Control! => 0x0]"}}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.name);
     Bytes earlier = RawPacket(0x5F, 0xFE, 0x37, 0x05);  // PUSI, PID 0x1FFE, AF+payload, counter 7
     RavelCTSPacket header(earlier.data());
-    Bytes packet = RawPacket(c.b1, c.b2, c.b3, 0x00, c.sync);
     TraceRecorder recorder;
-    EXPECT_EQ(c.result, header.ParseRawData(c.nullPacket ? nullptr : packet.data()));
+    EXPECT_EQ(c.result, header.ParseRawData(c.packet.empty() ? nullptr : const_cast<uint8_t*>(c.packet.data())));
     EXPECT_EQ(c.traces, recorder.Lines());
     EXPECT_EQ(c.members, Members(header, earlier));
   }
