@@ -232,14 +232,10 @@ TEST(DsmccDDB, CopiesBlocksOfUpTo4096Bytes) {
     EXPECT_EQ(c.trace, recorder.Lines());
     EXPECT_EQ((std::vector<int>{0x0102, 7, 9, c.blockDataLen}),
               (std::vector<int>{ddb.GetModuleId(), ddb.GetModuleVersion(), ddb.GetBlockNumber(), ddb.GetBlockDataLen()}));
-    if (c.result == kRavelOk) {
-      ASSERT_NE(nullptr, ddb.GetBlockData());
-      EXPECT_EQ(data, BlockOf(ddb));
-      // The block is a copy: the message may go away.
-      EXPECT_TRUE(data.empty() || ddb.GetBlockData() != MessageOf(message) + 18 + c.adaptationLength);
-    } else {
-      EXPECT_EQ(nullptr, ddb.GetBlockData());
-    }
+    EXPECT_EQ(c.result == kRavelOk, ddb.GetBlockData() != nullptr);
+    EXPECT_EQ(c.result == kRavelOk ? data : Bytes(), BlockOf(ddb));
+    // The block is a copy: the message may go away.
+    EXPECT_TRUE(data.empty() || ddb.GetBlockData() != MessageOf(message) + 18 + c.adaptationLength);
     TraceLines dump = ShowLines(ddb);
     ASSERT_EQ(3u, dump.size());  // the message header first
     EXPECT_EQ(std::make_pair(kCarouselDump, Format("moduleId=[0x%04x], moduleVersion=[0x%02x], blockNumber=[%d], "
@@ -314,23 +310,25 @@ TEST(DsmccDII, WalksTheModulesAndReportsWhatItDoesNotKeep) {
   Bytes twoNames = sb::Cat({sb::Descriptor(0x02, sb::Text("first")), sb::Descriptor(0x02, sb::Text("second"))});
   struct Case {
     const char* what;
-    std::vector<Module> modules;
-    Bytes privateData;
-    uint8_t adaptationLength;
-    Bytes compatibility;
-    TraceLines trace;
+    std::vector<Module> modules = {};
+    Bytes privateData = {}, compatibility = {};
+    uint8_t adaptationLength = 0;
+    TraceLines trace = {};
   } cases[] = {
-      {"no modules", {}, Bytes(), 0, Bytes(), {}},
-      {"modules without descriptors", {{1, 100, 1, Bytes()}, {2, 200000, 2, Bytes()}}, Bytes(), 0, Bytes(), {}},
+      {.what = "no modules"},
+      {.what = "modules without descriptors", .modules = {{1, 100, 1, {}}, {2, 200000, 2, {}}}},
       // The location descriptor is not kept by a module record.
-      {"every descriptor kind", {{7, 4066, 3, allKinds}}, Bytes(), 0, Bytes(),
-       {{kWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x06]\n"}}},
-      {"a later name wins", {{1, 1, 0, twoNames}, {2, 2, 0, Bytes()}}, Bytes(), 0, Bytes(), {}},
-      {"after adaptation and compatibility descriptor", {{3, 33, 1, sb::Descriptor(0x99, Bytes{1})}, {4, 44, 1, Bytes()}},
-       Bytes(), 6, Bytes{0, 1, 0x42, 0x42, 0x42}, {{kWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x99]\n"}}},
-      {"private data descriptors", {{1, 1, 0, Bytes()}},
-       sb::Cat({sb::Descriptor(0x0A, Bytes{1, 2}), sb::Descriptor(0x01, sb::Text("x"))}), 0, Bytes(),
-       At(kWarning, {"DSMCC DII: Unsupported Descriptor. Tag=[0x0a]\n", "DSMCC DII: Unsupported Descriptor. Tag=[0x01]\n"})},
+      {.what = "every descriptor kind", .modules = {{7, 4066, 3, allKinds}},
+       .trace = {{kWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x06]\n"}}},
+      {.what = "a later name wins", .modules = {{1, 1, 0, twoNames}, {2, 2, 0, {}}}},
+      {.what = "after adaptation and compatibility descriptor",
+       .modules = {{3, 33, 1, sb::Descriptor(0x99, Bytes{1})}, {4, 44, 1, {}}},
+       .compatibility = {0, 1, 0x42, 0x42, 0x42}, .adaptationLength = 6,
+       .trace = {{kWarning, "DSMCC DII: Module Info Parsing! Unknown Tag=[0x99]\n"}}},
+      {.what = "private data descriptors", .modules = {{1, 1, 0, {}}},
+       .privateData = Cat({sb::Descriptor(0x0A, Bytes{1, 2}), sb::Descriptor(0x01, sb::Text("x"))}),
+       .trace = At(kWarning, {"DSMCC DII: Unsupported Descriptor. Tag=[0x0a]\n",
+                              "DSMCC DII: Unsupported Descriptor. Tag=[0x01]\n"})},
   };
   for (Case& c : cases) {
     SCOPED_TRACE(c.what);
