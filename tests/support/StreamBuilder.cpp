@@ -76,10 +76,8 @@ Bytes LongSection(const SectionOptions& o, const Bytes& body) {
 
 Bytes ShortSection(uint8_t tableId, const Bytes& body, bool withCrc, bool corruptCrc) {
   unsigned int sectionLength = static_cast<unsigned int>(body.size()) + (withCrc ? 4 : 0);
-  Bytes s{tableId, static_cast<uint8_t>(0x70 | ((sectionLength >> 8) & 0x0F)), static_cast<uint8_t>(sectionLength)};
-  Append(s, body);
+  Bytes s = Cat({U8(tableId), U16(0x7000 | (sectionLength & 0x0FFF)), body, withCrc ? U32(0) : Bytes()});
   if (withCrc) {
-    Append(s, U32(0));
     FixCrc(s);
     if (corruptCrc) s.back() ^= 0x01;
   }
