@@ -451,6 +451,7 @@ TEST(TSPktStore, CopiesAreDeepAndGoOnIndependently) {
   assigned.AddTSPacket(Pkt(4, true, sb::Cat({{0}, Head(SectionOfSize(300, 0x82), 183)})).data(), out);
   assigned = original;
   const State collecting = StateOf(original);
+  for (RavelCTSPktStore* copy : {&copied, &assigned}) EXPECT_NE(nullptr, copy->iPacketArray.ipArray[1]);
   // The original finishes first: the copies hold pieces of their own.
   for (RavelCTSPktStore* store : {&original, &copied, &assigned}) {
     EXPECT_EQ(collecting, StateOf(*store));
