@@ -28,6 +28,15 @@ inline TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
 // Zeros after a descriptor in its section: what a parse reading past its length takes in.
 inline Bytes FollowedByZeros(const Bytes& descriptor) { return InSection(descriptor, Bytes(300, 0x00)); }
 
+// An index outside an array of `count`: one panic with the bound trace, and an empty answer.
+template <class Getter>
+void ExpectBoundPanic(int index, int count, Getter get) {
+  TraceRecorder recorder;
+  EXPECT_EQ(decltype(get(index)){}, get(index)) << index;
+  EXPECT_EQ(1, recorder.PanicCount());
+  EXPECT_EQ(BoundOverflow(index, count), recorder.Lines());
+}
+
 // Runs every walk with the parses' own traces kept out of the test's output.
 template <size_t N>
 void RunWalks(const bitwalk::Walk (&walks)[N]) {
