@@ -73,7 +73,9 @@ const std::vector<ClassCase>& Classes() {
        .richBody = Dump({"\tService List Length=[2]\n", "\t\t[0]th Service Info: Service ID=[0x0001], Service Type=[0x01]\n",
                          "\t\t[1]th Service Info: Service ID=[0x1234], Service Type=[0xc0]\n"}), .refusal = kOwnRule},
       {CLASS(RavelCServiceDescriptor), .displayName = "Service Descriptor",
-       .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}), .refusal = kOwnRule,
+       .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}),
+       .richBody = Dump({"\tService Type=[0x01]\n", "\tService Provider Name=[ABC]\n", "\tService Name=[TV]\n"}),
+       .refusal = kOwnRule,
        // Copies keep the header and the type but lose both names.
        .copyBody = {"\tService Type=[0x01]\n", "\tService Provider Name=[(null)]\n", "\tService Name=[(null)]\n"}},
       {CLASS(RavelCLinkageDescriptor), .displayName = "Linkage Descriptor",
@@ -366,15 +368,12 @@ TEST(DescriptorPattern, CopiesOwnTheirDataAndOutliveTheSource) {
 // class of this table.
 TEST(DescriptorFactory, FactoryAndCopierMakeTheClassOfExactlyTheSeventeenTags) {
   const std::map<unsigned int, std::string> expected = {
-      {0x01, "Type Descriptor"},          {0x02, "Name Descriptor"},
-      {0x03, "Info Descriptor"},          {0x04, "Module Link Descriptor"},
-      {0x05, "CRC32 Descriptor"},         {0x06, "Location Descriptor"},
-      {0x07, "Estimated Donwload Time Descriptor"}, {0x40, "Network Name Descriptor"},
-      {0x41, "Service List Descriptor"},  {0x4A, "Linkage Descriptor"},
-      {0x50, "Component Descriptor"},     {0x52, "Stream Id Descriptor"},
-      {0xC2, "Compression Type Descriptor"}, {0xCD, "TS Information Descriptor"},
-      {0xFA, "Terrestrial Delivery System Descriptor"}, {0xFD, "Data Component Descriptor"},
-      {0xFE, "System Management Descriptor"}};
+      {0x01, "Type Descriptor"}, {0x02, "Name Descriptor"}, {0x03, "Info Descriptor"}, {0x04, "Module Link Descriptor"},
+      {0x05, "CRC32 Descriptor"}, {0x06, "Location Descriptor"}, {0x07, "Estimated Donwload Time Descriptor"},
+      {0x40, "Network Name Descriptor"}, {0x41, "Service List Descriptor"}, {0x4A, "Linkage Descriptor"},
+      {0x50, "Component Descriptor"}, {0x52, "Stream Id Descriptor"}, {0xC2, "Compression Type Descriptor"},
+      {0xCD, "TS Information Descriptor"}, {0xFA, "Terrestrial Delivery System Descriptor"},
+      {0xFD, "Data Component Descriptor"}, {0xFE, "System Management Descriptor"}};
   for (unsigned int tag = 0; tag < 256; ++tag) {
     Bytes raw = Empty(static_cast<uint8_t>(tag));
     TraceRecorder recorder;

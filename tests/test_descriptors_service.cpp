@@ -58,17 +58,13 @@ TEST(ServiceDescriptor, ReadsBothNamesAndLeavesEmptyOnesNull) {
       // Control codes and 8-bit text are kept byte for byte.
       {Bytes{0x01, 2, 0x1B, 0x7C, 1, 0xE9}, "\x1B\x7C", "\xE9"},
   };
+  auto text = [](const char* t) { return t ? std::string(t) : std::string("(none)"); };
   for (const Case& c : cases) {
     Bytes raw = Descriptor(0x48, c.body);
     RavelCServiceDescriptor d(raw.data());
     EXPECT_EQ(c.body[0], d.GetServiceType());
-    auto text = [](const char* t) { return t ? std::string(t) : std::string("(none)"); };
     EXPECT_EQ(text(c.provider), text(d.GetServiceProviderName()));
     EXPECT_EQ(text(c.name), text(d.GetServiceName()));
-    TraceLines shown = ShowLines(d);
-    ASSERT_EQ(5u, shown.size());
-    EXPECT_EQ(std::string("\tService Provider Name=[") + (c.provider ? c.provider : "(null)") + "]\n", shown[3].second);
-    EXPECT_EQ(std::string("\tService Name=[") + (c.name ? c.name : "(null)") + "]\n", shown[4].second);
   }
 }
 
@@ -352,10 +348,7 @@ TEST(PartialReceptionDescriptor, KeepsOnlyTheHighByteOfEachServiceId) {
   // A negative index is left to the array's bounds check.
   Bytes raw = Descriptor(0xFB, Cat({U16(0x1234), U16(0x5678)}));
   RavelCPartialReceptionDescriptor d(raw.data());
-  TraceRecorder recorder;
-  EXPECT_EQ(0, d.GetServiceId(-1));
-  EXPECT_EQ(BoundOverflow(-1, 2), recorder.Lines());
-  EXPECT_EQ(1, recorder.PanicCount());
+  ExpectBoundPanic(-1, 2, [&](int i) { return d.GetServiceId(i); });
 }
 
 // ---------------------------------------------------------------------------
@@ -363,48 +356,15 @@ TEST(PartialReceptionDescriptor, KeepsOnlyTheHighByteOfEachServiceId) {
 
 namespace {
 
-// The TS name and its records are read from 'A' bytes, so that a name length
-// bit shows in the name's length (and a record has 0x41 services).
-Bytes TsInformationBase() {
-  Bytes raw(400, 'A');
-  raw[0] = 0xCD;
-  raw[1] = 0xFF;
-  raw[2] = 0x00;
-  raw[3] = 0x00;
-  return raw;
-}
-
-const bitwalk::Reader ExtendedBroadcasterHeader =
-    RAVEL_WALK_READER(RavelCExtendedBroadcasterDescriptor, d.GetBroadcasterType(), d.GetTerrestrialBroadcasterId(),
-                      d.GetNumberOfAffiliationIds(), d.GetNumberOfBroadcasterIds());
-
-const std::vector<Field> kExtendedBroadcasterHeader = {
-    {"broadcaster type", {{16, 4}}}, {"terrestrial broadcaster id", {{24, 16}}}, {"affiliation id count", {{40, 4}}},
-    {"broadcaster id count", {{44, 4}}},
-};
-
 const bitwalk::Reader LogoFields =
     RAVEL_WALK_READER(RavelCLogoTransmissionDescriptor, d.GetLogoId(), d.GetLogoVersion(), d.GetDownloadDataId());
 
 }  // namespace
 
+// The other fixed fields are pinned by their Show lines in the descriptor pattern
+// table and by the classes' own tests above.
 TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
-      {"linkage", Base({0x4A, 7}, 9), 16, 72, {{"transport stream id", {{16, 16}}}, {"original network id", {{32, 16}}},
-        {"service id", {{48, 16}}}, {"linkage type", {{64, 8}}}},
-       RAVEL_WALK_READER(RavelCLinkageDescriptor, d.GetTransportStreamId(), d.GetOriginalNetworkId(), d.GetServiceId(),
-                         d.GetLinkageType())},
-      {"TS information", TsInformationBase(), 16, 32,
-       {{"remote control key id", {{16, 8}}}, {"TS name length", {{24, 6}}}, {"transmission type count", {{30, 2}}}},
-       RAVEL_WALK_READER(RavelCTSInformationDescriptor, d.GetRemoteControlKeyId(),
-                         static_cast<int64_t>(std::strlen(d.GetTsName())), d.GetTransmissionTypeCount())},
-      // Types 0 to 15; only types 1 and 2 read more, from zeros here.
-      {"extended broadcaster type", Base({0xCE, 0x20, 0x00}, 40), 16, 24, kExtendedBroadcasterHeader,
-       ExtendedBroadcasterHeader},
-      {"extended broadcaster type 1", Base({0xCE, 0x20, 0x10}, 40), 24, 48, kExtendedBroadcasterHeader,
-       ExtendedBroadcasterHeader},
-      {"extended broadcaster type 2", Base({0xCE, 0x20, 0x20}, 40), 24, 48, kExtendedBroadcasterHeader,
-       ExtendedBroadcasterHeader},
       // Two affiliation ids taken from bytes 6 and 8; the broadcaster loop then
       // starts at byte 8, so byte 8 is both affiliation id 1 and the high byte of
       // the first original network id, and byte 7 is read by nobody.
@@ -422,9 +382,6 @@ TEST(ServiceDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
        {{"area code", {{16, 12}}}, {"guard interval", {{28, 2}}}, {"transmission mode", {{30, 2}}}},
        RAVEL_WALK_READER(RavelCTerrDeliverySystemDescriptor, d.GetAreaCode(), d.GetGuardInterval(),
                          d.GetTransmissionMode())},
-      // Only the high byte of each service id is kept.
-      {"partial reception", Base({0xFB, 4}, 6), 16, 48, {{"service id 0", {{16, 8}}}, {"service id 1", {{32, 8}}}},
-       RAVEL_WALK_READER(RavelCPartialReceptionDescriptor, d.GetServiceId(0), d.GetServiceId(1))},
       // The flag is the two lowest bits, inside the identifier; the two top bits
       // of the byte are read by nobody.
       {"system management", Base({0xFE, 2}, 4), 16, 32, {{"broadcasting flag", {{22, 2}}},
