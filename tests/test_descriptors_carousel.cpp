@@ -46,8 +46,6 @@ TEST(InfoDescriptor, KeepsTheTextWithTwoZeroBytesAndCopiesItUpToTheFirstZero) {
     EXPECT_EQ(0, d.GetText()[c.text.size() + 1]);
     RavelCInfoDescriptor copy(d);
     EXPECT_STREQ(c.copied, copy.GetText());
-    EXPECT_NE(d.GetText(), copy.GetText());
-    EXPECT_STREQ(c.language, copy.GetLanguageCode());
   }
   // A null parse leaves no text, and the dump prints it as the C library prints null.
   RavelCInfoDescriptor d(nullptr);
@@ -94,8 +92,6 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
   EXPECT_EQ((TraceLines{{kDump, "\t EventMsgGroupID=[0], TimeMode=[0]\n"}, {kWarning, "Unknown Time Mode =[0x0]\n"},
                         {kDump, "\t EventMsgType=[0], EventMsgID=[0x0000]\n"}}),
             BodyLines(empty));
-  const RavelCEventRelativeTime& relative = empty.GetEventMsgRelativeTime();
-  EXPECT_EQ((std::vector<int>{0, 0, 0}), (std::vector<int>{relative.iHours, relative.iMinutes, relative.iSeconds}));
 }
 
 TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {
@@ -178,33 +174,10 @@ Bytes GeneralEventBase(uint8_t mode) { return bitwalk::Base({0x40, 11, 0x00, 0x0
 
 }  // namespace
 
+// The fixed fields of the other module info descriptors are pinned by their Show
+// lines in the descriptor pattern table.
 TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
   const bitwalk::Walk walks[] = {
-      {"module link", Base({0x04, 3}, 5), 16, 40, {{"position", {{16, 8}}}, {"module id", {{24, 16}}}},
-       RAVEL_WALK_READER(RavelCModuleLinkDescriptor, d.GetPosition(), d.GetModuleId())},
-      {"CRC32", Base({0x05, 4}, 6), 16, 48,
-       {{"CRC byte 0", {{16, 8}}}, {"CRC byte 1", {{24, 8}}}, {"CRC byte 2", {{32, 8}}}, {"CRC byte 3", {{40, 8}}}},
-       RAVEL_WALK_READER(RavelCCRC32Descriptor, d.GetCRC32()[0], d.GetCRC32()[1], d.GetCRC32()[2], d.GetCRC32()[3])},
-      {"location", Base({0x06, 1}, 3), 16, 24, {{"location tag", {{16, 8}}}},
-       RAVEL_WALK_READER(RavelCLocationDescriptor, d.GetLocationTag())},
-      {"estimated download time", Base({0x07, 4}, 6), 16, 48, {{"estimated download time", {{16, 32}}}},
-       RAVEL_WALK_READER(RavelCEstDownloadTimeDescriptor, d.GetEstDownloadTime())},
-      {"compression type", Base({0xC2, 5}, 7), 16, 56, {{"compression type", {{16, 8}}}, {"original size", {{24, 32}}}},
-       RAVEL_WALK_READER(RavelCCompressionTypeDescriptor, d.GetCompressionType(), d.GetOriginalSize())},
-      // Bytes 8 to 10 and the top seven bits of bytes 3 and 11 are read by nobody.
-      {"NPT reference", Base({0x17, 18}, 20), 16, 160, {{"post discontinuity indicator", {{16, 1}}},
-        {"content id", {{17, 7}}}, {"STC reference bit 32", {{31, 1}}}, {"STC reference byte 1", {{32, 8}}},
-        {"STC reference byte 2", {{40, 8}}}, {"STC reference byte 3", {{48, 8}}}, {"STC reference byte 4", {{56, 8}}},
-        {"NPT reference bit 32", {{95, 1}}}, {"NPT reference byte 1", {{96, 8}}}, {"NPT reference byte 2", {{104, 8}}},
-        {"NPT reference byte 3", {{112, 8}}}, {"NPT reference byte 4", {{120, 8}}}, {"scale numerator", {{128, 16}}},
-        {"scale denominator", {{144, 16}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCNPTReferenceDescriptor d(raw);
-         const unsigned char* stc = d.GetSTCReference();
-         const unsigned char* npt = d.GetNPTReference();
-         return {d.GetPostDiscontinuityIndicator(), d.GetContentId(), stc[0], stc[1], stc[2], stc[3], stc[4],
-                 npt[0], npt[1], npt[2], npt[3], npt[4], d.GetScaleNumerator(), d.GetScaleDenominator()};
-       }},
       // Time mode 0 reads no time: bytes 5 to 9 change nothing.
       {"general event, group id", GeneralEventBase(0), 16, 32, GeneralEventLayout(0), GeneralEventFields},
       {"general event mode 0", GeneralEventBase(0), 40, 104, GeneralEventLayout(0), GeneralEventFields},
