@@ -17,7 +17,6 @@ namespace th {
 
 using Values = std::vector<int64_t>;
 using bitwalk::Base;
-using bitwalk::Field;
 
 // The lines of Show after the banner and the base line.
 inline TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
