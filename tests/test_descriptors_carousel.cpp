@@ -77,9 +77,7 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
     TraceRecorder recorder;
     RavelCGeneralEventDescriptor d(raw.data());
     EXPECT_EQ(c.parseTraces ? c.modeLines : TraceLines(), recorder.Lines());
-    if (c.parseTraces) {
-      EXPECT_EQ("SectionParser/source/Ravel_CDescriptorGeneralEvent", recorder.Records()[0].file);
-    }
+    if (c.parseTraces) { EXPECT_EQ("SectionParser/source/Ravel_CDescriptorGeneralEvent", recorder.Records()[0].file); }
     EXPECT_EQ(2, d.GetPrivateDataLength());
     EXPECT_STREQ("pd", d.GetPrivateData());
     TraceLines expected = Dump({"\t EventMsgGroupID=[2748], TimeMode=[" + std::to_string(c.mode) + "]\n"});
@@ -101,14 +99,12 @@ TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {
   } cases[] = {{11, 0}, {14, 3}, {10, 255} /* 10 - 11 in 8 bits */, {0, 245}};
   for (Case& c : cases) {
     SCOPED_TRACE(int(c.length));
-    Bytes raw(13 + 256, 0x00);
-    raw[0] = 0x40;
-    raw[1] = c.length;
-    for (size_t i = 13; i < raw.size(); ++i) raw[i] = static_cast<uint8_t>('A' + i % 26);
+    Bytes raw = RawDescriptor(0x40, c.length, Bytes(11, 0x00));
+    for (int i = 0; i < 256; ++i) raw.push_back(static_cast<uint8_t>('A' + i % 26));
     RavelCGeneralEventDescriptor d(raw.data());
     EXPECT_EQ(c.privateLength, d.GetPrivateDataLength());
     ASSERT_NE(nullptr, d.GetPrivateData());
-    EXPECT_EQ(std::string(raw.begin() + 13, raw.begin() + 13 + c.privateLength), std::string(d.GetPrivateData()));
+    EXPECT_EQ(std::string(raw.begin() + 13, raw.begin() + 13 + c.privateLength), d.GetPrivateData());
   }
 }
 
@@ -133,58 +129,4 @@ TEST(GeneralEventDescriptor, PrivateDataIsReplacedOnlyByAMatchingTagAndCopiedAsT
   RavelCGeneralEventDescriptor empty(nullptr);
   copy = empty;
   EXPECT_EQ(nullptr, copy.GetPrivateData());
-}
-
-// ---------------------------------------------------------------------------
-// Every wire bit of the fixed fields, one at a time
-
-namespace {
-
-Values GeneralEventFields(unsigned char* raw) {
-  RavelCGeneralEventDescriptor d(raw);
-  const RavelCDateTime& time = d.GetEventMsgMJDJSTTime();
-  const unsigned char* npt = d.GetEventMsgNPT();
-  const RavelCEventRelativeTime& relative = d.GetEventMsgRelativeTime();
-  return {d.GetEventMsgGroupId(), time.iHour,        time.iMinute,        time.iSecond, npt[0],
-          npt[1],                 npt[2],            npt[3],              npt[4],       relative.iHours,
-          relative.iMinutes,      relative.iSeconds, d.GetEventMsgType(), d.GetEventMsgId()};
-}
-
-// The time field (bytes 5 to 9) is read by time mode: the MJD/JST time's BCD
-// hour, minute and second in bytes 7 to 9 (modes 1 and 5), the 33-bit NPT
-// (mode 2), or BCD digits four bits into the field (mode 3). The MJD itself is
-// no sum of its bits and stays 0 here.
-std::vector<bitwalk::Field> GeneralEventLayout(int mode) {
-  const bool jst = mode == 1 || mode == 5;
-  const bool npt = mode == 2;
-  const bool relative = mode == 3;
-  auto bcd = [](bool read, int at) {
-    return std::vector<bitwalk::Segment>{{at, read ? 4 : 0, 10}, {at + 4, read ? 4 : 0}};
-  };
-  auto bits = [](bool read, int at, int width) { return std::vector<bitwalk::Segment>{{at, read ? width : 0}}; };
-  return {{"event message group id", {{16, 12}}}, {"MJD/JST hour", bcd(jst, 56)}, {"MJD/JST minute", bcd(jst, 64)},
-          {"MJD/JST second", bcd(jst, 72)}, {"NPT bit 32", bits(npt, 47, 1)}, {"NPT byte 1", bits(npt, 48, 8)},
-          {"NPT byte 2", bits(npt, 56, 8)}, {"NPT byte 3", bits(npt, 64, 8)}, {"NPT byte 4", bits(npt, 72, 8)},
-          {"relative hours", bcd(relative, 44)}, {"relative minutes", bcd(relative, 52)},
-          {"relative seconds", bcd(relative, 60)}, {"event message type", {{80, 8}}},
-          {"event message id", {{88, 16}}}};
-}
-
-Bytes GeneralEventBase(uint8_t mode) { return bitwalk::Base({0x40, 11, 0x00, 0x00, mode}, 16); }
-
-}  // namespace
-
-// The fixed fields of the other module info descriptors are pinned by their Show
-// lines in the descriptor pattern table.
-TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
-  const bitwalk::Walk walks[] = {
-      // Time mode 0 reads no time: bytes 5 to 9 change nothing.
-      {"general event, group id", GeneralEventBase(0), 16, 32, GeneralEventLayout(0), GeneralEventFields},
-      {"general event mode 0", GeneralEventBase(0), 40, 104, GeneralEventLayout(0), GeneralEventFields},
-      {"general event mode 1", GeneralEventBase(1), 56, 104, GeneralEventLayout(1), GeneralEventFields},
-      {"general event mode 2", GeneralEventBase(2), 40, 104, GeneralEventLayout(2), GeneralEventFields},
-      {"general event mode 3", GeneralEventBase(3), 40, 104, GeneralEventLayout(3), GeneralEventFields},
-      {"general event mode 5", GeneralEventBase(5), 56, 104, GeneralEventLayout(5), GeneralEventFields},
-  };
-  RunWalks(walks);
 }
