@@ -126,8 +126,8 @@ TEST(GingaAppDescriptor, NeverFillsItsParameterButClearsItOnNull) {
   EXPECT_EQ(At(kWarning, {"\t iParameter " + std::string(255, 'p') + " \n"}), BodyLines(d));
 }
 
-// The values themselves are walked bit by bit below; here, which records exist,
-// the information trace of each value and the Show dump.
+// Which records exist, the information trace of each value and the Show dump;
+// across the cases every bit of the flags byte is set and cleared once.
 TEST(GingaAppDataComponentDescriptor, DecodesAndTracesEachValueAtInformationLevel) {
   struct Case {
     const char* label;
