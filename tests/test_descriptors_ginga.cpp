@@ -127,7 +127,7 @@ TEST(GingaAppDescriptor, NeverFillsItsParameterButClearsItOnNull) {
 }
 
 // Which records exist, the information trace of each value and the Show dump;
-// across the cases every bit of the flags byte is set and cleared once.
+// every bit of the flags byte is set in one case and clear in another.
 TEST(GingaAppDataComponentDescriptor, DecodesAndTracesEachValueAtInformationLevel) {
   struct Case {
     const char* label;
