@@ -90,7 +90,6 @@ TEST(GingaAppLocDescriptor, SplitsThreeTextsNeverOverrunsAndShowsThemTerminated)
       {"plain",
        sb::Descriptor(0x07, sb::Cat({sb::U8(4), sb::Text("/app"), sb::U8(3), sb::Text("lib"), sb::Text("main.ncl")})),
        "/app", "lib", "main.ncl"},
-      {"empty", sb::Descriptor(0x07, Bytes{0, 0}), "", "", ""},
       // (4 - 1 - 3 - 2) mod 256 = 254 bytes of initial class name.
       {"wrapping remainder", sb::Cat({Bytes{0x07, 4, 1, 'a', 3, 'b', 'c', 'd'}, Bytes(254, 'w'), Bytes(4, 'Z')}), "a",
        "bcd", std::string(254, 'w')},
