@@ -396,7 +396,7 @@ TEST(DescriptorFactory, NullInputAndTagsOutsideTheTableAreRefused) {
             recorder.Lines());
 }
 
-TEST(DescriptorCopier, CopiesOwnTheirDataAndFollowTheHeaderTag) {
+TEST(DescriptorCopier, FollowsTheHeaderTagOfARefusedParse) {
   TraceRecorder quiet;
   Bytes list = sb::Descriptor(0x41, Bytes{0x00, 0x10, 0x01, 0x00, 0x11, 0xC0});
   // A network name object whose parse refused a service list tag is copied as
