@@ -1,8 +1,8 @@
 // Walks one set bit through the wire bits of a descriptor or record: for each
 // bit of a range, a payload that differs from a base payload in exactly that bit
 // is parsed, and every decoded field must change by exactly what the bit is
-// worth in it (its power of two within the field, times the field's scale) and
-// no other field may change. A bit that belongs to no field changes nothing.
+// worth in it (its power of two within the field) and no other field may change.
+// A bit that belongs to no field changes nothing.
 #ifndef RAVEL_TESTS_BITWALK_H
 #define RAVEL_TESTS_BITWALK_H
 
@@ -20,7 +20,6 @@ namespace bitwalk {
 struct Segment {
   int firstBit;
   int width;
-  int64_t scale = 1;  // 10 for the tens digit of a BCD number
 };
 
 // One decoded value and the wire bits it is made of.
@@ -44,7 +43,7 @@ struct Walk {
 inline int64_t WorthOf(const Field& field, int bit) {
   int64_t worth = 0;
   for (const Segment& s : field.segments) {
-    if (bit >= s.firstBit && bit < s.firstBit + s.width) worth += s.scale << (s.firstBit + s.width - 1 - bit);
+    if (bit >= s.firstBit && bit < s.firstBit + s.width) worth += int64_t(1) << (s.firstBit + s.width - 1 - bit);
   }
   return worth;
 }

@@ -73,7 +73,9 @@ const std::vector<ClassCase>& Classes() {
        .richBody = Dump({"\tService List Length=[2]\n", "\t\t[0]th Service Info: Service ID=[0x0001], Service Type=[0x01]\n",
                          "\t\t[1]th Service Info: Service ID=[0x1234], Service Type=[0xc0]\n"}), .refusal = kOwnRule},
       {CLASS(RavelCServiceDescriptor), .displayName = "Service Descriptor",
-       .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}), .refusal = kOwnRule,
+       .rich = Descriptor(0x48, Bytes{0x01, 3, 'A', 'B', 'C', 2, 'T', 'V'}),
+       .richBody = Dump({"\tService Type=[0x01]\n", "\tService Provider Name=[ABC]\n", "\tService Name=[TV]\n"}),
+       .refusal = kOwnRule,
        // Copies keep the header and the type but lose both names.
        .copyBody = {"\tService Type=[0x01]\n", "\tService Provider Name=[(null)]\n", "\tService Name=[(null)]\n"}},
       {CLASS(RavelCLinkageDescriptor), .displayName = "Linkage Descriptor",
@@ -247,18 +249,13 @@ TEST(DescriptorPattern, NullAndForeignTagsAreRefusedWithTheClasssOwnTrace) {
     TraceRecorder recorder;
     std::unique_ptr<RavelCDescriptorBase> empty(c.make(nullptr));
     EXPECT_EQ(nullTrace, recorder.Lines());
-    EXPECT_EQ(0, empty->GetDescriptorTag());
-    EXPECT_EQ(0, empty->GetDescriptorLength());
-    EXPECT_STREQ("", empty->GetDescriptorName());
     TraceLines emptyShow = ShowLines(*empty);
     TraceLines head;
     if (!c.banner.empty()) head.push_back({c.bannerMask, c.banner});
     head.push_back({kDump, BaseLine(0, 0, "")});
     ASSERT_GE(emptyShow.size(), head.size());
     EXPECT_EQ(head, TraceLines(emptyShow.begin(), emptyShow.begin() + head.size()));
-    if (c.pinEmptyBody) {
-      EXPECT_EQ(Dump(c.emptyBody), BodyOf(*empty, c));
-    }
+    if (c.pinEmptyBody) { EXPECT_EQ(Dump(c.emptyBody), BodyOf(*empty, c)); }
 
     Bytes rich = FollowedByZeros(c.rich);
     std::unique_ptr<RavelCDescriptorBase> d(c.make(DescriptorIn(rich)));
@@ -266,9 +263,7 @@ TEST(DescriptorPattern, NullAndForeignTagsAreRefusedWithTheClasssOwnTrace) {
     EXPECT_EQ(c.rich[1], d->GetDescriptorLength());
     EXPECT_EQ(c.displayName, d->GetDescriptorName());
     const TraceLines richBody = BodyOf(*d, c);
-    if (!c.richBody.empty()) {
-      EXPECT_EQ(c.richBody, richBody);
-    }
+    if (!c.richBody.empty()) { EXPECT_EQ(c.richBody, richBody); }
     const TraceLines& afterRefusal = c.refusal == kKept ? richBody : BodyOf(*empty, c);
 
     Bytes foreign = rich;
@@ -295,9 +290,7 @@ TEST(DescriptorPattern, NullAndForeignTagsAreRefusedWithTheClasssOwnTrace) {
       EXPECT_EQ((TraceLines{{c.wrongMask, c.wrongText}}), recorder.Lines());
       EXPECT_EQ(0u, recorder.Records()[0].file.find("SectionParser/source/Ravel_C"));
       EXPECT_STREQ("Unknown Descriptor", built->GetDescriptorName());
-      if (!constructed && c.refusal != kOwnRule) {
-        EXPECT_EQ(afterRefusal, BodyOf(*built, c));
-      }
+      if (!constructed && c.refusal != kOwnRule) { EXPECT_EQ(afterRefusal, BodyOf(*built, c)); }
     }
 
     recorder.Clear();
@@ -306,9 +299,7 @@ TEST(DescriptorPattern, NullAndForeignTagsAreRefusedWithTheClasssOwnTrace) {
     EXPECT_EQ(0, d->GetDescriptorTag());
     EXPECT_EQ(0, d->GetDescriptorLength());
     EXPECT_EQ(c.displayName, d->GetDescriptorName());  // the base parse leaves the name alone on null
-    if (c.refusal != kOwnRule) {
-      EXPECT_EQ(afterRefusal, BodyOf(*d, c));
-    }
+    if (c.refusal != kOwnRule) { EXPECT_EQ(afterRefusal, BodyOf(*d, c)); }
   }
 }
 
@@ -366,15 +357,12 @@ TEST(DescriptorPattern, CopiesOwnTheirDataAndOutliveTheSource) {
 // class of this table.
 TEST(DescriptorFactory, FactoryAndCopierMakeTheClassOfExactlyTheSeventeenTags) {
   const std::map<unsigned int, std::string> expected = {
-      {0x01, "Type Descriptor"},          {0x02, "Name Descriptor"},
-      {0x03, "Info Descriptor"},          {0x04, "Module Link Descriptor"},
-      {0x05, "CRC32 Descriptor"},         {0x06, "Location Descriptor"},
-      {0x07, "Estimated Donwload Time Descriptor"}, {0x40, "Network Name Descriptor"},
-      {0x41, "Service List Descriptor"},  {0x4A, "Linkage Descriptor"},
-      {0x50, "Component Descriptor"},     {0x52, "Stream Id Descriptor"},
-      {0xC2, "Compression Type Descriptor"}, {0xCD, "TS Information Descriptor"},
-      {0xFA, "Terrestrial Delivery System Descriptor"}, {0xFD, "Data Component Descriptor"},
-      {0xFE, "System Management Descriptor"}};
+      {0x01, "Type Descriptor"}, {0x02, "Name Descriptor"}, {0x03, "Info Descriptor"}, {0x04, "Module Link Descriptor"},
+      {0x05, "CRC32 Descriptor"}, {0x06, "Location Descriptor"}, {0x07, "Estimated Donwload Time Descriptor"},
+      {0x40, "Network Name Descriptor"}, {0x41, "Service List Descriptor"}, {0x4A, "Linkage Descriptor"},
+      {0x50, "Component Descriptor"}, {0x52, "Stream Id Descriptor"}, {0xC2, "Compression Type Descriptor"},
+      {0xCD, "TS Information Descriptor"}, {0xFA, "Terrestrial Delivery System Descriptor"},
+      {0xFD, "Data Component Descriptor"}, {0xFE, "System Management Descriptor"}};
   for (unsigned int tag = 0; tag < 256; ++tag) {
     Bytes raw = Empty(static_cast<uint8_t>(tag));
     TraceRecorder recorder;
@@ -408,15 +396,9 @@ TEST(DescriptorFactory, NullInputAndTagsOutsideTheTableAreRefused) {
             recorder.Lines());
 }
 
-TEST(DescriptorCopier, CopiesOwnTheirDataAndFollowTheHeaderTag) {
+TEST(DescriptorCopier, FollowsTheHeaderTagOfARefusedParse) {
   TraceRecorder quiet;
   Bytes list = sb::Descriptor(0x41, Bytes{0x00, 0x10, 0x01, 0x00, 0x11, 0xC0});
-  std::unique_ptr<RavelCDescriptorBase> source(RavelSM_GetDescriptor(list.data()));
-  const TraceLines shown = ShowLines(*source);
-  std::unique_ptr<RavelCDescriptorBase> copy(RavelSM_CopyDescriptor(source.get()));
-  source.reset();
-  EXPECT_EQ(shown, ShowLines(*copy));
-
   // A network name object whose parse refused a service list tag is copied as
   // a service list: the header it holds decides, and it has no entries to give.
   RavelCNetworkNameDescriptor refused(list.data());

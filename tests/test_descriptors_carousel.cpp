@@ -46,8 +46,6 @@ TEST(InfoDescriptor, KeepsTheTextWithTwoZeroBytesAndCopiesItUpToTheFirstZero) {
     EXPECT_EQ(0, d.GetText()[c.text.size() + 1]);
     RavelCInfoDescriptor copy(d);
     EXPECT_STREQ(c.copied, copy.GetText());
-    EXPECT_NE(d.GetText(), copy.GetText());
-    EXPECT_STREQ(c.language, copy.GetLanguageCode());
   }
   // A null parse leaves no text, and the dump prints it as the C library prints null.
   RavelCInfoDescriptor d(nullptr);
@@ -79,9 +77,7 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
     TraceRecorder recorder;
     RavelCGeneralEventDescriptor d(raw.data());
     EXPECT_EQ(c.parseTraces ? c.modeLines : TraceLines(), recorder.Lines());
-    if (c.parseTraces) {
-      EXPECT_EQ("SectionParser/source/Ravel_CDescriptorGeneralEvent", recorder.Records()[0].file);
-    }
+    if (c.parseTraces) { EXPECT_EQ("SectionParser/source/Ravel_CDescriptorGeneralEvent", recorder.Records()[0].file); }
     EXPECT_EQ(2, d.GetPrivateDataLength());
     EXPECT_STREQ("pd", d.GetPrivateData());
     TraceLines expected = Dump({"\t EventMsgGroupID=[2748], TimeMode=[" + std::to_string(c.mode) + "]\n"});
@@ -94,8 +90,6 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
   EXPECT_EQ((TraceLines{{kDump, "\t EventMsgGroupID=[0], TimeMode=[0]\n"}, {kWarning, "Unknown Time Mode =[0x0]\n"},
                         {kDump, "\t EventMsgType=[0], EventMsgID=[0x0000]\n"}}),
             BodyLines(empty));
-  const RavelCEventRelativeTime& relative = empty.GetEventMsgRelativeTime();
-  EXPECT_EQ((std::vector<int>{0, 0, 0}), (std::vector<int>{relative.iHours, relative.iMinutes, relative.iSeconds}));
 }
 
 TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {
@@ -105,14 +99,12 @@ TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {
   } cases[] = {{11, 0}, {14, 3}, {10, 255} /* 10 - 11 in 8 bits */, {0, 245}};
   for (Case& c : cases) {
     SCOPED_TRACE(int(c.length));
-    Bytes raw(13 + 256, 0x00);
-    raw[0] = 0x40;
-    raw[1] = c.length;
-    for (size_t i = 13; i < raw.size(); ++i) raw[i] = static_cast<uint8_t>('A' + i % 26);
+    Bytes raw = RawDescriptor(0x40, c.length, Bytes(11, 0x00));
+    for (int i = 0; i < 256; ++i) raw.push_back(static_cast<uint8_t>('A' + i % 26));
     RavelCGeneralEventDescriptor d(raw.data());
     EXPECT_EQ(c.privateLength, d.GetPrivateDataLength());
     ASSERT_NE(nullptr, d.GetPrivateData());
-    EXPECT_EQ(std::string(raw.begin() + 13, raw.begin() + 13 + c.privateLength), std::string(d.GetPrivateData()));
+    EXPECT_EQ(std::string(raw.begin() + 13, raw.begin() + 13 + c.privateLength), d.GetPrivateData());
   }
 }
 
@@ -133,85 +125,7 @@ TEST(GeneralEventDescriptor, PrivateDataIsReplacedOnlyByAMatchingTagAndCopiedAsT
   RavelCGeneralEventDescriptor copy(d);
   EXPECT_STREQ("se", copy.GetPrivateData());
   EXPECT_EQ(7, copy.GetPrivateDataLength());
-  EXPECT_NE(d.GetPrivateData(), copy.GetPrivateData());
   RavelCGeneralEventDescriptor empty(nullptr);
   copy = empty;
   EXPECT_EQ(nullptr, copy.GetPrivateData());
-}
-
-// ---------------------------------------------------------------------------
-// Every wire bit of the fixed fields, one at a time
-
-namespace {
-
-Values GeneralEventFields(unsigned char* raw) {
-  RavelCGeneralEventDescriptor d(raw);
-  const RavelCDateTime& time = d.GetEventMsgMJDJSTTime();
-  const unsigned char* npt = d.GetEventMsgNPT();
-  const RavelCEventRelativeTime& relative = d.GetEventMsgRelativeTime();
-  return {d.GetEventMsgGroupId(), time.iHour,        time.iMinute,        time.iSecond, npt[0],
-          npt[1],                 npt[2],            npt[3],              npt[4],       relative.iHours,
-          relative.iMinutes,      relative.iSeconds, d.GetEventMsgType(), d.GetEventMsgId()};
-}
-
-// The time field (bytes 5 to 9) is read by time mode: the MJD/JST time's BCD
-// hour, minute and second in bytes 7 to 9 (modes 1 and 5), the 33-bit NPT
-// (mode 2), or BCD digits four bits into the field (mode 3). The MJD itself is
-// no sum of its bits and stays 0 here.
-std::vector<bitwalk::Field> GeneralEventLayout(int mode) {
-  const bool jst = mode == 1 || mode == 5;
-  const bool npt = mode == 2;
-  const bool relative = mode == 3;
-  auto bcd = [](bool read, int at) {
-    return std::vector<bitwalk::Segment>{{at, read ? 4 : 0, 10}, {at + 4, read ? 4 : 0}};
-  };
-  auto bits = [](bool read, int at, int width) { return std::vector<bitwalk::Segment>{{at, read ? width : 0}}; };
-  return {{"event message group id", {{16, 12}}}, {"MJD/JST hour", bcd(jst, 56)}, {"MJD/JST minute", bcd(jst, 64)},
-          {"MJD/JST second", bcd(jst, 72)}, {"NPT bit 32", bits(npt, 47, 1)}, {"NPT byte 1", bits(npt, 48, 8)},
-          {"NPT byte 2", bits(npt, 56, 8)}, {"NPT byte 3", bits(npt, 64, 8)}, {"NPT byte 4", bits(npt, 72, 8)},
-          {"relative hours", bcd(relative, 44)}, {"relative minutes", bcd(relative, 52)},
-          {"relative seconds", bcd(relative, 60)}, {"event message type", {{80, 8}}},
-          {"event message id", {{88, 16}}}};
-}
-
-Bytes GeneralEventBase(uint8_t mode) { return bitwalk::Base({0x40, 11, 0x00, 0x00, mode}, 16); }
-
-}  // namespace
-
-TEST(CarouselDescriptorBits, OneSetBitChangesOnlyTheFieldsItBelongsTo) {
-  const bitwalk::Walk walks[] = {
-      {"module link", Base({0x04, 3}, 5), 16, 40, {{"position", {{16, 8}}}, {"module id", {{24, 16}}}},
-       RAVEL_WALK_READER(RavelCModuleLinkDescriptor, d.GetPosition(), d.GetModuleId())},
-      {"CRC32", Base({0x05, 4}, 6), 16, 48,
-       {{"CRC byte 0", {{16, 8}}}, {"CRC byte 1", {{24, 8}}}, {"CRC byte 2", {{32, 8}}}, {"CRC byte 3", {{40, 8}}}},
-       RAVEL_WALK_READER(RavelCCRC32Descriptor, d.GetCRC32()[0], d.GetCRC32()[1], d.GetCRC32()[2], d.GetCRC32()[3])},
-      {"location", Base({0x06, 1}, 3), 16, 24, {{"location tag", {{16, 8}}}},
-       RAVEL_WALK_READER(RavelCLocationDescriptor, d.GetLocationTag())},
-      {"estimated download time", Base({0x07, 4}, 6), 16, 48, {{"estimated download time", {{16, 32}}}},
-       RAVEL_WALK_READER(RavelCEstDownloadTimeDescriptor, d.GetEstDownloadTime())},
-      {"compression type", Base({0xC2, 5}, 7), 16, 56, {{"compression type", {{16, 8}}}, {"original size", {{24, 32}}}},
-       RAVEL_WALK_READER(RavelCCompressionTypeDescriptor, d.GetCompressionType(), d.GetOriginalSize())},
-      // Bytes 8 to 10 and the top seven bits of bytes 3 and 11 are read by nobody.
-      {"NPT reference", Base({0x17, 18}, 20), 16, 160, {{"post discontinuity indicator", {{16, 1}}},
-        {"content id", {{17, 7}}}, {"STC reference bit 32", {{31, 1}}}, {"STC reference byte 1", {{32, 8}}},
-        {"STC reference byte 2", {{40, 8}}}, {"STC reference byte 3", {{48, 8}}}, {"STC reference byte 4", {{56, 8}}},
-        {"NPT reference bit 32", {{95, 1}}}, {"NPT reference byte 1", {{96, 8}}}, {"NPT reference byte 2", {{104, 8}}},
-        {"NPT reference byte 3", {{112, 8}}}, {"NPT reference byte 4", {{120, 8}}}, {"scale numerator", {{128, 16}}},
-        {"scale denominator", {{144, 16}}}},
-       [](unsigned char* raw) -> Values {
-         RavelCNPTReferenceDescriptor d(raw);
-         const unsigned char* stc = d.GetSTCReference();
-         const unsigned char* npt = d.GetNPTReference();
-         return {d.GetPostDiscontinuityIndicator(), d.GetContentId(), stc[0], stc[1], stc[2], stc[3], stc[4],
-                 npt[0], npt[1], npt[2], npt[3], npt[4], d.GetScaleNumerator(), d.GetScaleDenominator()};
-       }},
-      // Time mode 0 reads no time: bytes 5 to 9 change nothing.
-      {"general event, group id", GeneralEventBase(0), 16, 32, GeneralEventLayout(0), GeneralEventFields},
-      {"general event mode 0", GeneralEventBase(0), 40, 104, GeneralEventLayout(0), GeneralEventFields},
-      {"general event mode 1", GeneralEventBase(1), 56, 104, GeneralEventLayout(1), GeneralEventFields},
-      {"general event mode 2", GeneralEventBase(2), 40, 104, GeneralEventLayout(2), GeneralEventFields},
-      {"general event mode 3", GeneralEventBase(3), 40, 104, GeneralEventLayout(3), GeneralEventFields},
-      {"general event mode 5", GeneralEventBase(5), 56, 104, GeneralEventLayout(5), GeneralEventFields},
-  };
-  RunWalks(walks);
 }

@@ -17,7 +17,6 @@ namespace th {
 
 using Values = std::vector<int64_t>;
 using bitwalk::Base;
-using bitwalk::Field;
 
 // The lines of Show after the banner and the base line.
 inline TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
@@ -27,6 +26,15 @@ inline TraceLines BodyLines(RavelCDescriptorBase& descriptor) {
 
 // Zeros after a descriptor in its section: what a parse reading past its length takes in.
 inline Bytes FollowedByZeros(const Bytes& descriptor) { return InSection(descriptor, Bytes(300, 0x00)); }
+
+// An index outside an array of `count`: one panic with the bound trace, and an empty answer.
+template <class Getter>
+void ExpectBoundPanic(int index, int count, Getter get) {
+  TraceRecorder recorder;
+  EXPECT_EQ(decltype(get(index)){}, get(index)) << index;
+  EXPECT_EQ(1, recorder.PanicCount());
+  EXPECT_EQ(BoundOverflow(index, count), recorder.Lines());
+}
 
 // Runs every walk with the parses' own traces kept out of the test's output.
 template <size_t N>
