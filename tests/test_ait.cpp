@@ -4,6 +4,7 @@
 
 #include <cstdio>
 #include <cstring>
+#include <map>
 #include <set>
 #include <string>
 #include <vector>
@@ -95,73 +96,69 @@ TEST(AitParse, MapsTheResolutionNibbleAndKeepsUnsupportedApplications) {
 }
 
 TEST(AitParse, ReportsEachDescriptorTagAsItsTableSays) {
-  const std::string invalid = "Detected an Invalid Descriptor";
-  struct Case {
-    uint8_t tag;
-    unsigned int mask;
-    std::string detected;
-  } cases[] = {
-      {0x00, kInfo, "Detected an APPLICATION_DESCRIPTOR"},
-      {0x02, kInfo, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"}, {0x03, kDump, invalid}, {0x04, kDump, invalid},
-      {0x05, kInfo, "Detected an APPLICATION_AUTH_EXT_DESCRIPTOR"},
-      {0x06, kInfo, "Detected an APPLICATION_GINGA_APP_DESCRIPTOR"}, {0x08, kDump, invalid}, {0x09, kDump, invalid},
-      {0x0A, kDump, invalid}, {0x0B, kInfo, "Detected an APPLICATION_ICON_DESCRIPTOR"},
-      {0x0C, kInfo, "Detected an APPLICATION_PREFETCH_DESCRIPTOR"},
-      {0x0D, kInfo, "Detected an APPLICATION_DII_LOCATION_DESCRIPTOR"}, {0x0E, kDump, invalid}, {0x40, kDump, invalid},
-      {0xFD, kInfo, "Detected an APPLICATION_DATA_COMPONENT_DESCRIPTOR"}, {0xFE, kDump, invalid},
-  };
-  for (const Case& c : cases) {
+  std::map<uint8_t, std::string> named = {{0x00, "APPLICATION_DESCRIPTOR"},
+                                          {0x02, "APPLICATION_TRANSP_PROT_DESCRIPTOR"},
+                                          {0x05, "APPLICATION_AUTH_EXT_DESCRIPTOR"},
+                                          {0x06, "APPLICATION_GINGA_APP_DESCRIPTOR"},
+                                          {0x0B, "APPLICATION_ICON_DESCRIPTOR"},
+                                          {0x0C, "APPLICATION_PREFETCH_DESCRIPTOR"},
+                                          {0x0D, "APPLICATION_DII_LOCATION_DESCRIPTOR"},
+                                          {0xFD, "APPLICATION_DATA_COMPONENT_DESCRIPTOR"}};
+  for (uint8_t tag : {0x00, 0x02, 0x03, 0x04, 0x05, 0x06, 0x08, 0x09, 0x0A, 0x0B, 0x0C, 0x0D, 0x0E, 0x40, 0xFD, 0xFE}) {
+    SCOPED_TRACE(int(tag));
     // A body that every class could read as text: nothing of it may reach the record.
-    Bytes descriptor =
-        sb::Descriptor(c.tag, sb::Cat({sb::U8(3), sb::Text("abc"), sb::U8(2), sb::Text("de"), sb::Text("fg")}));
+    Bytes descriptor = sb::Descriptor(tag, sb::Cat({sb::U8(3), sb::Text("abc"), sb::U8(2), sb::Text("de"), sb::Text("fg")}));
     Bytes section = Ait(AitBody({App(1, 2, 1, 0xC, {descriptor})}));
     RavelCAIT ait;
     TraceRecorder recorder;
     ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
-    TraceLines expected = {{kInfo, ParseLine(section.data())}, {kInfo, kProcess}, {c.mask, c.detected}};
-    EXPECT_EQ(expected, recorder.Lines()) << int(c.tag);
+    const bool known = named.count(tag) != 0;
+    EXPECT_EQ((TraceLines{{kInfo, ParseLine(section.data())}, {kInfo, kProcess},
+                          {known ? kInfo : kDump, known ? "Detected an " + named[tag] : "Detected an Invalid Descriptor"}}),
+              recorder.Lines());
     ASSERT_EQ(1, ait.GetApplicationList()->iCount);
-    EXPECT_STREQ("", At(ait, 0).szAppName) << int(c.tag);
-    EXPECT_STREQ("", At(ait, 0).szAppFilePath) << int(c.tag);
-    EXPECT_STREQ("", At(ait, 0).szAppFileName) << int(c.tag);
+    EXPECT_EQ("", At(ait, 0).szAppName + std::string(At(ait, 0).szAppFilePath) + At(ait, 0).szAppFileName);
   }
 }
 
 TEST(AitParse, TakesNameAndLocationTextsAndOverwritesWithoutClearing) {
+  // The traces of one descriptor each: they show the record after it.
+  auto name = [](const std::string& record) {
+    return th::At(kInfo, {kProcess, "Detected an APPLICATION_NAME_DESCRIPTOR", "Application name = " + record});
+  };
+  auto location = [](const std::string& path, const std::string& file) {
+    return th::At(kInfo, {kProcess, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR", "Application path = " + path,
+                      "Application filename = " + file});
+  };
   struct Case {
     const char* label;
     std::vector<Bytes> descriptors;
     std::string name, path, file;
-    TraceLines descriptorTraces;
+    std::vector<TraceLines> descriptorTraces;
   } cases[] = {
       {"name and location", {Name("Quiz"), Location("/quiz", "lib", "main.ncl")}, "Quiz", "/quiz", "main.ncl",
-       {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = Quiz"},
-        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /quiz"}, {kInfo, "Application filename = main.ncl"}}},
+       {name("Quiz"), location("/quiz", "main.ncl")}},
       {"neither", {}, "", "", "", {}},
-      // A shorter second text overwrites only its own length; the trace shows the record.
+      // A shorter second text overwrites only its own length.
       {"second texts shorter",
        {Name("LongerName"), Name("Short"), Location("/a/long/dir", "", "initial.ncl"), Location("/b", "cp", "x")},
-       "Shortr" "Name", "/b/long/dir", "xnitial.ncl",
-       {{kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = LongerName"},
-        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_NAME_DESCRIPTOR"}, {kInfo, "Application name = ShortrName"},
-        {kInfo, kProcess}, {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-        {kInfo, "Application path = /a/long/dir"}, {kInfo, "Application filename = initial.ncl"}, {kInfo, kProcess},
-        {kInfo, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"}, {kInfo, "Application path = /b/long/dir"},
-        {kInfo, "Application filename = xnitial.ncl"}}},
+       "ShortrName", "/b/long/dir", "xnitial.ncl",
+       {name("LongerName"), name("ShortrName"), location("/a/long/dir", "initial.ncl"),
+        location("/b/long/dir", "xnitial.ncl")}},
   };
   for (const Case& c : cases) {
+    SCOPED_TRACE(c.label);
     Bytes section = Ait(AitBody({App(1, 2, 1, 0xC, c.descriptors)}));
     RavelCAIT ait;
     TraceRecorder recorder;
-    ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data())) << c.label;
+    ASSERT_EQ(kRavelOk, ait.ParseRawData(section.data()));
     TraceLines expected = {{kInfo, ParseLine(section.data())}};
-    expected.insert(expected.end(), c.descriptorTraces.begin(), c.descriptorTraces.end());
-    EXPECT_EQ(expected, recorder.Lines()) << c.label;
+    for (const TraceLines& traces : c.descriptorTraces) Add(expected, traces);
+    EXPECT_EQ(expected, recorder.Lines());
     ASSERT_EQ(1, ait.GetApplicationList()->iCount);
-    EXPECT_EQ(c.name, Field(At(ait, 0).szAppName, 255)) << c.label;
-    EXPECT_EQ(c.path, Field(At(ait, 0).szAppFilePath, 255)) << c.label;
-    EXPECT_EQ(c.file, Field(At(ait, 0).szAppFileName, 256)) << c.label;
+    EXPECT_EQ(c.name, Field(At(ait, 0).szAppName, 255));
+    EXPECT_EQ(c.path, Field(At(ait, 0).szAppFilePath, 255));
+    EXPECT_EQ(c.file, Field(At(ait, 0).szAppFileName, 256));
   }
 }
 

@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <cstdio>
-#include <memory>
 #include <string>
 #include <utility>
 #include <vector>
@@ -66,8 +65,10 @@ Bytes NitBody(const std::vector<Bytes>& networkDescriptors, const std::vector<By
   return Cat({sb::DescriptorLoop(networkDescriptors), Length12(static_cast<unsigned int>(streams.size())), streams});
 }
 
-Bytes NitSection(const Bytes& body, uint8_t tableId = 0x40, uint8_t version = 1, uint8_t sectionNumber = 0) {
+Bytes NitSection(const Bytes& body, uint8_t tableId = 0x40, uint8_t version = 1, uint8_t sectionNumber = 0,
+                 bool corruptCrc = false) {
   sb::SectionOptions options;
+  options.corruptCrc = corruptCrc;
   options.tableId = tableId;
   options.tableIdExtension = 0x7FE1;  // network_id
   options.version = version;
@@ -113,14 +114,9 @@ const char kSummaryEmpty[] = "tsid=0x0003 onid=0x7fe3 len=0";
 }  // namespace
 
 TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
-  Bytes good = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}));
-  sb::SectionOptions bad;
-  bad.tableId = 0x40;
-  bad.corruptCrc = true;
-  Bytes badCrc = sb::LongSection(bad, NitBody({NetworkName("Rede")}, {kStreamA}));
-  Bytes sdtId = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}), 0x42);
-  bad.tableId = 0x46;
-  Bytes bothBad = sb::LongSection(bad, NitBody({}, {}));
+  const Bytes body = NitBody({NetworkName("Rede")}, {kStreamA});
+  Bytes good = NitSection(body), badCrc = NitSection(body, 0x40, 1, 0, true), sdtId = NitSection(body, 0x42);
+  Bytes bothBad = NitSection(NitBody({}, {}), 0x46, 1, 0, true);
   ASSERT_EQ(1, RavelCNIT(good.data()).GetTSInfoCount());
   tc::ExpectRefusals<RavelCNIT>(good, tc::Refusals("NIT", badCrc, sdtId, "0x42", bothBad),
                                 [](RavelCNIT& nit, const tc::Refusal& r, TraceRecorder& recorder) {
@@ -300,16 +296,8 @@ TEST(NITMerge, SameVersionTakesMissingNetworkDescriptorsAndAppendsStreams) {
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCNIT target(c.target->data());
-    std::unique_ptr<RavelCNIT> other(new RavelCNIT((c.other ? c.other : c.target)->data()));
-    const std::string otherNetwork = NetworkSummary(*other);
-    const std::vector<std::string> otherStreams = Streams(*other);
-    TraceRecorder recorder;
-    RavelCNIT& result = c.other ? (target += *other) : (target += target);
-    EXPECT_EQ(&target, &result);
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(otherNetwork, NetworkSummary(*other));
-    EXPECT_EQ(otherStreams, Streams(*other));
-    other.reset();  // the merged parts are copies
+    EXPECT_EQ(c.traces, tc::MergeInto(target, c.other ? c.other->data() : nullptr,
+                                      [](RavelCNIT& nit) { return std::make_pair(NetworkSummary(nit), Streams(nit)); }));
     EXPECT_EQ(c.network, NetworkSummary(target));
     EXPECT_EQ(c.streams, Streams(target));
     EXPECT_EQ((*c.target)[6], target.iSectionNumber);
@@ -321,65 +309,52 @@ TEST(NITCopy, CopiesHeaderNameDescriptorsAndEveryStreamDeeply) {
   Bytes section = NitSection(
       NitBody({NetworkName("Rede"), Linkage(1, 2, 3, 4), SystemManagement(3, 1)}, {kStreamA, kStreamB}), 0x41, 9, 1);
   Bytes other = NitSection(NitBody({NetworkName("Old")}, {kStreamEmpty}));
-  std::unique_ptr<RavelCNIT> source(new RavelCNIT(section.data()));
+  RavelCNIT* source = new RavelCNIT(section.data());
   source->iSession = 0x3C;
   const std::string network = NetworkSummary(*source);
-  const TraceLines shown = ShowLines(*source);
-  RavelCNIT constructed(*source);
   RavelCNIT assigned(other.data());
-  assigned = *source;
-  source.reset();
-  for (RavelCNIT* copy : {&constructed, &assigned}) EXPECT_EQ(shown, ShowLines(*copy));
+  tc::ExpectDeepCopies(source, assigned, ShowLines<RavelCNIT>);
   EXPECT_STREQ("NIT Other", assigned.sTableName.GetString());
   // The streams are released before the copy: a table assigned to itself keeps
   // its network descriptors and loses its streams.
-  assigned = assigned;
+  tc::SelfAssign(assigned);
   EXPECT_EQ(network, NetworkSummary(assigned));
   EXPECT_EQ(0, assigned.GetTSInfoCount());
-
-  RavelCTSInfo ts(const_cast<uint8_t*>(kStreamA.data()));
-  RavelCTSInfo tsCopy(ts);
   RavelCTSInfo tsAssigned(const_cast<uint8_t*>(kStreamB.data()));
-  tsAssigned = ts;
-  ts.ParseRawData(nullptr);
-  EXPECT_EQ(kSummaryA, Summary(tsCopy));
-  EXPECT_EQ(kSummaryA, Summary(tsAssigned));
+  tc::ExpectDeepCopies(new RavelCTSInfo(const_cast<uint8_t*>(kStreamA.data())), tsAssigned, Summary);
 }
 
 TEST(NITShow, DumpsHeaderNetworkDescriptorsAndStreamsInTheirOwnOrder) {
-  const std::string rule = Rule(kShortRule);
   Bytes section = NitSection(NitBody({SystemManagement(0x03, 0x01), NetworkName("Rede"), Linkage(1, 2, 3, 4)},
                                      {TsEntry(0x0001, 0x7FE1, {TerrDelivery(0x591, 3, 2, {0x0C68}),
                                                                PartialReception({0xE761}), TSInformation(0x05, "Ch"),
                                                                ServiceList({{0xE760, 0x01}})}),
                                       kStreamEmpty}));
   RavelCNIT nit(section.data());
-  TraceLines expected = Dump({rule, "#### NIT Table Information\n", "# Header Information\n"});
-  Add(expected, HeaderLines(0x40, "NIT Actual", 1, 65, 0x7FE1, 1, 1, 0, 1));
-  Add(expected, Dump({"# Body Information. [Descriptors]\n", Banner("Linkage Descriptor"), BaseLine(0x4A, 7, "Linkage Descriptor"),
-                      "\tTransportStreamId=[0x0001], OrginalNetworkId=[0x0002], ServiceId=[0x0003], LinkageType=[0x04]\n",
-                      Banner("Network Descriptor"), BaseLine(0x40, 4, "Network Name Descriptor"), "\tNetwork Name=[Rede]\n",
-                      Banner("System Management Descriptor"), BaseLine(0xFE, 2, "System Management Descriptor"),
-                      "\tBroadcasting Flag=[0x03], Broadcasting Id=[0x03], Additional Ids=[0x01]\n",
-                      "Transport Stream Information. Size=[2]\n",
-                      "\tTS Information : TransportStreamId=[0x0001], OrginalNetworkId=[0x7fe1]\n",
-                      Banner("Service List Descriptor"), BaseLine(0x41, 3, "Service List Descriptor"),
-                      "\tService List Length=[1]\n", "\t\t[0]th Service Info: Service ID=[0xe760], Service Type=[0x01]\n",
-                      Banner("TS Information Descriptor"), BaseLine(0xCD, 4, "TS Information Descriptor"),
-                      "\tRemote Control Key Id=[0x05], Ts Name=[Ch], Tx Type Count=[0]\n",
-                      Banner("Partial Reception Descriptor", 21), BaseLine(0xFB, 2, "Partial Reception Descriptor"),
-                      "\tService Id [0] = 231\n", Banner("Terrestrial Delivery Descriptor"),
-                      BaseLine(0xFA, 4, "Terrestrial Delivery System Descriptor"),
-                      "\tArea Code=[0x0591], Guard Interval=[0x03], Tx Mode=[0x02], Num Of Freq=[1]\n",
-                      "\t\tTerrDelSys: Frequency=[3176]\n",
-                      "\tTS Information : TransportStreamId=[0x0003], OrginalNetworkId=[0x7fe3]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(nit));
+  EXPECT_EQ(tc::ShortDump("NIT", HeaderLines(0x40, "NIT Actual", 1, 65, 0x7FE1, 1, 1, 0, 1),
+          {"# Body Information. [Descriptors]\n", Banner("Linkage Descriptor"), BaseLine(0x4A, 7, "Linkage Descriptor"),
+           "\tTransportStreamId=[0x0001], OrginalNetworkId=[0x0002], ServiceId=[0x0003], LinkageType=[0x04]\n",
+           Banner("Network Descriptor"), BaseLine(0x40, 4, "Network Name Descriptor"), "\tNetwork Name=[Rede]\n",
+           Banner("System Management Descriptor"), BaseLine(0xFE, 2, "System Management Descriptor"),
+           "\tBroadcasting Flag=[0x03], Broadcasting Id=[0x03], Additional Ids=[0x01]\n",
+           "Transport Stream Information. Size=[2]\n",
+           "\tTS Information : TransportStreamId=[0x0001], OrginalNetworkId=[0x7fe1]\n",
+           Banner("Service List Descriptor"), BaseLine(0x41, 3, "Service List Descriptor"),
+           "\tService List Length=[1]\n", "\t\t[0]th Service Info: Service ID=[0xe760], Service Type=[0x01]\n",
+           Banner("TS Information Descriptor"), BaseLine(0xCD, 4, "TS Information Descriptor"),
+           "\tRemote Control Key Id=[0x05], Ts Name=[Ch], Tx Type Count=[0]\n",
+           Banner("Partial Reception Descriptor", 21), BaseLine(0xFB, 2, "Partial Reception Descriptor"),
+           "\tService Id [0] = 231\n", Banner("Terrestrial Delivery Descriptor"),
+           BaseLine(0xFA, 4, "Terrestrial Delivery System Descriptor"),
+           "\tArea Code=[0x0591], Guard Interval=[0x03], Tx Mode=[0x02], Num Of Freq=[1]\n",
+           "\t\tTerrDelSys: Frequency=[3176]\n",
+           "\tTS Information : TransportStreamId=[0x0003], OrginalNetworkId=[0x7fe3]\n"}),
+      ShowLines(nit));
   // A table never parsed shows an unknown name and no streams.
   RavelCNIT empty(nullptr);
-  expected = Dump({rule, "#### NIT Table Information\n", "# Header Information\n"});
-  Add(expected, EmptyHeaderLines());
-  Add(expected, Dump({"# Body Information. [Descriptors]\n", "Transport Stream Information. Size=[0]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(empty));
+  EXPECT_EQ(tc::ShortDump("NIT", EmptyHeaderLines(),
+                          {"# Body Information. [Descriptors]\n", "Transport Stream Information. Size=[0]\n"}),
+            ShowLines(empty));
 }
 
 TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialReception) {

@@ -2,12 +2,10 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
-#include <memory>
 #include <string>
 #include <utility>
 #include <vector>
 
-#include "Captures.h"
 #include "Ravel_CTablePAT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
@@ -150,43 +148,34 @@ TEST(PATParse, ReparseReplacesTheListButKeepsAnEarlierNetworkPid) {
 TEST(PATCopy, CopiesHeaderNameNetworkPidAndEveryProgram) {
   Bytes section = PatSection({{0, 0x0010}, {5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}});
   Bytes other = PatSection({{9, 0x0900}, {8, 0x0800}, {0, 0x0030}}, 0x0001, 7);
-  std::unique_ptr<RavelCPAT> source(new RavelCPAT(section.data()));
+  RavelCPAT* source = new RavelCPAT(section.data());
   source->iSession = 0x5A;
-  const TraceLines shown = ShowLines(*source);
-  RavelCPAT constructed(*source);
   RavelCPAT assigned(other.data());
-  assigned = *source;
-  source.reset();
-  EXPECT_EQ(shown, ShowLines(constructed));
-  EXPECT_EQ(shown, ShowLines(assigned));
+  tc::ExpectDeepCopies(source, assigned, ShowLines<RavelCPAT>);
   EXPECT_EQ(0x0010, assigned.GetNetworkPID());
   // Assigning a table to itself clears its programs before the copy.
-  assigned = assigned;
+  tc::SelfAssign(assigned);
   EXPECT_EQ(0, assigned.GetProgramCount());
   EXPECT_EQ(0x0010, assigned.GetNetworkPID());
 }
 
 TEST(PATShow, DumpsTheListAndEachEntryAtItsOwnMask) {
-  const std::string rule = Rule(kShortRule);
   Bytes section = PatSection({{0, 0x0010}, {5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}});
   RavelCPAT pat(section.data());
-  TraceLines expected = Dump({rule, "#### PAT Table Information\n", "# Header Information\n"});
-  Add(expected, HeaderLines(0x00, "PAT", 1, 25, 0x7ED0, 1, 1, 0, 0));
-  Add(expected, Dump({"# Body Information\n", "The number of PMT Table Info=[3]\n",
-                      "[0]th Table Info: Program Number=[3], PID=[0x101]\n",
-                      "[1]th Table Info: Program Number=[5], PID=[0x100]\n",
-                      "[2]th Table Info: Program Number=[1], PID=[0x1fc8]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(pat));
+  EXPECT_EQ(tc::ShortDump("PAT", HeaderLines(0x00, "PAT", 1, 25, 0x7ED0, 1, 1, 0, 0),
+                          {"# Body Information\n", "The number of PMT Table Info=[3]\n",
+                           "[0]th Table Info: Program Number=[3], PID=[0x101]\n",
+                           "[1]th Table Info: Program Number=[5], PID=[0x100]\n",
+                           "[2]th Table Info: Program Number=[1], PID=[0x1fc8]\n"}),
+            ShowLines(pat));
   EXPECT_EQ((TraceLines{{kWarning, "Program Number=[1], PID=[8136]\n"}}), ShowLines(*pat.GetPMTInfo(2)));
   // A table never parsed: no programs, no network PID, an unknown name.
   TraceRecorder recorder;
   RavelCPAT empty(nullptr);
   EXPECT_TRUE(recorder.Lines().empty());
   EXPECT_EQ(0xFFFF, empty.GetNetworkPID());
-  expected = Dump({rule, "#### PAT Table Information\n", "# Header Information\n"});
-  Add(expected, EmptyHeaderLines());
-  Add(expected, Dump({"# Body Information\n", "The number of PMT Table Info=[0]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(empty));
+  EXPECT_EQ(tc::ShortDump("PAT", EmptyHeaderLines(), {"# Body Information\n", "The number of PMT Table Info=[0]\n"}),
+            ShowLines(empty));
 }
 
 TEST(PMTInfo, ReadsProgramNumberAndThirteenBitPid) {

@@ -316,17 +316,13 @@ TEST(MapInfo, CopiesAreDeep) {
   Bytes entry = StreamEntry(
       {0x06, 0x0113, {CaDescriptor(0x0456), StreamId(0x30), DataComponent(0x0008), sb::Descriptor(0xC6, {1, 'Q'})}});
   Bytes other = StreamEntry({0x1B, 0x0111, {StreamId(0x00)}});
-  std::unique_ptr<RavelCMapInfo> source(new RavelCMapInfo(entry.data()));
-  RavelCMapInfo constructed(*source);
   RavelCMapInfo assigned(other.data());
-  assigned = *source;
-  source.reset();
-  for (RavelCMapInfo* copy : {&constructed, &assigned}) {
-    EXPECT_EQ(0x06, copy->GetStreamType());
-    EXPECT_EQ(0x0113, copy->GetElementaryPID());
-    EXPECT_EQ(entry.size() - 5, copy->GetESInfoLength());
-    EXPECT_EQ("tag=48,dc=8,region=Q,ca=1110", Held(*copy));
-  }
+  tc::ExpectDeepCopies(new RavelCMapInfo(entry.data()), assigned, [](RavelCMapInfo& info) {
+    return Held(info) + " " + std::to_string(info.GetStreamType()) + " " + std::to_string(info.GetElementaryPID()) +
+           " " + std::to_string(info.GetESInfoLength());
+  });
+  EXPECT_EQ("tag=48,dc=8,region=Q,ca=1110", Held(assigned));
+  EXPECT_EQ(entry.size() - 5, assigned.GetESInfoLength());
   // A copy of an entry without descriptors drops the target's own.
   Bytes bare = StreamEntry({0x0F, 0x0112, {}});
   RavelCMapInfo empty(bare.data());
@@ -356,14 +352,7 @@ TEST(PMTMerge, AppendsCopiesOfTheOthersStreamsOnlyWhenTheVersionsMatch) {
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCPMT target(first.data());
-    std::unique_ptr<RavelCPMT> other(new RavelCPMT(c.other ? c.other->data() : first.data()));
-    const int otherCount = other->GetMapInfoCount();
-    TraceRecorder recorder;
-    RavelCPMT& result = c.other ? (target += *other) : (target += target);
-    EXPECT_EQ(&target, &result);
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(otherCount, other->GetMapInfoCount());
-    other.reset();  // the appended streams are the target's own copies
+    EXPECT_EQ(c.traces, tc::MergeInto(target, c.other ? c.other->data() : nullptr, StreamsOf));
     EXPECT_EQ(c.streams, StreamsOf(target));
     // Header, name, PCR PID, program info and parental rating stay the target's.
     EXPECT_EQ(0x4800, target.iTableIdExtension);
@@ -406,91 +395,70 @@ TEST(PMTAssign, CopiesEverythingButTheParentalRating) {
   }
   // Assigning a table to itself clears its streams before the copy.
   RavelCPMT self(sourceSection.data());
-  self = self;
+  tc::SelfAssign(self);
   EXPECT_EQ(0, self.GetMapInfoCount());
   EXPECT_EQ(0x0121, self.GetPCRPID());
   EXPECT_NE(nullptr, self.GetParentalRating());
 }
 
 TEST(PMTShow, DumpsHeaderBodyAndEachStreamWithItsDescriptors) {
-  const std::string rule = Rule(kShortRule);
   Bytes section = PmtSection({{0x1B, 0x0111, {StreamId(0x00), CaDescriptor(0x0123)}},
                               {0x06, 0x0113, {sb::Descriptor(0xC6, {0x01, 'A', 'B'}), DataComponent(0x0008), StreamId(0x30)}},
                               {0x0D, 0x1FC8, {}}},
                              {ParentalRating(2)}, 3, 0x4800, 0x0111);
   RavelCPMT pmt(section.data());
   RavelCPMT empty(nullptr);
-  TraceLines expected = Dump({rule, "#### PMT Table Information\n", "# Header Information\n"});
-  TraceLines emptyExpected = expected;
-  Add(expected, HeaderLines(0x02, "PMT", 1, section.size() - 3, 0x4800, 3, 1, 0, 0));
   // The rating is not dumped; each stream's descriptors in their own order.
-  Add(expected, Dump({"# Body Information\n", "PCR_PID=[0x0111], Program Information Len=[6]\n",
-                      "Stream Information. Size=[3]\n", "Stream Type Id=[0x1b], Stream PID=[0x0111], Stream Info Len=[9]\n",
-                      Banner("Stream Identifier Descriptor"), BaseLine(0x52, 1, "Stream Id Descriptor"),
-                      "\tComponent Tag = [0x00]\n", "Stream Type Id=[0x06], Stream PID=[0x0113], Stream Info Len=[13]\n",
-                      Banner("Stream Identifier Descriptor"), BaseLine(0x52, 1, "Stream Id Descriptor"),
-                      "\tComponent Tag = [0x30]\n", Banner("Data Component Descriptor"),
-                      BaseLine(0xFD, 3, "Data Component Descriptor"), "\tiDataComponentId=[0x0008]\n",
-                      Banner("Target Region Descriptor", 21), BaseLine(0xC6, 3, "Region Descriptor"),
-                      "\t Region Spec Type: 1 \n", "\t Region Spec: AB \n",
-                      "Stream Type Id=[0x0d], Stream PID=[0x1fc8], Stream Info Len=[0]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(pmt));
+  EXPECT_EQ(tc::ShortDump("PMT", HeaderLines(0x02, "PMT", 1, section.size() - 3, 0x4800, 3, 1, 0, 0),
+                          {"# Body Information\n", "PCR_PID=[0x0111], Program Information Len=[6]\n",
+                           "Stream Information. Size=[3]\n",
+                           "Stream Type Id=[0x1b], Stream PID=[0x0111], Stream Info Len=[9]\n",
+                           Banner("Stream Identifier Descriptor"), BaseLine(0x52, 1, "Stream Id Descriptor"),
+                           "\tComponent Tag = [0x00]\n",
+                           "Stream Type Id=[0x06], Stream PID=[0x0113], Stream Info Len=[13]\n",
+                           Banner("Stream Identifier Descriptor"), BaseLine(0x52, 1, "Stream Id Descriptor"),
+                           "\tComponent Tag = [0x30]\n", Banner("Data Component Descriptor"),
+                           BaseLine(0xFD, 3, "Data Component Descriptor"), "\tiDataComponentId=[0x0008]\n",
+                           Banner("Target Region Descriptor", 21), BaseLine(0xC6, 3, "Region Descriptor"),
+                           "\t Region Spec Type: 1 \n", "\t Region Spec: AB \n",
+                           "Stream Type Id=[0x0d], Stream PID=[0x1fc8], Stream Info Len=[0]\n"}),
+            ShowLines(pmt));
   // A table never parsed shows an unknown name and no streams.
-  Add(emptyExpected, EmptyHeaderLines());
-  Add(emptyExpected, Dump({"# Body Information\n", "PCR_PID=[0x0000], Program Information Len=[0]\n",
-                           "Stream Information. Size=[0]\n", rule}));
-  EXPECT_EQ(emptyExpected, ShowLines(empty));
+  EXPECT_EQ(tc::ShortDump("PMT", EmptyHeaderLines(),
+                          {"# Body Information\n", "PCR_PID=[0x0000], Program Information Len=[0]\n",
+                           "Stream Information. Size=[0]\n"}),
+            ShowLines(empty));
 }
 
 TEST(PMTCapture, JapaneseChannelGivesEachProgramsStreamsToPlay) {
   Bytes contents;
   RAVEL_LOAD_CAPTURE_OR_SKIP("isdbt-japan-psi.sections", contents);
-  std::vector<Bytes> sections = captures::SplitSections(contents);
-  std::unique_ptr<RavelCPAT> pat;
-  std::vector<Bytes*> pmtSections;
-  for (Bytes& s : sections) {
-    if (s[0] == 0x00) pat.reset(new RavelCPAT(s.data()));
-    if (s[0] == 0x02) pmtSections.push_back(&s);
-  }
-  ASSERT_NE(nullptr, pat);
-  // The PAT lists the programs' PMT PIDs, the one-segment program last.
-  std::vector<TypeAndPid> programs;
-  for (int p = 0; p < pat->GetProgramCount(); ++p) {
-    programs.push_back(TypeAndPid(pat->GetPMTInfo(p)->GetProgramNumber(), pat->GetPMTInfo(p)->GetPID()));
-  }
-  EXPECT_EQ((std::vector<TypeAndPid>{{0x4800, 0x01F0}, {0x4801, 0x03F0}, {0xFFF0, 0x1CF0}, {0x4980, 0x1FC8}}), programs);
-  EXPECT_EQ(0x0010, pat->GetNetworkPID());
-  ASSERT_EQ(4u, pmtSections.size());
-  struct Expected {
-    unsigned short program, pcrPid, programInfoLength;
-    int streamCount;
-    std::vector<int> selection;
-    unsigned short captionCaPid;
-  } expected[] = {
-      {/*program=*/0x4800, /*pcrPid=*/0x01FF, /*programInfoLength=*/15, /*streamCount=*/11,
-       /*selection=*/{0x0100, 0x0110, 0, 0, 0x0130, 1}, /*captionCaPid=*/0x1FFF},
-      {0x4801, 0x01FF, 15, 11, {0x0100, 0x0110, 0, 0, 0x0130, 1}, 0x1FFF},
-      {0x4980, 0x05FF, 3, 7, {0x0581, 0x0583, 0, 0, 0x0587, 1}, 0},
-      {0xFFF0, 0x1FFF, 0, 12, {0, 0, 0, 0, 0, 0}, 0},
-  };
-  for (size_t i = 0; i < pmtSections.size(); ++i) {
-    SCOPED_TRACE(i);
-    const Expected& e = expected[i];
-    TraceRecorder recorder;
-    RavelCPMT pmt(pmtSections[i]->data());
-    EXPECT_EQ(e.program, pmt.iTableIdExtension);
-    EXPECT_EQ(e.pcrPid, pmt.GetPCRPID());
-    EXPECT_EQ(e.programInfoLength, pmt.GetProgramInfoLength());
-    EXPECT_EQ(e.streamCount, pmt.GetMapInfoCount());
-    EXPECT_EQ(e.selection, SelectionOf(pmt));
-    for (int s = 0; s < pmt.GetMapInfoCount(); ++s) {
-      RavelCMapInfo* info = pmt.GetMapInfo(s);
-      ASSERT_NE(nullptr, info->GetStreamIdentifier()) << s;
-      EXPECT_EQ(info->GetElementaryPID() & 0xFF, info->GetStreamIdentifier()->GetComponentTag()) << s;
-      if (e.selection[4] != 0 && info->GetElementaryPID() == e.selection[4]) {
-        EXPECT_EQ(e.captionCaPid, info->GetCAPID());
-      }
+  // Per program: program_number, PCR PID, program info length, stream count,
+  // the caption stream's CA PID, then the selection.
+  std::vector<std::vector<int> > programs;
+  for (Bytes& s : captures::SplitSections(contents)) {
+    if (s[0] == 0x00) {  // the PAT lists the PMT PIDs, the one-segment program last
+      RavelCPAT pat(s.data());
+      EXPECT_EQ((std::vector<int>{0x4800, 0x01F0, 0x4801, 0x03F0, 0xFFF0, 0x1CF0, 0x4980, 0x1FC8, 0x0010}),
+                (std::vector<int>{pat.GetPMTInfo(0)->GetProgramNumber(), pat.GetPMTInfo(0)->GetPID(),
+                                  pat.GetPMTInfo(1)->GetProgramNumber(), pat.GetPMTInfo(1)->GetPID(),
+                                  pat.GetPMTInfo(2)->GetProgramNumber(), pat.GetPMTInfo(2)->GetPID(),
+                                  pat.GetPMTInfo(3)->GetProgramNumber(), pat.GetPMTInfo(3)->GetPID(),
+                                  pat.GetNetworkPID()}));
     }
+    if (s[0] != 0x02) continue;
+    TraceRecorder recorder;
+    RavelCPMT pmt(s.data());
+    std::vector<int> seen{pmt.iTableIdExtension, pmt.GetPCRPID(), pmt.GetProgramInfoLength(), pmt.GetMapInfoCount(), 0};
+    const std::vector<int> selection = SelectionOf(pmt);
+    for (int i = 0; i < pmt.GetMapInfoCount(); ++i) {
+      RavelCMapInfo* info = pmt.GetMapInfo(i);
+      ASSERT_NE(nullptr, info->GetStreamIdentifier()) << i;
+      EXPECT_EQ(info->GetElementaryPID() & 0xFF, info->GetStreamIdentifier()->GetComponentTag()) << i;
+      if (selection[4] != 0 && info->GetElementaryPID() == selection[4]) seen[4] = info->GetCAPID();
+    }
+    seen.insert(seen.end(), selection.begin(), selection.end());
+    programs.push_back(seen);
     // Nothing of what the capture carries is malformed: only unknown tags and CA PIDs are traced.
     for (const TraceRecord& r : recorder.Records()) {
       EXPECT_TRUE(r.text.find("Unkown Descriptor Tag") != std::string::npos ||
@@ -498,4 +466,9 @@ TEST(PMTCapture, JapaneseChannelGivesEachProgramsStreamsToPlay) {
           << r.text;
     }
   }
+  EXPECT_EQ((std::vector<std::vector<int> >{{0x4800, 0x01FF, 15, 11, 0x1FFF, 0x0100, 0x0110, 0, 0, 0x0130, 1},
+                                             {0x4801, 0x01FF, 15, 11, 0x1FFF, 0x0100, 0x0110, 0, 0, 0x0130, 1},
+                                             {0x4980, 0x05FF, 3, 7, 0, 0x0581, 0x0583, 0, 0, 0x0587, 1},
+                                             {0xFFF0, 0x1FFF, 0, 12, 0, 0, 0, 0, 0, 0, 0}}),
+            programs);
 }
