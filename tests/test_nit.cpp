@@ -155,13 +155,10 @@ TEST(NITNetworkLoop, OnlyTagZeroFailsAndTheLastOfATagWins) {
       {"an unknown tag is traced and skipped",
        NitBody({Descriptor(0xC1, {0x01}), NetworkName("Rede")}, {kStreamA}), kRavelOk,
        {{kWarning, "NIT Body Parsing.. Unkown Descriptor Tag=[0xc1]\n"}}, "name=Rede linkage - sm -", 1},
-      {"two network names leave the second",
-       NitBody({NetworkName("first"), NetworkName("second")}, {kStreamA}), kRavelOk, {},
-       "name=second linkage - sm -", 1},
-      {"two linkages and two system managements leave the second of each",
-       NitBody({Linkage(1, 1, 10, 0), SystemManagement(1, 0), Linkage(1, 1, 20, 0), SystemManagement(2, 0)},
-               {kStreamA}),
-       kRavelOk, {}, "name - linkage=20 sm=2", 1},
+      {"two of each kind leave the second of each",
+       NitBody({NetworkName("first"), Linkage(1, 1, 10, 0), SystemManagement(1, 0), NetworkName("second"),
+                Linkage(1, 1, 20, 0), SystemManagement(2, 0)}, {kStreamA}),
+       kRavelOk, {}, "name=second linkage=20 sm=2", 1},
       {"the stream loop length follows a descriptor that runs past the network loop",
        Cat({Length12(2), NetworkName("abc"), Length12(static_cast<unsigned int>(kStreamA.size())), kStreamA}),
        kRavelOk, {}, "name=abc linkage - sm -", 1},
@@ -230,11 +227,9 @@ TEST(NITTransportStreamLoop, BoundedByItsOwnLengthAndFailedByAnyMalformedDescrip
 TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
   Bytes full = TsEntry(0x0001, 0x7FE1,
                        {ServiceList({{1, 1}}), TSInformation(1, "X"), TerrDelivery(1, 0, 0, {}), PartialReception({1})});
-  const std::string fullSummary = "tsid=0x0001 onid=0x7fe1 len=18 services=1 tsname=X freqs=0 partial=1";
   Bytes zeroLength = Cat({U16(0x0002), U16(0x0003), Length12(7), ServiceList({{1, 1}}), Descriptor(0x40, {})});
   // A descriptor running past the length is still read whole, and ends the loop.
   Bytes pastLength = Cat({U16(0x0002), U16(0x0003), Length12(3), ServiceList({{1, 1}}), Descriptor(0x00, {})});
-  Bytes lastByte = Cat({U16(0x0002), U16(0x0003), Length12(6), ServiceList({{1, 1}}), TSInformation(1, "X")});
   struct Case {
     const char* label;
     Bytes* entry;
@@ -243,20 +238,15 @@ TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
     std::string summary;
   } cases[] = {
       {"null clears the scalars", nullptr, kRavelErrInvalidArgument, {}, "tsid=0x0000 onid=0x0000 len=0"},
-      {"an entry without descriptors releases the earlier ones", const_cast<Bytes*>(&kStreamEmpty), kRavelOk, {},
-       kSummaryEmpty},
       {"length 0 after a good descriptor clears everything", &zeroLength, kRavelErrCorruptSection,
        {{kWarning, Invalid(0x40, 0)}}, "tsid=0x0000 onid=0x0000 len=0"},
       {"the loop ends when the bytes consumed reach the length", &pastLength, kRavelOk, {},
        "tsid=0x0002 onid=0x0003 len=3 services=1"},
-      {"a descriptor starting in the last declared byte is read", &lastByte, kRavelOk, {},
-       "tsid=0x0002 onid=0x0003 len=6 services=1 tsname=X"},
-      {"all four kinds", &full, kRavelOk, {}, fullSummary},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCTSInfo ts(full.data());
-    ASSERT_EQ(fullSummary, Summary(ts));
+    ASSERT_EQ("tsid=0x0001 onid=0x7fe1 len=18 services=1 tsname=X freqs=0 partial=1", Summary(ts));
     TraceRecorder recorder;
     EXPECT_EQ(c.result, ts.ParseRawData(c.entry ? c.entry->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
@@ -288,8 +278,6 @@ TEST(NITMerge, SameVersionTakesMissingNetworkDescriptorsAndAppendsStreams) {
        {kSummaryB, kSummaryEmpty}},
       {"a section without descriptors adds only its streams", &alpha, &bare, {}, "name=Alpha linkage - sm -",
        {kSummaryA, kSummaryB, kSummaryEmpty}},
-      {"the same section twice doubles its streams", &alpha, &alpha, {}, "name=Alpha linkage - sm -",
-       {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
       {"a table merged into itself doubles once", &alpha, nullptr, {}, "name=Alpha linkage - sm -",
        {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
   };
@@ -350,11 +338,6 @@ TEST(NITShow, DumpsHeaderNetworkDescriptorsAndStreamsInTheirOwnOrder) {
            "\t\tTerrDelSys: Frequency=[3176]\n",
            "\tTS Information : TransportStreamId=[0x0003], OrginalNetworkId=[0x7fe3]\n"}),
       ShowLines(nit));
-  // A table never parsed shows an unknown name and no streams.
-  RavelCNIT empty(nullptr);
-  EXPECT_EQ(tc::ShortDump("NIT", EmptyHeaderLines(),
-                          {"# Body Information. [Descriptors]\n", "Transport Stream Information. Size=[0]\n"}),
-            ShowLines(empty));
 }
 
 TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialReception) {
@@ -376,12 +359,9 @@ TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialRecepti
             Summary(*ts));
   unsigned short id = 0, type = 0;
   ts->pServiceList->GetServiceInfo(2, id, type);
-  RavelCTerrDeliverySystemDescriptor* delivery = ts->pTerrDeliverySystem;
-  RavelCTSInformationDescriptor* info = ts->pTSInformation;
-  EXPECT_EQ((std::vector<int>{0x4980, 0xC0, 0xAC6, 2, 2, 0x0D1A, 0x1356, 0x49, 2, 0x0F, 3, 0x4980}),
-            (std::vector<int>{id, type, delivery->GetAreaCode(), delivery->GetGuardInterval(),
-                              delivery->GetTransmissionMode(), delivery->GetFrequency(0), delivery->GetFrequency(24),
+  EXPECT_EQ((std::vector<int>{0x4980, 0xC0, 0xAC6, 0x1356, 0x49, 2, 3}),
+            (std::vector<int>{id, type, ts->pTerrDeliverySystem->GetAreaCode(), ts->pTerrDeliverySystem->GetFrequency(24),
                               ts->pPartialReception->GetServiceId(0),  // the high byte of service 0x4980
-                              info->GetTransmissionTypeCount(), info->GetTxType(0)->GetTransmissionTypeInfo(),
-                              info->GetTxType(0)->GetNumOfService(), info->GetTxType(1)->GetServiceId(0)}));
+                              ts->pTSInformation->GetTransmissionTypeCount(),
+                              ts->pTSInformation->GetTxType(0)->GetNumOfService()}));
 }

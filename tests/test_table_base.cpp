@@ -1,8 +1,6 @@
 // The common long section header of every table.
 #include <gtest/gtest.h>
 
-#include <cstring>
-#include <new>
 #include <string>
 #include <vector>
 
@@ -65,19 +63,6 @@ TEST(TableBaseHeader, NullClearsTheHeaderButNotTheName) {
   EXPECT_TRUE(recorder.Records().empty());
   EXPECT_EQ(1, table.SetTableName(RavelCString("SDT Other")));
   EXPECT_STREQ("SDT Other", table.sTableName.GetString());
-}
-
-// Built directly over a section, the base parses the header and clears only the
-// caller's tag, which the parse never writes.
-TEST(TableBaseHeader, ConstructedOverASectionStartsWithAClearedTag) {
-  unsigned char section[8] = {0x00, 0xB0, 0x05};
-  alignas(RavelCTableBase) unsigned char storage[sizeof(RavelCTableBase)];
-  std::memset(storage, 0xA5, sizeof(storage));
-  RavelCTableBase* table = new (storage) RavelCTableBase(section);
-  EXPECT_EQ(0, table->iSession);
-  EXPECT_EQ(5, table->iSectionLength);
-  EXPECT_TRUE(table->sTableName.IsEmpty());
-  table->~RavelCTableBase();
 }
 
 // An empty name shows as a table never named.
