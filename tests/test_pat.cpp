@@ -29,9 +29,11 @@ Bytes PatBody(const Programs& programs) {
   return body;
 }
 
-Bytes PatSection(const Programs& programs, uint16_t transportStreamId = 0x7ED0, uint8_t version = 1) {
+Bytes PatSection(const Programs& programs, uint16_t transportStreamId = 0x7ED0, uint8_t version = 1,
+                 uint8_t tableId = 0x00, bool corruptCrc = false) {
   sb::SectionOptions options;
-  options.tableId = 0x00;
+  options.tableId = tableId;
+  options.corruptCrc = corruptCrc;
   options.tableIdExtension = transportStreamId;
   options.version = version;
   options.privateIndicator = false;
@@ -56,20 +58,15 @@ TEST(PATProgramList, SortsByProgramNumberAndPutsTheFirstOneSegPMTLast) {
     Programs list;
     unsigned int networkPid;
   } cases[] = {
-      {"sorted by program number", {{3, 0x103}, {1, 0x101}, {2, 0x102}}, {{1, 0x101}, {2, 0x102}, {3, 0x103}}, 0xFFFF},
-      {"first one-seg PMT last, a later one sorted in", {{5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}, {2, 0x1FCA}},
-       {{2, 0x1FCA}, {3, 0x0101}, {5, 0x0100}, {1, 0x1FC8}},
-       0xFFFF},
+      {"by program number", {{3, 0x103}, {1, 0x101}, {2, 0x102}}, {{1, 0x101}, {2, 0x102}, {3, 0x103}}, 0xFFFF},
+      {"the first one-seg PMT last, a later one sorted in", {{5, 0x0100}, {1, 0x1FC8}, {3, 0x0101}, {2, 0x1FCA}},
+       {{2, 0x1FCA}, {3, 0x0101}, {5, 0x0100}, {1, 0x1FC8}}, 0xFFFF},
       {"the one-seg range ends at 0x1FCF", {{9, 0x1FC7}, {8, 0x1FD0}, {7, 0x1FCF}, {6, 0x0200}},
-       {{6, 0x0200}, {8, 0x1FD0}, {9, 0x1FC7}, {7, 0x1FCF}},
-       0xFFFF},
-      {"equal program numbers keep their arrival order",
-       {{4, 0x0100}, {2, 0x0200}, {4, 0x0101}, {4, 0x1FC9}, {4, 0x0102}},
-       {{2, 0x0200}, {4, 0x0100}, {4, 0x0101}, {4, 0x0102}, {4, 0x1FC9}},
-       0xFFFF},
+       {{6, 0x0200}, {8, 0x1FD0}, {9, 0x1FC7}, {7, 0x1FCF}}, 0xFFFF},
+      {"equal numbers keep their order", {{4, 0x0100}, {2, 0x0200}, {4, 0x0101}, {4, 0x1FC9}, {4, 0x0102}},
+       {{2, 0x0200}, {4, 0x0100}, {4, 0x0101}, {4, 0x0102}, {4, 0x1FC9}}, 0xFFFF},
       {"program 0 gives the network PID and no entry", {{0, 0x0010}, {0x4801, 0x03F0}, {0x4800, 0x01F0}},
-       {{0x4800, 0x01F0}, {0x4801, 0x03F0}},
-       0x0010},
+       {{0x4800, 0x01F0}, {0x4801, 0x03F0}}, 0x0010},
       {"only the network PID", {{0, 0x1FFF}}, {}, 0x1FFF},
       {"a lone one-seg PMT", {{0x4980, 0x1FC8}}, {{0x4980, 0x1FC8}}, 0xFFFF},
   };
@@ -88,14 +85,8 @@ TEST(PATProgramList, SortsByProgramNumberAndPutsTheFirstOneSegPMTLast) {
 
 TEST(PATParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes good = PatSection({{1, 0x101}});
-  auto section = [](uint8_t tableId, uint16_t tableIdExtension, bool corruptCrc) {
-    sb::SectionOptions o;
-    o.tableId = tableId;
-    o.tableIdExtension = tableIdExtension;
-    o.corruptCrc = corruptCrc;
-    return sb::LongSection(o, PatBody({{1, 0x101}}));
-  };
-  Bytes badCrc = section(0x00, 0x0001, true), pmtId = section(0x02, 0x4800, false), bothBad = section(0x02, 0x4800, true);
+  Bytes badCrc = PatSection({{1, 0x101}}, 0x0001, 0, 0x00, true), pmtId = PatSection({{1, 0x101}}, 0x4800, 0, 0x02);
+  Bytes bothBad = PatSection({{1, 0x101}}, 0x4800, 0, 0x02, true);
   ASSERT_EQ(1, RavelCPAT(good.data()).GetProgramCount());
   // The foreign table_id is printed in decimal.
   tc::ExpectRefusals<RavelCPAT>(good, tc::Refusals("PAT", badCrc, pmtId, "2", bothBad),

@@ -317,10 +317,8 @@ TEST(MapInfo, CopiesAreDeep) {
       {0x06, 0x0113, {CaDescriptor(0x0456), StreamId(0x30), DataComponent(0x0008), sb::Descriptor(0xC6, {1, 'Q'})}});
   Bytes other = StreamEntry({0x1B, 0x0111, {StreamId(0x00)}});
   RavelCMapInfo assigned(other.data());
-  tc::ExpectDeepCopies(new RavelCMapInfo(entry.data()), assigned, [](RavelCMapInfo& info) {
-    return Held(info) + " " + std::to_string(info.GetStreamType()) + " " + std::to_string(info.GetElementaryPID()) +
-           " " + std::to_string(info.GetESInfoLength());
-  });
+  tc::ExpectDeepCopies(new RavelCMapInfo(entry.data()), assigned,
+                       [](RavelCMapInfo& info) { return std::make_pair(Held(info), ShowLines(info)); });
   EXPECT_EQ("tag=48,dc=8,region=Q,ca=1110", Held(assigned));
   EXPECT_EQ(entry.size() - 5, assigned.GetESInfoLength());
   // A copy of an entry without descriptors drops the target's own.
@@ -354,12 +352,10 @@ TEST(PMTMerge, AppendsCopiesOfTheOthersStreamsOnlyWhenTheVersionsMatch) {
     RavelCPMT target(first.data());
     EXPECT_EQ(c.traces, tc::MergeInto(target, c.other ? c.other->data() : nullptr, StreamsOf));
     EXPECT_EQ(c.streams, StreamsOf(target));
-    // Header, name, PCR PID, program info and parental rating stay the target's.
-    EXPECT_EQ(0x4800, target.iTableIdExtension);
-    EXPECT_EQ(4, target.iVersionNumber);
-    EXPECT_EQ(0x0111, target.GetPCRPID());
-    EXPECT_EQ(6, target.GetProgramInfoLength());
-    EXPECT_EQ(10, RatingAge(target));
+    // Header, PCR PID, program info and parental rating stay the target's.
+    EXPECT_EQ((std::vector<int>{0x4800, 4, 0x0111, 6, 10}),
+              (std::vector<int>{target.iTableIdExtension, target.iVersionNumber, target.GetPCRPID(),
+                                target.GetProgramInfoLength(), RatingAge(target)}));
     if (c.other != &sameVersion) continue;
     // The selection also finds the appended streams.
     EXPECT_EQ((std::vector<int>{0x0111, 0x0112, 0x0114, 0, 0x0113, 2}), SelectionOf(target));
@@ -400,7 +396,6 @@ TEST(PMTShow, DumpsHeaderBodyAndEachStreamWithItsDescriptors) {
                               {0x0D, 0x1FC8, {}}},
                              {ParentalRating(2)}, 3, 0x4800, 0x0111);
   RavelCPMT pmt(section.data());
-  RavelCPMT empty(nullptr);
   // The rating is not dumped; each stream's descriptors in their own order.
   EXPECT_EQ(tc::ShortDump("PMT", HeaderLines(0x02, "PMT", 1, section.size() - 3, 0x4800, 3, 1, 0, 0),
                           {"# Body Information\n", "PCR_PID=[0x0111], Program Information Len=[6]\n",
@@ -416,11 +411,6 @@ TEST(PMTShow, DumpsHeaderBodyAndEachStreamWithItsDescriptors) {
                            "\t Region Spec Type: 1 \n", "\t Region Spec: AB \n",
                            "Stream Type Id=[0x0d], Stream PID=[0x1fc8], Stream Info Len=[0]\n"}),
             ShowLines(pmt));
-  // A table never parsed shows an unknown name and no streams.
-  EXPECT_EQ(tc::ShortDump("PMT", EmptyHeaderLines(),
-                          {"# Body Information\n", "PCR_PID=[0x0000], Program Information Len=[0]\n",
-                           "Stream Information. Size=[0]\n"}),
-            ShowLines(empty));
 }
 
 TEST(PMTCapture, JapaneseChannelGivesEachProgramsStreamsToPlay) {
@@ -451,11 +441,9 @@ TEST(PMTCapture, JapaneseChannelGivesEachProgramsStreamsToPlay) {
     }
     seen.insert(seen.end(), selection.begin(), selection.end());
     programs.push_back(seen);
-    // Nothing of what the capture carries is malformed: only unknown tags and CA PIDs are traced.
-    for (const TraceRecord& r : recorder.Records()) {
+    for (const TraceRecord& r : recorder.Records()) {  // only unknown tags and CA PIDs: nothing malformed
       EXPECT_TRUE(r.text.find("Unkown Descriptor Tag") != std::string::npos ||
-                  r.text.find("PMT MapInfo CA PID =[0x1fff]") == 0)
-          << r.text;
+                  r.text.find("PMT MapInfo CA PID =[0x1fff]") == 0) << r.text;
     }
   }
   EXPECT_EQ((std::vector<std::vector<int> >{{0x4800, 0x01FF, 15, 11, 0x1FFF, 0x0100, 0x0110, 0, 0, 0x0130, 1},

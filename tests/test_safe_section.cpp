@@ -58,16 +58,13 @@ Bytes DsiBody(unsigned int privateDataLength, const Bytes& privateData) {
 // Module records: moduleId 16 | moduleSize 32 | moduleVersion 8 | moduleInfoLength 8 | info.
 Bytes DiiBody(unsigned int numberOfModules, const std::vector<Bytes>& infos, unsigned int privateDataLength,
               const Bytes& privateData, unsigned int compatibilityLength = 0) {
-  Bytes body = sb::Cat({sb::U32(0x80000002u), sb::U16(4066), sb::U8(3), sb::U8(4), sb::U32(5), sb::U32(0xFFFFFFFFu)});
-  sb::Append(body, sb::U16(compatibilityLength));
-  sb::Append(body, sb::U16(numberOfModules));
+  Bytes body = sb::Cat({sb::U32(0x80000002u), sb::U16(4066), sb::U8(3), sb::U8(4), sb::U32(5), sb::U32(0xFFFFFFFFu),
+                        sb::U16(compatibilityLength), sb::U16(numberOfModules)});
   for (size_t i = 0; i < infos.size(); ++i) {
     sb::Append(body, sb::Cat({sb::U16(static_cast<unsigned int>(i + 1)), sb::U32(1000), sb::U8(1),
                               sb::U8(static_cast<unsigned int>(infos[i].size())), infos[i]}));
   }
-  sb::Append(body, sb::U16(privateDataLength));
-  sb::Append(body, privateData);
-  return body;
+  return sb::Cat({body, sb::U16(privateDataLength), privateData});
 }
 
 Bytes DdbBody(const Bytes& block) { return sb::Cat({sb::U16(7), sb::U8(1), sb::U8(0xFF), sb::U16(2), block}); }
@@ -388,20 +385,18 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
       {"AIT application loop past the section", AitSection(sb::Cat({sb::Length12(0), sb::Length12(90)})),
        kRavelSafeMalformed, "application loop runs past the section", 10},
       {"PMT stream descriptor loop past the streams",
-       Long(0x02, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
-                                     sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
+       Long(0x02, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111), sb::Length12(30),
+                           sb::Descriptor(0x52, sb::U8(1))})),
        kRavelSafeMalformed, "loop entry runs past its loop's end", 12},
       {"NIT transport stream loop over the CRC_32", Long(0x40, sb::Cat({sb::Length12(0), sb::Length12(4)})),
        kRavelSafeMalformed, "loop runs past its parent's end", 10},
-      {"stream descriptor past the section", Long(0x3D, Bytes{0x17, 0x0A, 1, 2}),
-       kRavelSafeMalformed, "descriptor runs past its loop's end", 8},
+      {"stream descriptor past the section", Long(0x3D, Bytes{0x17, 0x0A, 1, 2}), kRavelSafeMalformed,
+       "descriptor runs past its loop's end", 8},
       {"EIT schedule without a class is still walked",
-       Long(0x51, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51), sb::U16(1),
-                                             sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
-                                             sb::U16(0x8000 | 60)})),
+       Long(0x51, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51), sb::U16(1), sb::UtcTime(2013, 5, 10, 1, 0, 0),
+                           sb::U8(0), sb::U8(0), sb::U8(0), sb::U16(0x8000 | 60)})),
        kRavelSafeMalformed, "loop entry runs past its loop's end", 14},
-      {"EIT schedule without a class, well formed",
-       Long(0x51, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51)})),
+      {"EIT schedule without a class, well formed", Long(0x51, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51)})),
        kRavelSafeUnknownTable, "no class for this table_id", 0},
   };
   for (const Case& c : cases) {
