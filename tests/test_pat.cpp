@@ -90,11 +90,8 @@ TEST(PATParse, RefusesNullBadCrcAndForeignTableIds) {
   ASSERT_EQ(1, RavelCPAT(good.data()).GetProgramCount());
   // The foreign table_id is printed in decimal.
   tc::ExpectRefusals<RavelCPAT>(good, tc::Refusals("PAT", badCrc, pmtId, "2", bothBad),
-                                [&](RavelCPAT& pat, const tc::Refusal& r, TraceRecorder&) {
+                                [](RavelCPAT& pat, const tc::Refusal&, TraceRecorder&) {
                                   EXPECT_EQ(0, pat.GetProgramCount());
-                                  if (r.section == nullptr) return;  // the header is not looked at
-                                  EXPECT_EQ(r.section == &pmtId ? 0x02 : 0x00, pat.iTableId);
-                                  EXPECT_EQ(r.section == &pmtId ? 0x4800 : 0x7ED0, pat.iTableIdExtension);
                                 });
 }
 
