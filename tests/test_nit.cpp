@@ -46,11 +46,7 @@ Bytes TerrDelivery(unsigned int areaCode, uint8_t guard, uint8_t mode, const std
   for (unsigned int f : freqs) sb::Append(body, U16(f));
   return Descriptor(0xFA, body);
 }
-Bytes PartialReception(const std::vector<unsigned int>& serviceIds) {
-  Bytes body;
-  for (unsigned int id : serviceIds) sb::Append(body, U16(id));
-  return Descriptor(0xFB, body);
-}
+Bytes PartialReception(unsigned int serviceId) { return Descriptor(0xFB, U16(serviceId)); }
 // TS information without transmission type records.
 Bytes TSInformation(uint8_t key, const std::string& name) {
   return Descriptor(0xCD, Cat({U8(key), U8(static_cast<uint8_t>(name.size() << 2)), Text(name)}));
@@ -105,7 +101,7 @@ std::string NetworkSummary(RavelCNIT& nit) {
 }
 
 const Bytes kStreamA = TsEntry(0x0001, 0x7FE1, {ServiceList({{0xE760, 0x01}, {0xE761, 0xC0}}), TerrDelivery(0x591, 3, 2, {0x0C68})});
-const Bytes kStreamB = TsEntry(0x0002, 0x7FE2, {PartialReception({0xE761}), TSInformation(0x05, "Ch")});
+const Bytes kStreamB = TsEntry(0x0002, 0x7FE2, {PartialReception(0xE761), TSInformation(0x05, "Ch")});
 const Bytes kStreamEmpty = TsEntry(0x0003, 0x7FE3, {});
 const char kSummaryA[] = "tsid=0x0001 onid=0x7fe1 len=14 services=2 freqs=1";
 const char kSummaryB[] = "tsid=0x0002 onid=0x7fe2 len=10 tsname=Ch partial=1";
@@ -221,7 +217,7 @@ TEST(NITTransportStreamLoop, BoundedByItsOwnLengthAndFailedByAnyMalformedDescrip
 
 TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
   Bytes full = TsEntry(0x0001, 0x7FE1,
-                       {ServiceList({{1, 1}}), TSInformation(1, "X"), TerrDelivery(1, 0, 0, {}), PartialReception({1})});
+                       {ServiceList({{1, 1}}), TSInformation(1, "X"), TerrDelivery(1, 0, 0, {}), PartialReception(1)});
   Bytes zeroLength = Cat({U16(0x0002), U16(0x0003), Length12(7), ServiceList({{1, 1}}), Descriptor(0x40, {})});
   // A descriptor running past the length is still read whole, and ends the loop.
   Bytes pastLength = Cat({U16(0x0002), U16(0x0003), Length12(3), ServiceList({{1, 1}}), Descriptor(0x00, {})});
@@ -310,7 +306,7 @@ TEST(NITCopy, CopiesHeaderNameDescriptorsAndEveryStreamDeeply) {
 TEST(NITShow, DumpsHeaderNetworkDescriptorsAndStreamsInTheirOwnOrder) {
   Bytes section = NitSection(NitBody({SystemManagement(0x03, 0x01), NetworkName("Rede"), Linkage(1, 2, 3, 4)},
                                      {TsEntry(0x0001, 0x7FE1, {TerrDelivery(0x591, 3, 2, {0x0C68}),
-                                                               PartialReception({0xE761}), TSInformation(0x05, "Ch"),
+                                                               PartialReception(0xE761), TSInformation(0x05, "Ch"),
                                                                ServiceList({{0xE760, 0x01}})}),
                                       kStreamEmpty}));
   RavelCNIT nit(section.data());

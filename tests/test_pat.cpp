@@ -126,8 +126,6 @@ TEST(PATParse, ReparseReplacesTheListButKeepsAnEarlierNetworkPid) {
   EXPECT_EQ(kRavelOk, pat.ParseRawData(second.data()));
   EXPECT_EQ((Programs{{6, 0x0600}, {7, 0x0700}}), ListOf(pat));
   EXPECT_EQ(0x0010, pat.GetNetworkPID());
-  EXPECT_EQ(0x1234, pat.iTableIdExtension);
-  EXPECT_EQ(2, pat.iVersionNumber);
   EXPECT_EQ(kRavelOk, pat.ParseRawData(third.data()));
   EXPECT_EQ(0, pat.GetProgramCount());
   EXPECT_EQ(0x0020, pat.GetNetworkPID());

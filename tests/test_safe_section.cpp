@@ -70,9 +70,8 @@ Bytes DiiBody(unsigned int numberOfModules, const std::vector<Bytes>& infos, uns
 Bytes DdbBody(const Bytes& block) { return sb::Cat({sb::U16(7), sb::U8(1), sb::U8(0xFF), sb::U16(2), block}); }
 
 Bytes GoodDii() {
-  Bytes name = sb::Descriptor(0x02, sb::Text("index.bml"));
-  Bytes type = sb::Descriptor(0x01, sb::Text("text/xml"));
-  return Message(0x1002, DiiBody(2, {sb::Cat({type, name}), {}}, 0, {}));
+  Bytes descriptors = sb::Cat({sb::Descriptor(0x01, sb::Text("text/xml")), sb::Descriptor(0x02, sb::Text("index.bml"))});
+  return Message(0x1002, DiiBody(2, {descriptors, {}}, 0, {}));
 }
 
 // A carousel section around a message: table_id 0x3B or 0x3C, then the CRC_32.
@@ -86,29 +85,23 @@ Bytes StreamEvents() {
 // The good sections the checks are tried on: built ones, and the real ones when
 // the shared captures are there.
 std::vector<Bytes> Fixtures() {
-  std::vector<Bytes> fixtures = {Pat({{0, 0x10}, {3, 0x103}, {1, 0x1FC8}}),
-                                 cb::AitSection("Jogo", "/app", "main.ncl"),
-                                 StreamEvents(),
-                                 Carousel(0x3B, Message(0x1006, DsiBody(3, {1, 2, 3}))),
-                                 Carousel(0x3B, GoodDii()),
-                                 Carousel(0x3C, Message(0x1003, DdbBody({9, 8, 7, 6})))};
+  std::vector<Bytes> fixtures = {Pat({{0, 0x10}, {3, 0x103}, {1, 0x1FC8}}), cb::AitSection("Jogo", "/app", "main.ncl"),
+                                 StreamEvents(), Carousel(0x3B, Message(0x1006, DsiBody(3, {1, 2, 3}))),
+                                 Carousel(0x3B, GoodDii()), Carousel(0x3C, Message(0x1003, DdbBody({9, 8, 7, 6})))};
   for (const char* name : {"isdbt-japan-psi.sections", "isdb-signalling-mix.sections"}) {
     Bytes contents;
     if (!captures::Load(name, contents)) continue;
     for (const Bytes& section : captures::SplitSections(contents)) fixtures.push_back(section);
   }
-  // The stream descriptor, carousel and AIT PIDs of the captures.
-  struct Carried {
-    const char* file;
-    unsigned int pid;
-  } carried[] = {{"stream-events-1.ts", 0x0194}, {"stream-events-2.ts", 0x0FA2}, {"object-carousel.ts", 0x076A},
-                     {"ait.ts", 0x1EC5}};
-  for (const Carried& c : carried) {
+  // The stream descriptor, carousel and AIT PIDs of the captures; the first few
+  // sections of each table hold every kind of message.
+  const std::vector<std::pair<const char*, unsigned int> > carried = {
+      {"stream-events-1.ts", 0x0194}, {"stream-events-2.ts", 0x0FA2}, {"object-carousel.ts", 0x076A}, {"ait.ts", 0x1EC5}};
+  for (const auto& c : carried) {
     Bytes stream;
-    if (!captures::Load(c.file, stream)) continue;
-    // The first few of each table: enough to hold every kind of message.
+    if (!captures::Load(c.first, stream)) continue;
     std::map<unsigned char, int> taken;
-    for (const Bytes& section : captures::SectionsOfPid(stream, c.pid)) {
+    for (const Bytes& section : captures::SectionsOfPid(stream, c.second)) {
       if (taken[section[0]]++ < 3) fixtures.push_back(section);
     }
   }
@@ -281,7 +274,6 @@ TEST(SafeSection, ChecksEveryPartOfADsmccMessageBeforeItsParse) {
     int parseResult;
   } cases[] = {
       {"DSI", Message(0x1006, DsiBody(3, {1, 2, 3})), kRavelSafeOk, 0},
-      {"DSI after 4 adaptation bytes", Message(0x1006, DsiBody(0, {}), 4), kRavelSafeOk, 0},
       {"DSI private data past the end", Message(0x1006, DsiBody(4, {1, 2, 3})), kRavelSafeOutsideMessage, 0},
       {"DSI without room for its server id", Message(0x1006, Bytes(20, 0x00)), kRavelSafeOutsideMessage, 0},
       {"DII", dii, kRavelSafeOk, 0},
@@ -292,7 +284,6 @@ TEST(SafeSection, ChecksEveryPartOfADsmccMessageBeforeItsParse) {
        kRavelSafeOutsideMessage, 0},
       {"DII cut in its download parameters", Message(0x1002, Bytes(17, 0x00)), kRavelSafeOutsideMessage, 0},
       {"DDB", Message(0x1003, DdbBody({1, 2, 3})), kRavelSafeOk, 0},
-      {"DDB of an empty block", Message(0x1003, DdbBody({})), kRavelSafeOk, 0},
       {"DDB whose messageLength misses the block header", Message(0x1003, DdbBody({}), 0, 5),
        kRavelSafeOutsideMessage, 0},
       {"DDB adaptation longer than the message", WithByte(Message(0x1003, DdbBody({})), 9, 200),
@@ -327,9 +318,9 @@ TEST(SafeSection, RefusesEveryTruncatedMessageAndAMessageRunningIntoTheCrc) {
       std::unique_ptr<unsigned char[]> bytes = Exactly(message, count);
       RavelCSafeSection safe;
       TraceRecorder recorder;
-      RavelSafeResult expected = count < 12 ? kRavelSafeTooShort : kRavelSafeLengthMismatch;
-      ASSERT_EQ(expected, safe.ParseMessage(bytes.get(), static_cast<int>(count))) << count;
       RavelCDsmccDDB ddb(nullptr);
+      const RavelSafeResult expected = count < 12 ? kRavelSafeTooShort : kRavelSafeLengthMismatch;
+      ASSERT_EQ(expected, safe.ParseMessage(bytes.get(), static_cast<int>(count))) << count;
       ASSERT_EQ(expected, safe.ParseMessageInto(bytes.get(), static_cast<int>(count), ddb)) << count;
       EXPECT_TRUE(recorder.Records().empty()) << count;
     }
@@ -433,12 +424,11 @@ TEST(SafeSection, KeepsOneBufferOfTheSectionsSizeAndHandsTheTableOver) {
 
 TEST(SafeSection, TellsEachDescriptorInTheOrderTheParseReadsThem) {
   typedef std::array<int, 3> Told;  // offset, tag, length
-  auto stream = [](unsigned int pid, const std::vector<Bytes>& descriptors) {
-    return sb::Cat({sb::U8(0x1B), sb::U16(0xE000 | pid), sb::DescriptorLoop(descriptors)});
-  };
+  // Program info, then two streams of one descriptor each.
   const Bytes twoStreams = Long(0x02, sb::Cat({sb::U16(0xE100), sb::DescriptorLoop({sb::Descriptor(0x09, {1, 2})}),
-                                               stream(0x111, {sb::Descriptor(0x52, {7})}),
-                                               stream(0x112, {sb::Descriptor(0xFD, {1, 2, 3})})}));
+                                               sb::U8(0x1B), sb::U16(0xE111), sb::DescriptorLoop({sb::Descriptor(0x52, {7})}),
+                                               sb::U8(0x1B), sb::U16(0xE112),
+                                               sb::DescriptorLoop({sb::Descriptor(0xFD, {1, 2, 3})})}));
   // Program-info loop of 6 bytes whose second descriptor says 5.
   const Bytes overrun = Long(0x02, sb::Cat({sb::U16(0xE100), sb::Length12(6), sb::Descriptor(0x09, {1, 2}), Bytes{0x0A, 5}}));
   struct Case {

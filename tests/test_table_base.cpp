@@ -23,15 +23,12 @@ std::vector<unsigned int> HeaderOf(const RavelCTableBase& table) {
 // One wire bit at a time: each lands in exactly one member, at the weight of its
 // place in that field, and the skipped bits land nowhere.
 TEST(TableBaseHeader, EveryWireBitLandsInItsOwnField) {
-  struct Field {
-    int member;  // index in HeaderOf, -1 for skipped bits
-    int width;
-  };
-  // Wire order, most significant bit first.
-  const Field layout[] = {{1, 8}, {2, 1}, {-1, 3}, {3, 12}, {4, 16}, {-1, 2}, {5, 5}, {6, 1}, {7, 8}, {8, 8}};
+  // In wire order, most significant bit first: the member's index in HeaderOf
+  // (-1 for skipped bits) and the field's width.
+  const std::pair<int, int> layout[] = {{1, 8}, {2, 1}, {-1, 3}, {3, 12}, {4, 16}, {-1, 2}, {5, 5}, {6, 1}, {7, 8}, {8, 8}};
   int bit = 0;
-  for (const Field& field : layout) {
-    for (int place = field.width - 1; place >= 0; --place, ++bit) {
+  for (const auto& field : layout) {
+    for (int place = field.second - 1; place >= 0; --place, ++bit) {
       SCOPED_TRACE("wire bit " + std::to_string(bit));
       // section_length 5: the 8 header bytes are the whole section.
       unsigned char section[8] = {0x00, 0x00, 0x05};
@@ -41,7 +38,7 @@ TEST(TableBaseHeader, EveryWireBitLandsInItsOwnField) {
       EXPECT_EQ(kRavelOk, table.ParseRawData(section));
       std::vector<unsigned int> expected(9, 0);
       expected[3] = 5;
-      if (field.member >= 0) expected[field.member] ^= 1u << place;
+      if (field.first >= 0) expected[field.first] ^= 1u << place;
       EXPECT_EQ(expected, HeaderOf(table));
       EXPECT_TRUE(recorder.Records().empty());
     }

@@ -82,8 +82,7 @@ TraceLines MergeInto(Table& target, unsigned char* other, Describe describe) {
   std::unique_ptr<Table> source(new Table(other));
   const auto before = describe(*source);
   TraceRecorder recorder;
-  Table& result = other ? (target += *source) : (target += target);
-  EXPECT_EQ(&target, &result);
+  EXPECT_EQ(&target, other ? &(target += *source) : &(target += target));
   EXPECT_EQ(before, describe(*source));
   return recorder.Lines();
 }
