@@ -117,7 +117,8 @@ TEST(AitParse, ReportsEachDescriptorTagAsItsTableSays) {
     // A body that every class could read as text: nothing of it may reach the record.
     Bytes descriptor = sb::Descriptor(c.tag, sb::Cat({sb::U8(3), sb::Text("abc"), sb::U8(2), sb::Text("de"), sb::Text("fg")}));
     RavelCAIT ait;
-    EXPECT_EQ((TraceLines{{kInfo, kProcess}, {c.name ? kInfo : kDump, "Detected an " + std::string(c.name ? c.name : "Invalid Descriptor")}}),
+    EXPECT_EQ((TraceLines{{kInfo, kProcess},
+                          {c.name ? kInfo : kDump, "Detected an " + std::string(c.name ? c.name : "Invalid Descriptor")}}),
               Parsed(ait, Ait(AitBody({App(1, 2, 1, 0xC, {descriptor})}))));
     EXPECT_EQ("", At(ait, 0).szAppName + std::string(At(ait, 0).szAppFilePath) + At(ait, 0).szAppFileName);
   }
