@@ -3,7 +3,6 @@
 
 #include <algorithm>
 #include <cstdio>
-#include <memory>
 #include <string>
 #include <utility>
 #include <vector>
@@ -47,11 +46,7 @@ Bytes TerrDelivery(unsigned int areaCode, uint8_t guard, uint8_t mode, const std
   for (unsigned int f : freqs) sb::Append(body, U16(f));
   return Descriptor(0xFA, body);
 }
-Bytes PartialReception(const std::vector<unsigned int>& serviceIds) {
-  Bytes body;
-  for (unsigned int id : serviceIds) sb::Append(body, U16(id));
-  return Descriptor(0xFB, body);
-}
+Bytes PartialReception(unsigned int serviceId) { return Descriptor(0xFB, U16(serviceId)); }
 // TS information without transmission type records.
 Bytes TSInformation(uint8_t key, const std::string& name) {
   return Descriptor(0xCD, Cat({U8(key), U8(static_cast<uint8_t>(name.size() << 2)), Text(name)}));
@@ -66,8 +61,10 @@ Bytes NitBody(const std::vector<Bytes>& networkDescriptors, const std::vector<By
   return Cat({sb::DescriptorLoop(networkDescriptors), Length12(static_cast<unsigned int>(streams.size())), streams});
 }
 
-Bytes NitSection(const Bytes& body, uint8_t tableId = 0x40, uint8_t version = 1, uint8_t sectionNumber = 0) {
+Bytes NitSection(const Bytes& body, uint8_t tableId = 0x40, uint8_t version = 1, uint8_t sectionNumber = 0,
+                 bool corruptCrc = false) {
   sb::SectionOptions options;
+  options.corruptCrc = corruptCrc;
   options.tableId = tableId;
   options.tableIdExtension = 0x7FE1;  // network_id
   options.version = version;
@@ -104,7 +101,7 @@ std::string NetworkSummary(RavelCNIT& nit) {
 }
 
 const Bytes kStreamA = TsEntry(0x0001, 0x7FE1, {ServiceList({{0xE760, 0x01}, {0xE761, 0xC0}}), TerrDelivery(0x591, 3, 2, {0x0C68})});
-const Bytes kStreamB = TsEntry(0x0002, 0x7FE2, {PartialReception({0xE761}), TSInformation(0x05, "Ch")});
+const Bytes kStreamB = TsEntry(0x0002, 0x7FE2, {PartialReception(0xE761), TSInformation(0x05, "Ch")});
 const Bytes kStreamEmpty = TsEntry(0x0003, 0x7FE3, {});
 const char kSummaryA[] = "tsid=0x0001 onid=0x7fe1 len=14 services=2 freqs=1";
 const char kSummaryB[] = "tsid=0x0002 onid=0x7fe2 len=10 tsname=Ch partial=1";
@@ -113,26 +110,18 @@ const char kSummaryEmpty[] = "tsid=0x0003 onid=0x7fe3 len=0";
 }  // namespace
 
 TEST(NITParse, RefusesNullBadCrcAndForeignTableIds) {
-  Bytes good = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}));
-  sb::SectionOptions bad;
-  bad.tableId = 0x40;
-  bad.corruptCrc = true;
-  Bytes badCrc = sb::LongSection(bad, NitBody({NetworkName("Rede")}, {kStreamA}));
-  Bytes sdtId = NitSection(NitBody({NetworkName("Rede")}, {kStreamA}), 0x42);
-  bad.tableId = 0x46;
-  Bytes bothBad = sb::LongSection(bad, NitBody({}, {}));
+  const Bytes body = NitBody({NetworkName("Rede")}, {kStreamA});
+  Bytes good = NitSection(body), badCrc = NitSection(body, 0x40, 1, 0, true), sdtId = NitSection(body, 0x42);
+  Bytes bothBad = NitSection(NitBody({}, {}), 0x46, 1, 0, true);
   ASSERT_EQ(1, RavelCNIT(good.data()).GetTSInfoCount());
   tc::ExpectRefusals<RavelCNIT>(good, tc::Refusals("NIT", badCrc, sdtId, "0x42", bothBad),
-                                [](RavelCNIT& nit, const tc::Refusal& r, TraceRecorder& recorder) {
+                                [](RavelCNIT& nit, const tc::Refusal&, TraceRecorder& recorder) {
                                   for (const TraceRecord& t : recorder.Records()) {
                                     EXPECT_EQ("SectionParser/source/Ravel_CTableNIT", t.file);
                                   }
                                   EXPECT_EQ("name - linkage - sm -", NetworkSummary(nit));
                                   EXPECT_EQ(0, nit.GetTSInfoCount());
                                   EXPECT_STREQ("NIT Actual", nit.sTableName.GetString());  // of the last good parse
-                                  if (r.section != nullptr && r.result == kRavelErrInvalidArgument) {
-                                    EXPECT_EQ((*r.section)[0], nit.iTableId);  // the header was read
-                                  }
                                 });
 }
 
@@ -159,13 +148,10 @@ TEST(NITNetworkLoop, OnlyTagZeroFailsAndTheLastOfATagWins) {
       {"an unknown tag is traced and skipped",
        NitBody({Descriptor(0xC1, {0x01}), NetworkName("Rede")}, {kStreamA}), kRavelOk,
        {{kWarning, "NIT Body Parsing.. Unkown Descriptor Tag=[0xc1]\n"}}, "name=Rede linkage - sm -", 1},
-      {"two network names leave the second",
-       NitBody({NetworkName("first"), NetworkName("second")}, {kStreamA}), kRavelOk, {},
-       "name=second linkage - sm -", 1},
-      {"two linkages and two system managements leave the second of each",
-       NitBody({Linkage(1, 1, 10, 0), SystemManagement(1, 0), Linkage(1, 1, 20, 0), SystemManagement(2, 0)},
-               {kStreamA}),
-       kRavelOk, {}, "name - linkage=20 sm=2", 1},
+      {"two of each kind leave the second of each",
+       NitBody({NetworkName("first"), Linkage(1, 1, 10, 0), SystemManagement(1, 0), NetworkName("second"),
+                Linkage(1, 1, 20, 0), SystemManagement(2, 0)}, {kStreamA}),
+       kRavelOk, {}, "name=second linkage=20 sm=2", 1},
       {"the stream loop length follows a descriptor that runs past the network loop",
        Cat({Length12(2), NetworkName("abc"), Length12(static_cast<unsigned int>(kStreamA.size())), kStreamA}),
        kRavelOk, {}, "name=abc linkage - sm -", 1},
@@ -206,13 +192,11 @@ TEST(NITTransportStreamLoop, BoundedByItsOwnLengthAndFailedByAnyMalformedDescrip
        kRavelOk, {}, {kSummaryA}, true},
       {"an entry without descriptors takes 6 bytes", NitBody({NetworkName("N")}, {kStreamEmpty, kStreamA}),
        kRavelOk, {}, {kSummaryEmpty, kSummaryA}, true},
-      {"an unknown tag in an entry is traced and the walk goes on",
-       NitBody({NetworkName("N")}, {TsEntry(0x0004, 0x7FE4, {Descriptor(0xC0, {0x01}), ServiceList({{5, 1}})})}),
+      {"an unknown tag in an entry is traced and skipped; of two service lists the second stays",
+       NitBody({NetworkName("N")}, {TsEntry(0x0004, 0x7FE4, {Descriptor(0xC0, {0x01}), ServiceList({{5, 1}}),
+                                                             ServiceList({{6, 1}, {7, 1}})})}),
        kRavelOk, {{kWarning, "NIT TSInfo Parsing.. Unkown Descriptor Tag=[0xc0]\n"}},
-       {"tsid=0x0004 onid=0x7fe4 len=8 services=1"}, true},
-      {"two service lists leave the second",
-       NitBody({NetworkName("N")}, {TsEntry(0x0004, 0x7FE4, {ServiceList({{5, 1}}), ServiceList({{6, 1}, {7, 1}})})}),
-       kRavelOk, {}, {"tsid=0x0004 onid=0x7fe4 len=13 services=2"}, true},
+       {"tsid=0x0004 onid=0x7fe4 len=16 services=2"}, true},
       {"tag 0 in an entry fails the whole section", NitBody({NetworkName("N")}, {kStreamA, badTag}),
        kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}, {kWarning, kInfoFail}}, {}, false},
       {"length 0 in an entry fails the whole section, unlike in the network loop",
@@ -233,12 +217,10 @@ TEST(NITTransportStreamLoop, BoundedByItsOwnLengthAndFailedByAnyMalformedDescrip
 
 TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
   Bytes full = TsEntry(0x0001, 0x7FE1,
-                       {ServiceList({{1, 1}}), TSInformation(1, "X"), TerrDelivery(1, 0, 0, {}), PartialReception({1})});
-  const std::string fullSummary = "tsid=0x0001 onid=0x7fe1 len=18 services=1 tsname=X freqs=0 partial=1";
+                       {ServiceList({{1, 1}}), TSInformation(1, "X"), TerrDelivery(1, 0, 0, {}), PartialReception(1)});
   Bytes zeroLength = Cat({U16(0x0002), U16(0x0003), Length12(7), ServiceList({{1, 1}}), Descriptor(0x40, {})});
   // A descriptor running past the length is still read whole, and ends the loop.
   Bytes pastLength = Cat({U16(0x0002), U16(0x0003), Length12(3), ServiceList({{1, 1}}), Descriptor(0x00, {})});
-  Bytes lastByte = Cat({U16(0x0002), U16(0x0003), Length12(6), ServiceList({{1, 1}}), TSInformation(1, "X")});
   struct Case {
     const char* label;
     Bytes* entry;
@@ -247,20 +229,15 @@ TEST(NITTransportStreamLoop, EntryParseClearsOnFailureAndReleasesOnReparse) {
     std::string summary;
   } cases[] = {
       {"null clears the scalars", nullptr, kRavelErrInvalidArgument, {}, "tsid=0x0000 onid=0x0000 len=0"},
-      {"an entry without descriptors releases the earlier ones", const_cast<Bytes*>(&kStreamEmpty), kRavelOk, {},
-       kSummaryEmpty},
       {"length 0 after a good descriptor clears everything", &zeroLength, kRavelErrCorruptSection,
        {{kWarning, Invalid(0x40, 0)}}, "tsid=0x0000 onid=0x0000 len=0"},
       {"the loop ends when the bytes consumed reach the length", &pastLength, kRavelOk, {},
        "tsid=0x0002 onid=0x0003 len=3 services=1"},
-      {"a descriptor starting in the last declared byte is read", &lastByte, kRavelOk, {},
-       "tsid=0x0002 onid=0x0003 len=6 services=1 tsname=X"},
-      {"all four kinds", &full, kRavelOk, {}, fullSummary},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCTSInfo ts(full.data());
-    ASSERT_EQ(fullSummary, Summary(ts));
+    ASSERT_EQ("tsid=0x0001 onid=0x7fe1 len=18 services=1 tsname=X freqs=0 partial=1", Summary(ts));
     TraceRecorder recorder;
     EXPECT_EQ(c.result, ts.ParseRawData(c.entry ? c.entry->data() : nullptr));
     EXPECT_EQ(c.traces, recorder.Lines());
@@ -292,24 +269,14 @@ TEST(NITMerge, SameVersionTakesMissingNetworkDescriptorsAndAppendsStreams) {
        {kSummaryB, kSummaryEmpty}},
       {"a section without descriptors adds only its streams", &alpha, &bare, {}, "name=Alpha linkage - sm -",
        {kSummaryA, kSummaryB, kSummaryEmpty}},
-      {"the same section twice doubles its streams", &alpha, &alpha, {}, "name=Alpha linkage - sm -",
-       {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
       {"a table merged into itself doubles once", &alpha, nullptr, {}, "name=Alpha linkage - sm -",
        {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCNIT target(c.target->data());
-    std::unique_ptr<RavelCNIT> other(new RavelCNIT((c.other ? c.other : c.target)->data()));
-    const std::string otherNetwork = NetworkSummary(*other);
-    const std::vector<std::string> otherStreams = Streams(*other);
-    TraceRecorder recorder;
-    RavelCNIT& result = c.other ? (target += *other) : (target += target);
-    EXPECT_EQ(&target, &result);
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(otherNetwork, NetworkSummary(*other));
-    EXPECT_EQ(otherStreams, Streams(*other));
-    other.reset();  // the merged parts are copies
+    EXPECT_EQ(c.traces, tc::MergeInto(target, c.other ? c.other->data() : nullptr,
+                                      [](RavelCNIT& nit) { return std::make_pair(NetworkSummary(nit), Streams(nit)); }));
     EXPECT_EQ(c.network, NetworkSummary(target));
     EXPECT_EQ(c.streams, Streams(target));
     EXPECT_EQ((*c.target)[6], target.iSectionNumber);
@@ -321,65 +288,47 @@ TEST(NITCopy, CopiesHeaderNameDescriptorsAndEveryStreamDeeply) {
   Bytes section = NitSection(
       NitBody({NetworkName("Rede"), Linkage(1, 2, 3, 4), SystemManagement(3, 1)}, {kStreamA, kStreamB}), 0x41, 9, 1);
   Bytes other = NitSection(NitBody({NetworkName("Old")}, {kStreamEmpty}));
-  std::unique_ptr<RavelCNIT> source(new RavelCNIT(section.data()));
+  RavelCNIT* source = new RavelCNIT(section.data());
   source->iSession = 0x3C;
   const std::string network = NetworkSummary(*source);
-  const TraceLines shown = ShowLines(*source);
-  RavelCNIT constructed(*source);
   RavelCNIT assigned(other.data());
-  assigned = *source;
-  source.reset();
-  for (RavelCNIT* copy : {&constructed, &assigned}) EXPECT_EQ(shown, ShowLines(*copy));
+  tc::ExpectDeepCopies(source, assigned, ShowLines<RavelCNIT>);
   EXPECT_STREQ("NIT Other", assigned.sTableName.GetString());
   // The streams are released before the copy: a table assigned to itself keeps
   // its network descriptors and loses its streams.
-  assigned = assigned;
+  tc::SelfAssign(assigned);
   EXPECT_EQ(network, NetworkSummary(assigned));
   EXPECT_EQ(0, assigned.GetTSInfoCount());
-
-  RavelCTSInfo ts(const_cast<uint8_t*>(kStreamA.data()));
-  RavelCTSInfo tsCopy(ts);
   RavelCTSInfo tsAssigned(const_cast<uint8_t*>(kStreamB.data()));
-  tsAssigned = ts;
-  ts.ParseRawData(nullptr);
-  EXPECT_EQ(kSummaryA, Summary(tsCopy));
-  EXPECT_EQ(kSummaryA, Summary(tsAssigned));
+  tc::ExpectDeepCopies(new RavelCTSInfo(const_cast<uint8_t*>(kStreamA.data())), tsAssigned, Summary);
 }
 
 TEST(NITShow, DumpsHeaderNetworkDescriptorsAndStreamsInTheirOwnOrder) {
-  const std::string rule = Rule(kShortRule);
   Bytes section = NitSection(NitBody({SystemManagement(0x03, 0x01), NetworkName("Rede"), Linkage(1, 2, 3, 4)},
                                      {TsEntry(0x0001, 0x7FE1, {TerrDelivery(0x591, 3, 2, {0x0C68}),
-                                                               PartialReception({0xE761}), TSInformation(0x05, "Ch"),
+                                                               PartialReception(0xE761), TSInformation(0x05, "Ch"),
                                                                ServiceList({{0xE760, 0x01}})}),
                                       kStreamEmpty}));
   RavelCNIT nit(section.data());
-  TraceLines expected = Dump({rule, "#### NIT Table Information\n", "# Header Information\n"});
-  Add(expected, HeaderLines(0x40, "NIT Actual", 1, 65, 0x7FE1, 1, 1, 0, 1));
-  Add(expected, Dump({"# Body Information. [Descriptors]\n", Banner("Linkage Descriptor"), BaseLine(0x4A, 7, "Linkage Descriptor"),
-                      "\tTransportStreamId=[0x0001], OrginalNetworkId=[0x0002], ServiceId=[0x0003], LinkageType=[0x04]\n",
-                      Banner("Network Descriptor"), BaseLine(0x40, 4, "Network Name Descriptor"), "\tNetwork Name=[Rede]\n",
-                      Banner("System Management Descriptor"), BaseLine(0xFE, 2, "System Management Descriptor"),
-                      "\tBroadcasting Flag=[0x03], Broadcasting Id=[0x03], Additional Ids=[0x01]\n",
-                      "Transport Stream Information. Size=[2]\n",
-                      "\tTS Information : TransportStreamId=[0x0001], OrginalNetworkId=[0x7fe1]\n",
-                      Banner("Service List Descriptor"), BaseLine(0x41, 3, "Service List Descriptor"),
-                      "\tService List Length=[1]\n", "\t\t[0]th Service Info: Service ID=[0xe760], Service Type=[0x01]\n",
-                      Banner("TS Information Descriptor"), BaseLine(0xCD, 4, "TS Information Descriptor"),
-                      "\tRemote Control Key Id=[0x05], Ts Name=[Ch], Tx Type Count=[0]\n",
-                      Banner("Partial Reception Descriptor", 21), BaseLine(0xFB, 2, "Partial Reception Descriptor"),
-                      "\tService Id [0] = 231\n", Banner("Terrestrial Delivery Descriptor"),
-                      BaseLine(0xFA, 4, "Terrestrial Delivery System Descriptor"),
-                      "\tArea Code=[0x0591], Guard Interval=[0x03], Tx Mode=[0x02], Num Of Freq=[1]\n",
-                      "\t\tTerrDelSys: Frequency=[3176]\n",
-                      "\tTS Information : TransportStreamId=[0x0003], OrginalNetworkId=[0x7fe3]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(nit));
-  // A table never parsed shows an unknown name and no streams.
-  RavelCNIT empty(nullptr);
-  expected = Dump({rule, "#### NIT Table Information\n", "# Header Information\n"});
-  Add(expected, EmptyHeaderLines());
-  Add(expected, Dump({"# Body Information. [Descriptors]\n", "Transport Stream Information. Size=[0]\n", rule}));
-  EXPECT_EQ(expected, ShowLines(empty));
+  EXPECT_EQ(tc::ShortDump("NIT", HeaderLines(0x40, "NIT Actual", 1, 65, 0x7FE1, 1, 1, 0, 1),
+          {"# Body Information. [Descriptors]\n", Banner("Linkage Descriptor"), BaseLine(0x4A, 7, "Linkage Descriptor"),
+           "\tTransportStreamId=[0x0001], OrginalNetworkId=[0x0002], ServiceId=[0x0003], LinkageType=[0x04]\n",
+           Banner("Network Descriptor"), BaseLine(0x40, 4, "Network Name Descriptor"), "\tNetwork Name=[Rede]\n",
+           Banner("System Management Descriptor"), BaseLine(0xFE, 2, "System Management Descriptor"),
+           "\tBroadcasting Flag=[0x03], Broadcasting Id=[0x03], Additional Ids=[0x01]\n",
+           "Transport Stream Information. Size=[2]\n",
+           "\tTS Information : TransportStreamId=[0x0001], OrginalNetworkId=[0x7fe1]\n",
+           Banner("Service List Descriptor"), BaseLine(0x41, 3, "Service List Descriptor"),
+           "\tService List Length=[1]\n", "\t\t[0]th Service Info: Service ID=[0xe760], Service Type=[0x01]\n",
+           Banner("TS Information Descriptor"), BaseLine(0xCD, 4, "TS Information Descriptor"),
+           "\tRemote Control Key Id=[0x05], Ts Name=[Ch], Tx Type Count=[0]\n",
+           Banner("Partial Reception Descriptor", 21), BaseLine(0xFB, 2, "Partial Reception Descriptor"),
+           "\tService Id [0] = 231\n", Banner("Terrestrial Delivery Descriptor"),
+           BaseLine(0xFA, 4, "Terrestrial Delivery System Descriptor"),
+           "\tArea Code=[0x0591], Guard Interval=[0x03], Tx Mode=[0x02], Num Of Freq=[1]\n",
+           "\t\tTerrDelSys: Frequency=[3176]\n",
+           "\tTS Information : TransportStreamId=[0x0003], OrginalNetworkId=[0x7fe3]\n"}),
+      ShowLines(nit));
 }
 
 TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialReception) {
@@ -399,23 +348,5 @@ TEST(NITCapture, JapaneseChannelGivesItsNameFrequenciesServicesAndPartialRecepti
   EXPECT_EQ("tsid=0x7ed0 onid=0x7ed0 len=104 services=4 tsname=" + std::string(ts->pTSInformation->GetTsName()) +
                 " freqs=25 partial=1",
             Summary(*ts));
-  std::vector<unsigned short> services;
-  for (int i = 0; i < ts->pServiceList->GetServiceCount(); ++i) {
-    unsigned short id = 0, type = 0;
-    ts->pServiceList->GetServiceInfo(i, id, type);
-    services.insert(services.end(), {id, type});
-  }
-  EXPECT_EQ((std::vector<unsigned short>{0x4800, 0x01, 0x4801, 0x01, 0x4980, 0xC0, 0xFFF0, 0xA4}), services);
-  RavelCTerrDeliverySystemDescriptor* delivery = ts->pTerrDeliverySystem;
-  EXPECT_EQ((std::vector<int>{0xAC6, 2, 2, 0x0D1A, 0x1356}),
-            (std::vector<int>{delivery->GetAreaCode(), delivery->GetGuardInterval(), delivery->GetTransmissionMode(),
-                              delivery->GetFrequency(0), delivery->GetFrequency(24)}));
-  EXPECT_EQ(0x49, ts->pPartialReception->GetServiceId(0));  // high byte of service 0x4980
-  RavelCTSInformationDescriptor* info = ts->pTSInformation;
-  ASSERT_EQ(2, info->GetTransmissionTypeCount());
-  EXPECT_EQ((std::vector<int>{0x01, 0x0F, 3, 0xFFF0, 0xAF, 1, 0x4980}),
-            (std::vector<int>{info->GetRemoteControlKeyId(), info->GetTxType(0)->GetTransmissionTypeInfo(),
-                              info->GetTxType(0)->GetNumOfService(), info->GetTxType(0)->GetServiceId(2),
-                              info->GetTxType(1)->GetTransmissionTypeInfo(), info->GetTxType(1)->GetNumOfService(),
-                              info->GetTxType(1)->GetServiceId(0)}));
+  EXPECT_EQ(0x49, ts->pPartialReception->GetServiceId(0));  // the high byte of service 0x4980
 }
