@@ -31,16 +31,27 @@ int Shell(const std::string& command) {
 class RavelDumpGuideTest : public RavelDumpTest {
  protected:
   // The capture's --json output, or null (with the test skipped) when absent.
-  json Json(const std::string& capture, const std::vector<std::string>& options = {}) {
+  json Json(const std::string& capture) {
     const std::string path = captures::Path(capture);
     if (path.empty()) return nullptr;
-    std::vector<std::string> args = options;
-    args.insert(args.end(), {"-q", "--json", path});
-    ToolRun run = Run(args);
+    ToolRun run = Run({"-q", "--json", path});
     EXPECT_EQ(0, run.status) << run.err;
     return json::parse(run.out);
   }
 };
+
+// The one event of the guide of `summary` of that service and id; null when
+// there is none, which fails the test, as more than one does.
+json EventOf(const json& summary, int serviceId, int eventId) {
+  json found;
+  for (const json& e : summary["epg"]) {
+    if (e["service_id"] != serviceId || e["event_id"] != eventId) continue;
+    EXPECT_TRUE(found.is_null()) << "event " << eventId << " of service " << serviceId << " twice";
+    found = e;
+  }
+  EXPECT_FALSE(found.is_null()) << "no event " << eventId << " of service " << serviceId;
+  return found;
+}
 
 // A TOT of the broadcast's time, its local time offset changing at the same
 // moment, and a descriptor of a tag no standard assigns.
@@ -56,8 +67,7 @@ Bytes Tot(int year, int month, int day) {
 TEST_F(RavelDumpGuideTest, GuideHoldsEveryEventOfPresentFollowingAndScheduleActualAndOther) {
   json summary = Json("dvb-epg.ts");
   if (summary.is_null()) GTEST_SKIP() << "shared capture dvb-epg.ts absent";
-  const json& epg = summary["epg"];
-  EXPECT_EQ(346u, epg.size());
+  EXPECT_EQ(346u, summary["epg"].size());
   struct Case {
     int serviceId, eventId;
     int tableId;
@@ -74,14 +84,10 @@ TEST_F(RavelDumpGuideTest, GuideHoldsEveryEventOfPresentFollowingAndScheduleActu
        /*start=*/"2019-01-22T01:30:00-03:00", /*stop=*/"2019-01-22T01:35:00-03:00", /*extended=*/false},
   };
   for (const Case& c : cases) {
-    int found = 0;
-    for (const json& e : epg) {
-      if (e["service_id"] != c.serviceId || e["event_id"] != c.eventId) continue;
-      ++found;
-      ExpectMembers({{"table_id", c.tableId}, {"name", c.name}, {"start", c.start}, {"stop", c.stop}}, e);
-      EXPECT_EQ(c.extended, !e["extended_text"].get<std::string>().empty() || !e["items"].empty()) << c.name;
-    }
-    EXPECT_EQ(1, found) << c.name;
+    const json e = EventOf(summary, c.serviceId, c.eventId);
+    if (e.is_null()) continue;
+    ExpectMembers({{"table_id", c.tableId}, {"name", c.name}, {"start", c.start}, {"stop", c.stop}}, e);
+    EXPECT_EQ(c.extended, !e["extended_text"].get<std::string>().empty() || !e["items"].empty()) << c.name;
   }
   ToolRun text = Run({"-q", "--epg", captures::Path("dvb-epg.ts")});
   ASSERT_EQ(0, text.status) << text.err;
@@ -202,27 +208,8 @@ TEST_F(RavelDumpGuideTest, BroadcastValuesStandBesideTheLibrarysReading) {
                 dvb["all_services"][0]);
 
   // Ratings as their country's standard defines them, the rating byte kept.
-  struct Case {
-    std::string input;
-    int serviceId, eventId;
-    const char* country;
-    int raw;
-    json label;
-  } cases[] = {
-      {/*input=*/captures::Path("dvb-epg.ts"), /*serviceId=*/0x0402, /*eventId=*/0x1C, /*country=*/"fra", /*raw=*/0x07,
-       /*label=*/"10"},
-      {captures::Path("dvb-epg.ts"), 0x0101, 0x19, "fra", 0x00, nullptr},
-  };
-  for (const Case& c : cases) {
-    const json summary = json::parse(Run({"-q", "--json", c.input}).out);
-    int found = 0;
-    for (const json& e : summary["epg"]) {
-      if (e["service_id"] != c.serviceId || e["event_id"] != c.eventId) continue;
-      ++found;
-      ExpectMembers({{"country", c.country}, {"raw", c.raw}, {"label", c.label}}, e["ratings"][0]);
-    }
-    EXPECT_EQ(1, found) << c.input << " event " << c.eventId;
-  }
+  ExpectMembers({{"country", "fra"}, {"raw", 0x07}, {"label", "10"}}, EventOf(dvb, 0x0402, 0x1C)["ratings"][0]);
+  ExpectMembers({{"country", "fra"}, {"raw", 0x00}, {"label", nullptr}}, EventOf(dvb, 0x0101, 0x19)["ratings"][0]);
 }
 
 TEST_F(RavelDumpGuideTest, TablesWithoutAClassAreNamedAndDumpedAsBytes) {
