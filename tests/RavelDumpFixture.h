@@ -6,7 +6,6 @@
 #include <gtest/gtest.h>
 
 #include <fcntl.h>
-#include <stdlib.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -46,6 +45,14 @@ inline std::string ReadFile(const std::string& path) {
 inline void WriteFile(const std::string& path, const Bytes& bytes) {
   std::ofstream out(path.c_str(), std::ios::binary);
   out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
+}
+
+// Packets of `pid` carrying `sections`, `repeat` times over.
+inline Bytes Packets(uint16_t pid, const std::vector<Bytes>& sections, int repeat = 1) {
+  sb::PacketWriter writer(pid);
+  for (int r = 0; r < repeat; ++r)
+    for (const Bytes& s : sections) writer.AddSection(s);
+  return writer.Stream();
 }
 
 // Every member of `expected` is in `actual` with the same value.

@@ -145,15 +145,15 @@ TEST_F(BroadcastText, StandardIsDetectedFromTheCapture) {
     std::vector<std::string> options;
     const char* standard;
     const char* reason;  // a part of the reason given
-    const char* networkName;  // "": not checked
+    const char* networkName = "";  // "": not checked
   } cases[] = {
       {.capture = "isdbt-japan-psi.sections", .options = {"--sections"}, .standard = "japan",
-       .reason = "NIT network id 0x7ED0 in the ARIB terrestrial range", .networkName = ""},
+       .reason = "NIT network id 0x7ED0 in the ARIB terrestrial range"},
       // The option wins; the kanji bytes read as ISO/IEC 8859-15, as an
       // analyser told the wrong standard shows them.
       {.capture = "isdbt-japan-psi.sections", .options = {"--sections", "--standard", "brazil"}, .standard = "brazil",
        .reason = "--standard", .networkName = "=)ED#0"},
-      {.capture = "dvb-epg.ts", .options = {}, .standard = "brazil", .reason = "no sign", .networkName = ""},
+      {.capture = "dvb-epg.ts", .options = {}, .standard = "brazil", .reason = "no sign"},
   };
   for (const Case& c : cases) {
     std::string path = captures::Path(c.capture);

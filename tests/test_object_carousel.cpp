@@ -50,19 +50,13 @@ std::vector<Bytes> ModuleSections(const std::vector<ModuleSpec>& modules) {
   return sections;
 }
 
-Bytes CarouselPackets(const std::vector<Bytes>& sections) {
-  sb::PacketWriter writer(kCarouselPid);
-  for (const Bytes& s : sections) writer.AddSection(s);
-  return writer.Stream();
-}
-
 // A carousel whose service gateway (key "r" in module 1) binds `bindings`.
 Bytes CarouselStream(const std::vector<Bytes>& bindings, const std::vector<Bytes>& moreMessages) {
   std::vector<Bytes> messages = {DirectoryMessage("r", "srg", bindings)};
   messages.insert(messages.end(), moreMessages.begin(), moreMessages.end());
   std::vector<Bytes> sections = {DsiSection(Ior("srg", 1, "r"))};
   for (const Bytes& s : ModuleSections({{1, 1, messages}})) sections.push_back(s);
-  return CarouselPackets(sections);
+  return Packets(kCarouselPid, sections);
 }
 
 // Paths below `root`, directories with a closing slash.
@@ -152,7 +146,7 @@ TEST_F(ObjectCarouselTest, ModuleThatDoesNotInflateAsDeclaredIsReportedNotWritte
                                                                 ObjectModuleInfo(true, c.declared)}})};
     for (const Bytes& block : ModuleBlocks(1, 1, 1, kBlockSize, c.sent)) sections.push_back(block);
     const std::string out = Path("modules");
-    ToolRun run = Run({"--pid", "0x200", "-x", out, "--json", Write("dc.ts", CarouselPackets(sections))});
+    ToolRun run = Run({"--pid", "0x200", "-x", out, "--json", Write("dc.ts", Packets(kCarouselPid, sections))});
     ASSERT_EQ(0, run.status) << run.err;
     const nlohmann::json module = nlohmann::json::parse(run.out)["carousels"][0]["modules"][0];
     ExpectMembers({{"complete", true}, {"compressed", true}, {"original_size", c.declared}, {"file", nullptr}},
@@ -241,7 +235,7 @@ TEST_F(ObjectCarouselTest, FileIsWrittenAgainWhenItsModuleVersionChanges) {
     sections.push_back(s);
   }
   const std::string out = Path("files");
-  ToolRun run = Run({"--pid", "0x200", "--extract-files", out, "--json", Write("oc.ts", CarouselPackets(sections))});
+  ToolRun run = Run({"--pid", "0x200", "--extract-files", out, "--json", Write("oc.ts", Packets(kCarouselPid, sections))});
   ASSERT_EQ(0, run.status) << run.err;
   EXPECT_EQ("second, longer", ReadFile(out + "/a.txt"));
   EXPECT_EQ((std::set<std::string>{"a.txt"}), TreeBelow(out));
@@ -272,9 +266,8 @@ TEST_F(ObjectCarouselTest, GingaEntryFileIsLookedUpInTheTree) {
                                    FileMessage("m", "<ncl/>")});
   for (const Case& c : cases) {
     SCOPED_TRACE(c.entry);
-    sb::PacketWriter ait(0x0100);
-    ait.AddSection(AitSection("Quiz", c.base, c.initial));
-    ToolRun run = Run({"--pid", "0x100,0x200", "--json", Write("app.ts", sb::Cat({ait.Stream(), carousel}))});
+    const Bytes ait = Packets(0x0100, {AitSection("Quiz", c.base, c.initial)});
+    ToolRun run = Run({"--pid", "0x100,0x200", "--json", Write("app.ts", sb::Cat({ait, carousel}))});
     ASSERT_EQ(0, run.status) << run.err;
     ExpectMembers({{"entry", c.entry}, {"entry_present", c.present}},
                   nlohmann::json::parse(run.out)["applications"][0]);

@@ -47,13 +47,6 @@ Bytes ModuleBytes(size_t size, uint8_t seed) {
   return bytes;
 }
 
-Bytes Packets(uint16_t pid, const std::vector<Bytes>& sections, int repeat = 1) {
-  sb::PacketWriter writer(pid);
-  for (int r = 0; r < repeat; ++r)
-    for (const Bytes& s : sections) writer.AddSection(s);
-  return writer.Stream();
-}
-
 // 192-byte packets: a 4-byte time stamp before each; 204-byte: a 16-byte trailer.
 Bytes Reframe(const Bytes& stream, int size) {
   Bytes out;
@@ -131,28 +124,23 @@ TEST_F(RavelDumpTest, DamageKeepsTheIntactPart) {
   Bytes decoy(204, 0x00);
   decoy[0] = 0x47;
   Bytes sections = sb::Cat({PatSection(0x1234, 3, {{1, 0x100}}), PatSection(0x1234, 4, {{1, 0x100}})});
-  const char kCutPacket[] = "the input ends inside a packet (88 of 188 bytes)";
   struct Case {
-    std::vector<std::string> args;  // "@" stands for the case's file
+    std::vector<std::string> args;  // "-": the file on standard input
     Bytes file;
-    Bytes input;  // on standard input
     const char* damage;
   } cases[] = {
-      {/*args=*/{"@"}, /*file=*/cut, /*input=*/{}, /*damage=*/kCutPacket},
-      {/*args=*/{"-"}, /*file=*/{}, /*input=*/cut, /*damage=*/kCutPacket},
-      {/*args=*/{"@"}, /*file=*/sb::Cat({good, Bytes(300, 0x00)}), /*input=*/{},
-       /*damage=*/"bytes that do not make a whole packet"},
-      {/*args=*/{"@"}, /*file=*/sb::Cat({decoy, good}), /*input=*/{}, /*damage=*/"204 bytes skipped"},
-      {/*args=*/{"@"}, /*file=*/sb::Cat({good, Reframe(good, 204)}), /*input=*/{},
-       /*damage=*/"packet size changes from 188 to 204 bytes"},
-      {/*args=*/{"--sections", "@"}, /*file=*/Bytes(sections.begin(), sections.end() - 3), /*input=*/{},
-       /*damage=*/"truncated"},
+      {/*args=*/{"-"}, /*file=*/cut, /*damage=*/"the input ends inside a packet (88 of 188 bytes)"},
+      {/*args=*/{}, /*file=*/sb::Cat({good, Bytes(300, 0x00)}), /*damage=*/"bytes that do not make a whole packet"},
+      {/*args=*/{}, /*file=*/sb::Cat({decoy, good}), /*damage=*/"204 bytes skipped"},
+      {/*args=*/{}, /*file=*/sb::Cat({good, Reframe(good, 204)}), /*damage=*/"packet size changes from 188 to 204 bytes"},
+      {/*args=*/{"--sections"}, /*file=*/Bytes(sections.begin(), sections.end() - 3), /*damage=*/"truncated"},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.damage);
-    std::vector<std::string> args = WithFile(c.args, Write("damaged.bin", c.file));
-    args.insert(args.begin(), {"--table", "pat"});
-    ToolRun run = Run(args, c.input);
+    std::vector<std::string> args = {"--table", "pat"};
+    args.insert(args.end(), c.args.begin(), c.args.end());
+    if (c.args.empty() || c.args.back() != "-") args.push_back(Write("damaged.bin", c.file));
+    ToolRun run = Run(args, c.file);
     EXPECT_EQ(0, run.status) << run.err;
     EXPECT_NE(std::string::npos, run.out.find("0x1234")) << run.out;
     EXPECT_NE(std::string::npos, run.err.find(c.damage)) << run.err;
@@ -402,24 +390,21 @@ TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
   // Latin text, and UTF-8 text, which is the one thing printed as it came.
   std::string name = std::string("Jogo\x1b[31m\x07") + "\x9b" + "fim\\ caf\xc3\xa9 \xe9t\xe9 \xc2\x9b";
   const std::string escaped = "Jogo\\x1b[31m\\x07\\x9bfim\\\\ caf\xc3\xa9 \\xe9t\\xe9 \\xc2\\x9b";
-  Bytes stream = Packets(0x0100, {AitSection(name, "/apps", "main.ncl")});
-  std::string file = Write("ait.ts", stream);
-
-  ToolRun dump = Run({"--pid", "0x100", file});
-  ASSERT_EQ(0, dump.status) << dump.err;
-  EXPECT_NE(std::string::npos, dump.out.find("\t App Name.........: " + escaped)) << dump.out;
-  ToolRun summary = Run({"--pid", "0x100", "--summary", file});
-  ASSERT_EQ(0, summary.status) << summary.err;
-  EXPECT_NE(std::string::npos, summary.out.find("name \"" + escaped + "\"")) << summary.out;
-  ToolRun json = Run({"--pid", "0x100", "--json", file});
-  ASSERT_EQ(0, json.status) << json.err;
-  nlohmann::json document = nlohmann::json::parse(json.out);
-  ASSERT_EQ(1u, document["applications"].size());
-  EXPECT_EQ(escaped, document["applications"][0]["name"].get<std::string>());
-  for (const ToolRun* run : {&dump, &summary, &json}) {
-    std::string out = run->out;
-    for (size_t at = out.find("\xc3\xa9"); at != std::string::npos; at = out.find("\xc3\xa9")) out.erase(at, 2);
-    for (char c : out) {
+  const std::string file = Write("ait.ts", Packets(0x0100, {AitSection(name, "/apps", "main.ncl")}));
+  struct View {
+    const char* option;
+    std::string shown;
+  } views[] = {
+      {.option = "--quiet", .shown = "\t App Name.........: " + escaped},
+      {.option = "--summary", .shown = "name \"" + escaped + "\""},
+      {.option = "--json", .shown = "\"name\": " + nlohmann::json(escaped).dump()},
+  };
+  for (const View& view : views) {
+    ToolRun run = Run({"--pid", "0x100", view.option, file});
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_NE(std::string::npos, run.out.find(view.shown)) << run.out;
+    for (size_t at = run.out.find("\xc3\xa9"); at != std::string::npos; at = run.out.find("\xc3\xa9")) run.out.erase(at, 2);
+    for (char c : run.out) {
       unsigned char byte = static_cast<unsigned char>(c);
       EXPECT_TRUE(byte == '\n' || byte == '\t' || (byte >= 0x20 && byte < 0x7F)) << static_cast<int>(byte);
     }
