@@ -10,6 +10,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -60,11 +61,7 @@ inline void ExpectMembers(const nlohmann::json& expected, const nlohmann::json& 
   for (const auto& member : expected.items()) EXPECT_EQ(member.value(), actual[member.key()]) << member.key();
 }
 
-inline size_t Lines(const std::string& text) {
-  size_t count = 0;
-  for (char c : text) count += c == '\n';
-  return count;
-}
+inline size_t Lines(const std::string& text) { return std::count(text.begin(), text.end(), '\n'); }
 
 class RavelDumpTest : public ::testing::Test {
  protected:

@@ -235,7 +235,8 @@ TEST_F(ObjectCarouselTest, FileIsWrittenAgainWhenItsModuleVersionChanges) {
     sections.push_back(s);
   }
   const std::string out = Path("files");
-  ToolRun run = Run({"--pid", "0x200", "--extract-files", out, "--json", Write("oc.ts", Packets(kCarouselPid, sections))});
+  const std::string capture = Write("oc.ts", Packets(kCarouselPid, sections));
+  ToolRun run = Run({"--pid", "0x200", "--extract-files", out, "--json", capture});
   ASSERT_EQ(0, run.status) << run.err;
   EXPECT_EQ("second, longer", ReadFile(out + "/a.txt"));
   EXPECT_EQ((std::set<std::string>{"a.txt"}), TreeBelow(out));
