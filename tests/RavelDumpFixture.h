@@ -6,11 +6,11 @@
 #include <gtest/gtest.h>
 
 #include <fcntl.h>
-#include <stdlib.h>
 #include <sys/stat.h>
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <chrono>
 #include <csignal>
 #include <cstdlib>
@@ -48,16 +48,20 @@ inline void WriteFile(const std::string& path, const Bytes& bytes) {
   out.write(reinterpret_cast<const char*>(bytes.data()), static_cast<std::streamsize>(bytes.size()));
 }
 
+// Packets of `pid` carrying `sections`, `repeat` times over.
+inline Bytes Packets(uint16_t pid, const std::vector<Bytes>& sections, int repeat = 1) {
+  sb::PacketWriter writer(pid);
+  for (int r = 0; r < repeat; ++r)
+    for (const Bytes& s : sections) writer.AddSection(s);
+  return writer.Stream();
+}
+
 // Every member of `expected` is in `actual` with the same value.
 inline void ExpectMembers(const nlohmann::json& expected, const nlohmann::json& actual) {
   for (const auto& member : expected.items()) EXPECT_EQ(member.value(), actual[member.key()]) << member.key();
 }
 
-inline size_t Lines(const std::string& text) {
-  size_t count = 0;
-  for (char c : text) count += c == '\n';
-  return count;
-}
+inline size_t Lines(const std::string& text) { return std::count(text.begin(), text.end(), '\n'); }
 
 class RavelDumpTest : public ::testing::Test {
  protected:

@@ -50,8 +50,6 @@ class BroadcastText : public RavelDumpTest {
   }
 };
 
-std::string SamplePath() { return std::string(RAVEL_SAMPLES_DIR) + "/oneseg-brazil.ts"; }
-
 TEST_F(BroadcastText, TextsReadInTheCodingOfTheirStandard) {
   struct Case {
     const char* what;
@@ -72,13 +70,11 @@ TEST_F(BroadcastText, TextsReadInTheCodingOfTheirStandard) {
        .bytes = "\x1b\x2a\x31\xa2\xf3", .shown = "アン"},
       {.what = "additional symbol in row 90 of the kanji set", .standard = "japan",
        .bytes = "\x7a\x56", .shown = "\U0001F211"},
-      {.what = "JIS X 0201 katakana", .standard = "japan", .bytes = "\x1b\x28\x49\x31",
-       .shown = "\xef\xbd\xb1"},
+      {.what = "JIS X 0201 katakana", .standard = "japan", .bytes = "\x1b\x28\x49\x31", .shown = "\xef\xbd\xb1"},
       {.what = "controls with parameters and DRCS leave no text", .standard = "japan",
        .bytes = "\x90\x20\x41\x0e" "A\x9b\x30\x3b\x31\x20\x53" "B\x1c\x41\x42" "C\x1b\x28\x20\x41\x0f\x21\x0e" "D",
        .shown = "\xef\xbc\xa1\xef\xbc\xa2\xef\xbc\xa3\xef\xbc\xa4"},
-      {.what = "code the kanji set does not assign", .standard = "japan", .bytes = "\x22\x2f",
-       .shown = "\xef\xbf\xbd"},
+      {.what = "code the kanji set does not assign", .standard = "japan", .bytes = "\x22\x2f", .shown = "\xef\xbf\xbd"},
       {.what = "ISO/IEC 8859-15 letters and euro sign", .standard = "brazil",
        .bytes = "\xa4 \xbc\xbd \xe7\xe3o", .shown = "€ Œœ ção"},
       {.what = "ISO/IEC 8859-15 line break and control codes", .standard = "brazil",
@@ -114,7 +110,7 @@ TEST_F(BroadcastText, JapaneseCaptureReadsInArib8UnitCode) {
   nlohmann::json summary = JsonSummary({"--sections", capture});
   struct Case {
     const char* member;  // JSON pointer
-    std::string shown;
+    nlohmann::json shown;
   } cases[] = {
       {.member = "/network/name", .shown = "秋田０"},
       {.member = "/network/transport_streams/0/name", .shown = "ＮＨＫ総合・秋田"},
@@ -125,11 +121,14 @@ TEST_F(BroadcastText, JapaneseCaptureReadsInArib8UnitCode) {
       {.member = "/services/0/following/name",
        .shown = "ダーウィンが来た！「波乱のライオン学園に潜入！百獣の王を養成！！」\U0001F216\U0001F211"},
       {.member = "/services/0/present/start", .shown = "2020-04-05T19:00:00+09:00"},
+      // The PAT's order: the one-segment service comes last.
+      {.member = "/services/3/one_segment", .shown = true},
+      {.member = "/services/3/pmt_pid", .shown = 8136},
   };
   for (const Case& c : cases) {
     nlohmann::json::json_pointer member(c.member);
     ASSERT_TRUE(summary.contains(member)) << c.member;
-    EXPECT_EQ(c.shown, summary[member].get<std::string>()) << c.member;
+    EXPECT_EQ(c.shown, summary[member]) << c.member;
   }
   // The dump shows the same texts inside the library's own lines.
   std::string dump = Output({"--sections", capture});
@@ -137,47 +136,42 @@ TEST_F(BroadcastText, JapaneseCaptureReadsInArib8UnitCode) {
   EXPECT_NE(std::string::npos, dump.find("Ts Name=[ＮＨＫ総合・秋田], Tx Type Count=")) << dump;
 }
 
-// The sample's Latin texts and local times are pinned by its JSON in tests/golden.
+// The sample's Latin texts, local times and standard are pinned by its JSON in
+// tests/golden.
 
 TEST_F(BroadcastText, StandardIsDetectedFromTheCapture) {
   struct Case {
-    const char* capture;  // shared capture, or "" for the sample
-    bool sections;
+    const char* capture;
+    std::vector<std::string> options;
     const char* standard;
     const char* reason;  // a part of the reason given
+    const char* networkName = "";  // "": not checked
   } cases[] = {
-      {.capture = "", .sections = false, .standard = "brazil", .reason = "event language por"},
-      {.capture = "isdbt-japan-psi.sections", .sections = true, .standard = "japan",
+      {.capture = "isdbt-japan-psi.sections", .options = {"--sections"}, .standard = "japan",
        .reason = "NIT network id 0x7ED0 in the ARIB terrestrial range"},
-      {.capture = "isdb-signalling-mix.sections", .sections = true, .standard = "brazil", .reason = "no sign"},
-      {.capture = "dvb-epg.ts", .sections = false, .standard = "brazil", .reason = "no sign"},
+      // The option wins; the kanji bytes read as ISO/IEC 8859-15, as an
+      // analyser told the wrong standard shows them.
+      {.capture = "isdbt-japan-psi.sections", .options = {"--sections", "--standard", "brazil"}, .standard = "brazil",
+       .reason = "--standard", .networkName = "=)ED#0"},
+      {.capture = "dvb-epg.ts", .options = {}, .standard = "brazil", .reason = "no sign"},
   };
   for (const Case& c : cases) {
-    std::string path = *c.capture ? captures::Path(c.capture) : SamplePath();
+    std::string path = captures::Path(c.capture);
     if (path.empty()) {
       std::printf("shared capture %s absent: not checked\n", c.capture);
       continue;
     }
-    std::vector<std::string> args;
-    if (c.sections) args.push_back("--sections");
+    std::vector<std::string> args = c.options;
     args.push_back(path);
     nlohmann::json summary = JsonSummary(args);
     ASSERT_FALSE(summary.is_discarded()) << c.capture;
     EXPECT_EQ(c.standard, summary["standard"].get<std::string>()) << c.capture;
     EXPECT_NE(std::string::npos, summary["standard_reason"].get<std::string>().find(c.reason))
         << c.capture << ": " << summary["standard_reason"];
+    if (*c.networkName) {
+      EXPECT_EQ(c.networkName, summary["network"]["name"].get<std::string>());
+    }
   }
-}
-
-TEST_F(BroadcastText, StandardOptionOverridesDetection) {
-  std::string capture = captures::Path("isdbt-japan-psi.sections");
-  if (capture.empty()) GTEST_SKIP() << "shared capture isdbt-japan-psi.sections absent";
-  nlohmann::json summary = JsonSummary({"--standard", "brazil", "--sections", capture});
-  EXPECT_EQ("brazil", summary["standard"].get<std::string>());
-  EXPECT_EQ("--standard", summary["standard_reason"].get<std::string>());
-  EXPECT_EQ("-03:00", summary["time_base"].get<std::string>());
-  // The kanji bytes read as ISO/IEC 8859-15, as an analyser told the wrong standard shows them.
-  EXPECT_EQ("=)ED#0", summary["network"]["name"].get<std::string>());
 }
 
 }  // namespace

@@ -47,13 +47,6 @@ Bytes ModuleBytes(size_t size, uint8_t seed) {
   return bytes;
 }
 
-Bytes Packets(uint16_t pid, const std::vector<Bytes>& sections, int repeat = 1) {
-  sb::PacketWriter writer(pid);
-  for (int r = 0; r < repeat; ++r)
-    for (const Bytes& s : sections) writer.AddSection(s);
-  return writer.Stream();
-}
-
 // 192-byte packets: a 4-byte time stamp before each; 204-byte: a 16-byte trailer.
 Bytes Reframe(const Bytes& stream, int size) {
   Bytes out;
@@ -74,6 +67,7 @@ Bytes Sample() {
 const char kNetworkLine[] = "Network: \"Rede Exemplo\"";
 
 const Bytes kNoBytes;
+const uint16_t kBlock = 4066;  // the most a DDB section holds
 
 const Bytes& SamplePatStream() {
   static const Bytes stream = Packets(0x0000, {PatSection(0x1234, 3, {{1, 0x0300}, {2, 0x1FC8}})}, 6);
@@ -103,7 +97,6 @@ TEST_F(RavelDumpTest, BadInputGivesOneLineAndNonZeroExitAndNoOutput) {
       {/*args=*/{"@"}, /*file=*/&text, /*message=*/"not a transport stream"},
       {/*args=*/{"--sections", "@"}, /*file=*/&text, /*message=*/"not a file of raw sections"},
       {/*args=*/{"--sections", "@"}, /*file=*/&SamplePatStream(), /*message=*/"a transport stream, not raw sections"},
-      {/*args=*/{"udp://239.1.1.1"}, /*file=*/nullptr, /*message=*/"udp://239.1.1.1: no port"},
       {/*args=*/{"udp://@:99999"}, /*file=*/nullptr, /*message=*/"bad port '99999'"},
       {/*args=*/{"udp://tuner:1234"}, /*file=*/nullptr, /*message=*/"'tuner' is not an IPv4 address"},
   };
@@ -132,42 +125,28 @@ TEST_F(RavelDumpTest, DamageKeepsTheIntactPart) {
   Bytes decoy(204, 0x00);
   decoy[0] = 0x47;
   Bytes sections = sb::Cat({PatSection(0x1234, 3, {{1, 0x100}}), PatSection(0x1234, 4, {{1, 0x100}})});
-  const char kCutPacket[] = "the input ends inside a packet (88 of 188 bytes)";
   struct Case {
-    std::vector<std::string> args;  // "@" stands for the case's file
+    std::vector<std::string> args;  // "-": the file on standard input
     Bytes file;
-    Bytes input;  // on standard input
     const char* damage;
   } cases[] = {
-      {/*args=*/{"@"}, /*file=*/cut, /*input=*/{}, /*damage=*/kCutPacket},
-      {/*args=*/{"-"}, /*file=*/{}, /*input=*/cut, /*damage=*/kCutPacket},
-      {/*args=*/{"@"}, /*file=*/sb::Cat({good, Bytes(300, 0x00)}), /*input=*/{},
-       /*damage=*/"bytes that do not make a whole packet"},
-      {/*args=*/{"@"}, /*file=*/sb::Cat({decoy, good}), /*input=*/{}, /*damage=*/"204 bytes skipped"},
-      {/*args=*/{"@"}, /*file=*/sb::Cat({good, Reframe(good, 204)}), /*input=*/{},
+      {/*args=*/{"-"}, /*file=*/cut, /*damage=*/"the input ends inside a packet (88 of 188 bytes)"},
+      {/*args=*/{}, /*file=*/sb::Cat({good, Bytes(300, 0x00)}), /*damage=*/"bytes that do not make a whole packet"},
+      {/*args=*/{}, /*file=*/sb::Cat({decoy, good}), /*damage=*/"204 bytes skipped"},
+      {/*args=*/{}, /*file=*/sb::Cat({good, Reframe(good, 204)}),
        /*damage=*/"packet size changes from 188 to 204 bytes"},
-      {/*args=*/{"--sections", "@"}, /*file=*/Bytes(sections.begin(), sections.end() - 3), /*input=*/{},
-       /*damage=*/"truncated"},
+      {/*args=*/{"--sections"}, /*file=*/Bytes(sections.begin(), sections.end() - 3), /*damage=*/"truncated"},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.damage);
-    std::vector<std::string> args = WithFile(c.args, Write("damaged.bin", c.file));
-    args.insert(args.begin(), {"--table", "pat"});
-    ToolRun run = Run(args, c.input);
+    std::vector<std::string> args = {"--table", "pat"};
+    args.insert(args.end(), c.args.begin(), c.args.end());
+    if (c.args.empty() || c.args.back() != "-") args.push_back(Write("damaged.bin", c.file));
+    ToolRun run = Run(args, c.file);
     EXPECT_EQ(0, run.status) << run.err;
     EXPECT_NE(std::string::npos, run.out.find("0x1234")) << run.out;
     EXPECT_NE(std::string::npos, run.err.find(c.damage)) << run.err;
   }
-}
-
-TEST_F(RavelDumpTest, UnreadableFileIsReportedAsSuch) {
-  if (geteuid() == 0) GTEST_SKIP() << "permissions do not apply to root";
-  std::string file = Write("locked.ts", SamplePatStream());
-  chmod(file.c_str(), 0);
-  ToolRun run = Run({file});
-  EXPECT_EQ(1, run.status);
-  EXPECT_EQ("", run.out);
-  EXPECT_EQ("ravel-dump: " + file + ": Permission denied\n", run.err);
 }
 
 TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
@@ -176,13 +155,10 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
     std::vector<std::string> args;
     const char* message;
   } cases[] = {
-      {{"--frobnicate", file}, "frobnicate"},
-      {{"--standard", "mars", file}, "unknown standard 'mars'"}, {{"--pid", "9000", file}, "bad PID '9000'"},
+      {{"--frobnicate", file}, "frobnicate"}, {{"--standard", "mars", file}, "unknown standard 'mars'"},
       {{"--pid", "0x10,zz", file}, "bad PID 'zz'"}, {{"--table", "pat,nonsense", file}, "unknown table 'nonsense'"},
       {{"--trace", "loud", file}, "unknown trace level 'loud'"},
       {{"--sections", "--pid", "1", file}, "--pid applies to transport streams"}, {{file, file}, "only one capture"},
-      {{"--summary", "--json", file}, "--summary and --json each choose what is printed"},
-      {{"--json", "--epg", file}, "--json and --epg each choose what is printed"},
       {{"--summary", "--jsonl", file}, "--summary and --jsonl each choose what is printed"},
       {{"--json", "--table", "pat", file}, "--table chooses the tables of the dump"},
       {{"--xmltv", "", file}, "--xmltv needs a file"},
@@ -196,47 +172,20 @@ TEST_F(RavelDumpTest, UsageErrorsExitWithTwoAndOneLine) {
   }
 }
 
-TEST_F(RavelDumpTest, WithoutAFileAPipeIsReadAndATerminalRefused) {
-  Bytes stream = SamplePatStream();
-  ToolRun named = Run({Write("pat.ts", stream)});
-  ToolRun piped = Run({}, stream);
-  EXPECT_EQ(0, piped.status) << piped.err;
-  EXPECT_EQ(named.out, piped.out);
-  EXPECT_NE(std::string::npos, piped.err.find("report: standard input"));
+// Without a file a pipe is read (see the raw sections' cases), a terminal not.
+TEST_F(RavelDumpTest, WithoutAFileATerminalIsRefused) {
   ToolRun terminal = RunAtTerminal({});
   EXPECT_EQ(2, terminal.status);
   EXPECT_EQ("", terminal.out);
   EXPECT_NE(std::string::npos, terminal.err.find("no capture given")) << terminal.err;
 }
 
-// Long options in the option column of the help ("  -s, --summary ...",
-// "      --sections ..."), not those named in descriptions.
-std::set<std::string> HelpOptions(const std::string& help) {
+// Long options named anywhere in `text`; troff writes "\-" for "-".
+std::set<std::string> LongOptions(const std::string& text) {
+  const std::string plain = std::regex_replace(text, std::regex(R"(\\-)"), "-");
+  const std::regex option("--[a-z][a-z-]*");
   std::set<std::string> options;
-  std::istringstream lines(help);
-  std::smatch match;
-  for (std::string line; std::getline(lines, line);) {
-    if (std::regex_search(line, match, std::regex("^  (-\\w, |    )(--[a-z][a-z-]*)"))) options.insert(match[2]);
-  }
-  return options;
-}
-
-// Long options in the tags of the manual page's OPTIONS entries (the line
-// after each .TP, "\-\-summary" in troff).
-std::set<std::string> ManualOptions(const std::string& manual) {
-  std::set<std::string> options;
-  std::istringstream lines(manual);
-  bool inOptions = false, tag = false;
-  for (std::string line; std::getline(lines, line);) {
-    if (line.rfind(".SH", 0) == 0) inOptions = line == ".SH OPTIONS";
-    if (inOptions && tag) {
-      std::smatch match;
-      if (std::regex_search(line, match, std::regex(R"(\\-\\-([a-z](\\-|[a-z])*))"))) {
-        options.insert("--" + std::regex_replace(match[1].str(), std::regex(R"(\\-)"), "-"));
-      }
-    }
-    tag = line == ".TP";
-  }
+  for (std::sregex_iterator it(plain.begin(), plain.end(), option), end; it != end; ++it) options.insert(it->str());
   return options;
 }
 
@@ -244,11 +193,9 @@ TEST_F(RavelDumpTest, EveryOptionIsInTheHelpAndTheManualPage) {
   ToolRun help = Run({"--help"});
   EXPECT_EQ(0, help.status);
   EXPECT_EQ("", help.err);
-  std::set<std::string> inHelp = HelpOptions(help.out);
-  std::set<std::string> inManual = ManualOptions(ReadFile(RAVEL_DUMP_MANUAL));
+  const std::set<std::string> inHelp = LongOptions(help.out);
   EXPECT_GE(inHelp.size(), 12u) << help.out;
-  for (const std::string& option : inHelp) EXPECT_EQ(1u, inManual.count(option)) << option << " missing from the manual page";
-  for (const std::string& option : inManual) EXPECT_EQ(1u, inHelp.count(option)) << option << " is not an option any more";
+  EXPECT_EQ(inHelp, LongOptions(ReadFile(RAVEL_DUMP_MANUAL)));
   ToolRun version = Run({"--version"});
   EXPECT_EQ(0, version.status);
   EXPECT_EQ(0u, version.out.find("ravel-dump "));
@@ -264,9 +211,7 @@ TEST_F(RavelDumpTest, BashCompletionOffersOptionsAndTheirValues) {
     std::string offered;
   } cases[] = {
       {/*words=*/"--sta", /*offered=*/"--standard"},
-      {/*words=*/"--no-p", /*offered=*/"--no-progress"},
       {/*words=*/"--standard j", /*offered=*/"japan"},
-      {/*words=*/"--table pat,e", /*offered=*/"pat,eit"},
       {/*words=*/"--trace dump,wa", /*offered=*/"dump,warning"},
   };
   for (const Case& c : cases) {
@@ -276,12 +221,8 @@ TEST_F(RavelDumpTest, BashCompletionOffersOptionsAndTheirValues) {
                           << "COMP_CWORD=$((${#COMP_WORDS[@]} - 1))\n"
                           << "_ravel_dump\n"
                           << "printf '%s\\n' \"${COMPREPLY[@]}\"\n";
-    FILE* bash = popen(("bash " + script).c_str(), "r");
-    ASSERT_NE(nullptr, bash);
-    std::string offered;
-    for (int ch; (ch = std::fgetc(bash)) != EOF;) offered += static_cast<char>(ch);
-    pclose(bash);
-    EXPECT_EQ(c.offered + "\n", offered) << c.words;
+    ASSERT_EQ(0, std::system(("bash " + script + " >" + Path("offered")).c_str()));
+    EXPECT_EQ(c.offered + "\n", ReadFile(Path("offered"))) << c.words;
   }
 }
 
@@ -329,75 +270,54 @@ TEST_F(RavelDumpTest, PacketSizesAndGarbageGiveTheSameTables) {
   Bytes leading = junk;
   sb::Append(leading, plain);
   struct Case {
-    const char* what;
     Bytes stream;
-    const char* inputLine;
+    const char* input;  // the report's line, after "input: 6 packets of "
   } cases[] = {
-      {/*what=*/"188", /*stream=*/plain, /*inputLine=*/"input: 6 packets of 188 bytes, 0 bytes skipped, 0 resyncs"},
-      {/*what=*/"192", /*stream=*/Reframe(plain, 192),
-       /*inputLine=*/"input: 6 packets of 192 bytes, 0 bytes skipped, 0 resyncs"},
-      {/*what=*/"204", /*stream=*/Reframe(plain, 204),
-       /*inputLine=*/"input: 6 packets of 204 bytes, 0 bytes skipped, 0 resyncs"},
-      {/*what=*/"garbage between packets", /*stream=*/garbage,
-       /*inputLine=*/"input: 6 packets of 188 bytes, 77 bytes skipped, 1 resyncs"},
-      {/*what=*/"garbage before the first packet", /*stream=*/leading,
-       /*inputLine=*/"input: 6 packets of 188 bytes, 77 bytes skipped, 0 resyncs"},
+      {.stream = plain, .input = "188 bytes, 0 bytes skipped, 0 resyncs"},
+      {.stream = Reframe(plain, 192), .input = "192 bytes, 0 bytes skipped, 0 resyncs"},
+      {.stream = Reframe(plain, 204), .input = "204 bytes, 0 bytes skipped, 0 resyncs"},
+      {.stream = garbage, .input = "188 bytes, 77 bytes skipped, 1 resyncs"},
+      {.stream = leading, .input = "188 bytes, 77 bytes skipped, 0 resyncs"},
   };
   ToolRun reference = Run({Write("plain.ts", plain)});
   ASSERT_EQ(0, reference.status) << reference.err;
   EXPECT_NE(std::string::npos, reference.out.find("== PAT on PID 0x0000: table_id 0x00, id 0x1234, version 3"));
   for (const Case& c : cases) {
     ToolRun run = Run({Write("case.ts", c.stream)});
-    EXPECT_EQ(0, run.status) << c.what << run.err;
-    EXPECT_EQ(reference.out, run.out) << c.what;
-    EXPECT_NE(std::string::npos, run.err.find(c.inputLine)) << c.what << "\n" << run.err;
+    EXPECT_EQ(0, run.status) << c.input << run.err;
+    EXPECT_EQ(reference.out, run.out) << c.input;
+    EXPECT_NE(std::string::npos, run.err.find(std::string("input: 6 packets of ") + c.input)) << run.err;
   }
 }
 
-TEST_F(RavelDumpTest, RepeatedTableIsShownAgainOnlyWhenItChanges) {
+// A live input runs for days: a table that changes is shown again, and only
+// its latest version is kept, however many came before.
+TEST_F(RavelDumpTest, RepeatedTableIsShownAgainOnlyWhenItChangesAndOnlyItsLatestVersionIsKept) {
   Bytes v3 = PatSection(0x1234, 3, {{1, 0x0100}});
   Bytes v4 = PatSection(0x1234, 4, {{1, 0x0100}, {2, 0x0101}});
   sb::PacketWriter writer(0x0000);
   for (int i = 0; i < 4; ++i) writer.AddSection(v3);
   for (int i = 0; i < 2; ++i) writer.AddSection(v4);
+  writer.SetCounter(9);  // a continuity break, counted for this PID
   writer.AddSection(v3);  // back to the first contents: the same table again
   ToolRun run = Run({Write("pat.ts", writer.Stream())});
   ASSERT_EQ(0, run.status) << run.err;
-  const size_t first = run.out.find("version 3, section 0 of 1\n");
-  const size_t change = run.out.find("version 4, section 0 of 1, changed\n");
-  const size_t back = run.out.find("version 3, section 0 of 1, changed\n");
-  size_t headers = 0;
-  for (size_t at = run.out.find("== "); at != std::string::npos; at = run.out.find("\n== ", at + 1)) ++headers;
-  EXPECT_EQ(3u, headers) << run.out;
-  EXPECT_LT(first, change);
-  EXPECT_LT(change, back);
-  EXPECT_NE(std::string::npos, back);
-  EXPECT_NE(std::string::npos, run.out.find("The number of PMT Table Info=[2]\n"));
-}
-
-TEST_F(RavelDumpTest, ContinuityBreaksArePerPid) {
-  sb::PacketWriter writer(0x0000);
-  Bytes pat = PatSection(0x1234, 3, {{1, 0x0100}});
-  writer.AddSection(pat);
-  writer.AddSection(pat);
-  writer.SetCounter(9);  // a jump from 2 to 9
-  writer.AddSection(pat);
-  ToolRun run = Run({Write("pat.ts", writer.Stream())});
-  ASSERT_EQ(0, run.status) << run.err;
-  EXPECT_NE(std::string::npos, run.err.find("  0x0000          3          1        0         3  PAT\n")) << run.err;
+  // The first table, the change, and the first contents again, nothing else.
+  std::regex header("== PAT.*version (\\d), section 0 of 1(, changed)?\n");
+  std::string shown;
+  for (std::sregex_iterator it(run.out.begin(), run.out.end(), header), end; it != end; ++it)
+    shown += it->str(1) + it->str(2) + ";";
+  EXPECT_EQ("3;4, changed;3, changed;", shown) << run.out;
+  EXPECT_NE(std::string::npos, run.err.find("  0x0000          7          1        0         7  PAT\n")) << run.err;
+  EXPECT_NE(std::string::npos, run.err.find("  PAT                          7         3       1 ")) << run.err;
 }
 
 TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   // Each section has a good CRC; one declared length points past its parent.
-  auto options = [](uint8_t tableId) {
-    sb::SectionOptions o;
-    o.tableId = tableId;
-    return o;
-  };
-  const sb::SectionOptions pmt = options(0x02), sdt = options(0x42), eit = options(0x4E), ait = options(0x74),
-                           dii = options(0x3B);
-  Bytes service = sb::Descriptor(0x48, sb::Cat({sb::U8(1), sb::U8(0), sb::U8(3), sb::Text("abc")}));
-  service[1] = 40;  // the descriptor claims more than its loop holds
+  // One table, one DSM-CC message and one DSM-CC section: each kind of refusal.
+  sb::SectionOptions pmt, dii;
+  pmt.tableId = 0x02;
+  dii.tableId = 0x3B;
   Bytes diiBody = sb::Cat({sb::U32(1), sb::U16(512), sb::U8(0), sb::U8(0), sb::U32(0), sb::U32(0), sb::U16(0),
                            sb::U16(3), sb::U16(1), sb::U32(10), sb::U8(1), sb::U8(0), sb::U16(0)});
   Bytes ddb = DdbSection(1, 1, 1, 0, ModuleBytes(10, 0));
@@ -410,23 +330,9 @@ TEST_F(RavelDumpTest, SectionsWhoseLoopsOverrunAreCountedAndNeverParsed) {
   } cases[] = {
       {/*section=*/sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(200)})), /*kind=*/"PMT",
        /*reason=*/"loop runs past its parent's end at byte 10"},
-      {/*section=*/sb::LongSection(pmt, sb::Cat({sb::U16(0xE100), sb::Length12(0), sb::U8(0x1B), sb::U16(0xE111),
-                                                 sb::Length12(30), sb::Descriptor(0x52, sb::U8(1))})),
-       /*kind=*/"PMT", /*reason=*/"loop entry runs past its loop's end at byte 12"},
-      {/*section=*/sb::LongSection(sdt, sb::Cat({sb::U16(1), sb::U8(0xFF), sb::U16(1), sb::U8(0xFC),
-                                                 sb::U16(0x8000 | service.size()), service})),
-       /*kind=*/"SDT", /*reason=*/"descriptor runs past its loop's end at byte 16"},
-      {/*section=*/sb::LongSection(eit, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x4E), sb::U16(1),
-                                                 sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::U8(0), sb::U8(0), sb::U8(0),
-                                                 sb::U16(0x8000 | 60)})),
-       /*kind=*/"EIT p/f", /*reason=*/"loop entry runs past its loop's end at byte 14"},
-      {/*section=*/sb::LongSection(ait, sb::Cat({sb::U16(0xF000), sb::U16(0xF000 | 90)})), /*kind=*/"AIT",
-       /*reason=*/"application loop runs past the section at byte 10"},
       {/*section=*/sb::LongSection(dii, DsmccMessage(0x1002, 2, diiBody)), /*kind=*/"DII",
        /*reason=*/"DII module record cut by the message end"},
       {/*section=*/ddb, /*kind=*/"DDB", /*reason=*/"DSM-CC message runs past the section at byte 18"},
-      {/*section=*/sb::ShortSection(0x73, sb::Cat({sb::UtcTime(2013, 5, 10, 1, 0, 0), sb::Length12(20)}), true),
-       /*kind=*/"TOT", /*reason=*/"loop runs past its parent's end at byte 8"},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.reason);
@@ -467,27 +373,16 @@ TEST_F(RavelDumpTest, EitPairsInOnePacketAreAllReadUnlessThroughTheReceiversStor
   sb::PacketWriter writer(0x0012);
   for (int i = 0; i < kPairs; ++i) writer.AddPackedSections({EitSection(0x4E, i, 1), EitSection(0x50, i, 10)});
   const std::string capture = Write("pairs.ts", writer.Stream());
-  struct Case {
-    const char* name;
-    std::vector<std::string> options;
-    unsigned long schedule;
-    const char* storeLine;  // "": no such line
-  } cases[] = {
-      {.name = "whole sections", .options = {}, .schedule = kPairs, .storeLine = ""},
-      {.name = "receivers' store", .options = {"--receiver"}, .schedule = 0,
-       .storeLine = "the receivers' store did not deliver 200 sections whole"},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.name);
-    std::vector<std::string> args = c.options;
-    args.push_back(capture);
-    ToolRun run = Run(args);
-    ASSERT_EQ(0, run.status) << run.err;
-    EXPECT_EQ(static_cast<unsigned long>(kPairs), KindSections(run.err, "EIT p/f")) << run.err;
-    EXPECT_EQ(c.schedule, KindSections(run.err, "EIT schedule")) << run.err;
-    const std::string line = *c.storeLine ? c.storeLine : "the receivers' store";
-    EXPECT_EQ(*c.storeLine != 0, run.err.find(line) != std::string::npos) << run.err;
-  }
+  ToolRun whole = Run({capture});
+  ToolRun store = Run({"--receiver", capture});
+  ASSERT_EQ(0, whole.status) << whole.err;
+  ASSERT_EQ(0, store.status) << store.err;
+  EXPECT_EQ(static_cast<unsigned long>(kPairs), KindSections(whole.err, "EIT p/f")) << whole.err;
+  EXPECT_EQ(static_cast<unsigned long>(kPairs), KindSections(whole.err, "EIT schedule")) << whole.err;
+  EXPECT_EQ(std::string::npos, whole.err.find("the receivers' store")) << whole.err;
+  EXPECT_EQ(static_cast<unsigned long>(kPairs), KindSections(store.err, "EIT p/f")) << store.err;
+  EXPECT_EQ(0u, KindSections(store.err, "EIT schedule")) << store.err;
+  EXPECT_NE(std::string::npos, store.err.find("the receivers' store did not deliver 200 sections whole")) << store.err;
 }
 
 // --- Texts, summary, JSON, filters -------------------------------------------
@@ -497,24 +392,20 @@ TEST_F(RavelDumpTest, BroadcastTextsAreEscapedInEveryOutput) {
   // Latin text, and UTF-8 text, which is the one thing printed as it came.
   std::string name = std::string("Jogo\x1b[31m\x07") + "\x9b" + "fim\\ caf\xc3\xa9 \xe9t\xe9 \xc2\x9b";
   const std::string escaped = "Jogo\\x1b[31m\\x07\\x9bfim\\\\ caf\xc3\xa9 \\xe9t\\xe9 \\xc2\\x9b";
-  Bytes stream = Packets(0x0100, {AitSection(name, "/apps", "main.ncl")});
-  std::string file = Write("ait.ts", stream);
-
-  ToolRun dump = Run({"--pid", "0x100", file});
-  ASSERT_EQ(0, dump.status) << dump.err;
-  EXPECT_NE(std::string::npos, dump.out.find("\t App Name.........: " + escaped)) << dump.out;
-  ToolRun summary = Run({"--pid", "0x100", "--summary", file});
-  ASSERT_EQ(0, summary.status) << summary.err;
-  EXPECT_NE(std::string::npos, summary.out.find("name \"" + escaped + "\"")) << summary.out;
-  ToolRun json = Run({"--pid", "0x100", "--json", file});
-  ASSERT_EQ(0, json.status) << json.err;
-  nlohmann::json document = nlohmann::json::parse(json.out);
-  ASSERT_EQ(1u, document["applications"].size());
-  EXPECT_EQ(escaped, document["applications"][0]["name"].get<std::string>());
-  for (const ToolRun* run : {&dump, &summary, &json}) {
-    std::string out = run->out;
-    for (size_t at = out.find("\xc3\xa9"); at != std::string::npos; at = out.find("\xc3\xa9")) out.erase(at, 2);
-    for (char c : out) {
+  const std::string file = Write("ait.ts", Packets(0x0100, {AitSection(name, "/apps", "main.ncl")}));
+  struct View {
+    const char* option;
+    std::string shown;
+  } views[] = {
+      {.option = "--quiet", .shown = "\t App Name.........: " + escaped},
+      {.option = "--summary", .shown = "name \"" + escaped + "\""},
+      {.option = "--json", .shown = "\"name\": " + nlohmann::json(escaped).dump()},
+  };
+  for (const View& view : views) {
+    ToolRun run = Run({"--pid", "0x100", view.option, file});
+    ASSERT_EQ(0, run.status) << run.err;
+    EXPECT_NE(std::string::npos, run.out.find(view.shown)) << run.out;
+    for (char c : std::regex_replace(run.out, std::regex("\xc3\xa9"), "")) {
       unsigned char byte = static_cast<unsigned char>(c);
       EXPECT_TRUE(byte == '\n' || byte == '\t' || (byte >= 0x20 && byte < 0x7F)) << static_cast<int>(byte);
     }
@@ -531,7 +422,6 @@ TEST_F(RavelDumpTest, PidAndTableFiltersLimitWhatIsRead) {
       {/*args=*/{file}, /*pat=*/true, /*ait=*/false},  // nothing names PID 0x0100 as an AIT PID
       {/*args=*/{"--pid", "0x100", file}, /*pat=*/false, /*ait=*/true},
       {/*args=*/{"--pid", "0,0x100", file}, /*pat=*/true, /*ait=*/true},
-      {/*args=*/{"--pid", "0", "--pid", "256", file}, /*pat=*/true, /*ait=*/true},
       {/*args=*/{"--pid", "0,0x100", "--table", "ait", file}, /*pat=*/false, /*ait=*/true},
       {/*args=*/{"--pid", "0,0x100", "--table", "0x00", file}, /*pat=*/true, /*ait=*/false},
   };
@@ -556,7 +446,6 @@ TEST_F(RavelDumpTest, TraceLevelsShowTheLibrarysOwnTraces) {
 // --- Data carousel ------------------------------------------------------------
 
 TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
-  const uint16_t kBlock = 4066;
   Bytes big = ModuleBytes(10000, 1);    // three blocks, the last one short
   Bytes small = ModuleBytes(300, 2);    // one block
   Bytes gappy = ModuleBytes(9000, 3);   // block 1 never comes
@@ -575,55 +464,34 @@ TEST_F(RavelDumpTest, CompleteModulesAreRebuiltAndWrittenAtomically) {
       ModuleBlocks(7, 1, 5, kBlock, big)[1],
       ModuleBlocks(7, 1, 5, kBlock, big)[0],  // a repeat
   };
-  std::string out = Path("modules");
-  ToolRun run = Run({"--pid", "0x0200", "--extract-modules", out, "--json", Write("dc.ts", Packets(0x0200, sections))});
+  const std::string out = Path("modules"), capture = Write("dc.ts", Packets(0x0200, sections));
+  auto file = [&out](int id) { return out + "/pid0200_dl00000007_module000" + std::to_string(id) + "_v5.bin"; };
+  ToolRun run = Run({"--pid", "0x0200", "--extract-modules", out, "--json", capture});
   ASSERT_EQ(0, run.status) << run.err;
   nlohmann::json carousels = nlohmann::json::parse(run.out)["carousels"];
   ASSERT_EQ(1u, carousels.size());
   ExpectMembers({{"pid", 0x200}, {"download_id", 7}, {"block_size", kBlock}}, carousels[0]);
-  struct Expect {
-    int id;
-    unsigned received, total;
-    bool complete;
-    const Bytes* bytes;
-  } expected[] = {
-      {/*id=*/1, /*received=*/3, /*total=*/3, /*complete=*/true, /*bytes=*/&big},
-      {/*id=*/2, /*received=*/1, /*total=*/1, /*complete=*/true, /*bytes=*/&small},
-      {/*id=*/3, /*received=*/2, /*total=*/3, /*complete=*/false, /*bytes=*/nullptr},
-      {/*id=*/4, /*received=*/1, /*total=*/2, /*complete=*/false, /*bytes=*/nullptr},
-      {/*id=*/5, /*received=*/0, /*total=*/0, /*complete=*/true, /*bytes=*/&kNoBytes},
-  };
   const nlohmann::json& modules = carousels[0]["modules"];
   ASSERT_EQ(5u, modules.size());
-  for (size_t i = 0; i < 5; ++i) {
-    const Expect& e = expected[i];
-    char name[64];
-    std::snprintf(name, sizeof name, "pid0200_dl00000007_module%04x_v5.bin", e.id);
-    const std::string file = out + "/" + name;
-    ExpectMembers({{"id", e.id}, {"version", 5}, {"blocks_received", e.received}, {"blocks_total", e.total},
-                   {"complete", e.complete}, {"file", e.complete ? nlohmann::json(file) : nlohmann::json()}},
-                  modules[i]);
-    if (e.complete) {
-      EXPECT_EQ(std::string(e.bytes->begin(), e.bytes->end()), ReadFile(file)) << e.id;
-    }
+  const unsigned received[] = {3, 1, 2, 1, 0}, total[] = {3, 1, 3, 2, 0};
+  for (int id = 1; id <= 5; ++id) {
+    const bool complete = received[id - 1] == total[id - 1];
+    ExpectMembers({{"id", id}, {"version", 5}, {"blocks_received", received[id - 1]}, {"blocks_total", total[id - 1]},
+                   {"complete", complete}, {"file", complete ? nlohmann::json(file(id)) : nlohmann::json()}},
+                  modules[id - 1]);
   }
-  size_t files = 0;
-  for (const auto& entry : fs::directory_iterator(out)) {
-    EXPECT_NE('.', entry.path().filename().string()[0]) << "temporary file left: " << entry.path();
-    ++files;
-  }
-  EXPECT_EQ(3u, files);
-  // Without --json the written files are listed.
-  ToolRun list = Run({"--pid", "0x0200", "--extract-modules", out, Path("dc.ts")});
-  EXPECT_EQ(out + "/pid0200_dl00000007_module0001_v5.bin\n" + out + "/pid0200_dl00000007_module0002_v5.bin\n" + out +
-                "/pid0200_dl00000007_module0005_v5.bin\n",
-            list.out);
+  EXPECT_EQ(std::string(big.begin(), big.end()), ReadFile(file(1)));
+  EXPECT_EQ(std::string(small.begin(), small.end()), ReadFile(file(2)));
+  EXPECT_EQ("", ReadFile(file(5)));
+  // Without --json the written files are listed; no temporary file is left.
+  ToolRun list = Run({"--pid", "0x0200", "--extract-modules", out, capture});
+  EXPECT_EQ(file(1) + "\n" + file(2) + "\n" + file(5) + "\n", list.out);
+  EXPECT_EQ(3, std::distance(fs::directory_iterator(out), fs::directory_iterator()));
 }
 
 // A module version its DII no longer lists will not come whole: its blocks
 // are dropped, so that a carousel that changes holds no stale blocks.
 TEST_F(RavelDumpTest, ModulesInProgressAreDroppedWhenTheirDiiChanges) {
-  const uint16_t kBlock = 4066;
   Bytes module = ModuleBytes(8000, 1);  // two blocks
   std::vector<Bytes> sections = {
       DiiSection(7, kBlock, {{1, 8000, 1}}),
@@ -671,27 +539,6 @@ TEST_F(RavelDumpTest, SummaryFollowsTheReceiversPath) {
 
 // --- Real captures --------------------------------------------------------------
 
-TEST_F(RavelDumpTest, JapanesePsiSectionsGiveServicesAndTheirPids) {
-  std::string capture = captures::Path("isdbt-japan-psi.sections");
-  if (capture.empty()) GTEST_SKIP() << "shared capture isdbt-japan-psi.sections absent";
-  ToolRun run = Run({"--sections", "--standard", "japan", "--json", capture});
-  ASSERT_EQ(0, run.status) << run.err;
-  nlohmann::json summary = nlohmann::json::parse(run.out);
-  EXPECT_EQ("japan", summary["standard"].get<std::string>());
-  EXPECT_EQ(0x7ED0, summary["transport_stream_id"].get<int>());
-  // The PAT's order: by program number, the one-segment program last.
-  const nlohmann::json expected = nlohmann::json::parse(R"([
-      {"id": 18432, "pmt_pid": 496, "video_pid": 256, "audio_pids": [272], "caption_pid": 304, "one_segment": false},
-      {"id": 18433, "pmt_pid": 1008, "video_pid": 256, "audio_pids": [272], "caption_pid": 304, "one_segment": false},
-      {"id": 65520, "pmt_pid": 7408, "video_pid": null, "audio_pids": [], "caption_pid": null, "one_segment": false},
-      {"id": 18816, "pmt_pid": 8136, "video_pid": 1409, "audio_pids": [1411], "caption_pid": 1415, "one_segment": true}
-  ])");
-  const nlohmann::json& services = summary["services"];
-  ASSERT_EQ(4u, services.size()) << services.dump(1);
-  for (size_t i = 0; i < 4; ++i) ExpectMembers(expected[i], services[i]);
-  EXPECT_EQ(0x7ED0, summary["network"]["id"].get<int>());
-}
-
 TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
   std::string capture = captures::Path("ait.ts");
   if (capture.empty()) GTEST_SKIP() << "shared capture ait.ts absent";
@@ -699,44 +546,14 @@ TEST_F(RavelDumpTest, AitCaptureGivesItsGingaApplications) {
   ASSERT_EQ(0, run.status) << run.err;
   // The AIT PIDs are found as a receiver finds them: named by the PMTs.
   EXPECT_NE(std::string::npos, run.err.find("  0x1ec5          2          0        0         2  AIT\n")) << run.err;
-  const nlohmann::json expected = nlohmann::json::parse(R"([
-      {"pid": 7877, "application_id": 6837, "control_code": 2, "name": "Programmi TV BB SAT"},
-      {"pid": 7878, "application_id": 6838, "control_code": 1, "name": "Launcher SAT"},
-      {"pid": 7879, "application_id": 6839, "control_code": 2, "name": "Programmi TV SAT"}
-  ])");
   nlohmann::json applications = nlohmann::json::parse(run.out)["applications"];
   ASSERT_EQ(3u, applications.size()) << applications.dump(1);
-  for (const nlohmann::json& e : expected) {
-    auto app = std::find_if(applications.begin(), applications.end(),
-                            [&e](const nlohmann::json& a) { return a["pid"] == e["pid"]; });
-    ASSERT_NE(applications.end(), app) << e["name"];
-    ExpectMembers(e, *app);
-    ExpectMembers({{"organization_id", 11}, {"application_type", 1}}, *app);
-  }
-}
-
-TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
-  std::string capture = captures::Path("dvb-epg.ts");
-  if (capture.empty()) GTEST_SKIP() << "shared capture dvb-epg.ts absent";
-  ToolRun run = Run({"--json", capture});
-  ASSERT_EQ(0, run.status) << run.err;
-  // The capture's one corrupt EIT section is counted and left out.
-  EXPECT_NE(std::string::npos, run.err.find(" 1 CRC failures,")) << run.err;
-  EXPECT_NE(std::string::npos, run.err.find("PID 0x0012 table_id 0x4e: CRC failure")) << run.err;
-  nlohmann::json summary = nlohmann::json::parse(run.out);
-  std::vector<int> ids;
-  for (const nlohmann::json& s : summary["services"]) {
-    ids.push_back(s["id"].get<int>());
-    EXPECT_FALSE(s["present"].is_null()) << s.dump();
-    EXPECT_FALSE(s["following"].is_null()) << s.dump();
-  }
-  EXPECT_EQ((std::vector<int>{0x0401, 0x0402, 0x0407, 0x0415, 0x0416}), ids);
-
-  ToolRun dump = Run({"--table", "eit", capture});
-  ASSERT_EQ(0, dump.status);
-  EXPECT_NE(std::string::npos, dump.out.find("== EIT schedule on PID 0x0012: table_id 0x50, id 0x0401, version 5"));
-  EXPECT_NE(std::string::npos, dump.out.find("###################### EIT Table Information ######################\n"));
-  EXPECT_EQ(std::string::npos, dump.out.find("== SDT"));
+  auto launcher = std::find_if(applications.begin(), applications.end(),
+                               [](const nlohmann::json& a) { return a["pid"] == 7878; });  // in arrival order
+  ASSERT_NE(applications.end(), launcher);
+  ExpectMembers({{"application_id", 6838}, {"control_code", 1}, {"name", "Launcher SAT"}, {"organization_id", 11},
+                 {"application_type", 1}},
+                *launcher);
 }
 
 // --- Live inputs: UDP over the loopback interface, pipes, FIFOs, signals ------
@@ -745,9 +562,6 @@ TEST_F(RavelDumpTest, DvbEpgCaptureGivesPresentAndFollowingEvents) {
 #ifndef RAVEL_DUMP_EMULATOR
 
 using std::chrono::milliseconds;
-
-const size_t kPacketsPerDatagram = 7;  // 1316 bytes, as IPTV sends them
-const uint8_t kRtpMp2t = 33;
 
 sockaddr_in Ipv4(const char* address, int port) {
   sockaddr_in socketAddress{};
@@ -786,26 +600,19 @@ long UdpQueue(int port) {
   return -1;
 }
 
-enum class Framing { kBare, kRtp, kRtpWithCsrcExtensionPadding };
+// RTP headers of MPEG-2 transport (payload type 33): plain, and with two
+// CSRCs, an extension of one word and three bytes of padding after the payload.
+const Bytes kRtp = sb::Cat({sb::U8(0x80), sb::U8(33), sb::U16(1), sb::U32(0), sb::U32(0x1234)});
+const Bytes kRtpWithCsrcExtension = sb::Cat({sb::U8(0xB2), sb::U8(33), sb::U16(1), sb::U32(0), sb::U32(0x1234),
+                                             sb::U32(1), sb::U32(2), sb::U16(0xABAC), sb::U16(1), sb::U32(0)});
 
-// The datagrams of `stream`: 7 packets each, behind an RTP header when asked.
-std::vector<Bytes> Datagrams(const Bytes& stream, Framing framing) {
+// The datagrams of `stream`: 7 packets each, as IPTV sends them, between
+// `header` and `trailer`.
+std::vector<Bytes> Datagrams(const Bytes& stream, const Bytes& header, const Bytes& trailer) {
   std::vector<Bytes> datagrams;
-  uint16_t sequence = 0;
-  for (size_t at = 0; at < stream.size(); at += kPacketsPerDatagram * 188) {
-    size_t end = std::min(stream.size(), at + kPacketsPerDatagram * 188);
-    Bytes payload(stream.begin() + at, stream.begin() + end);
-    Bytes datagram;
-    if (framing == Framing::kRtp) {
-      datagram = sb::Cat({sb::U8(0x80), sb::U8(kRtpMp2t), sb::U16(sequence++), sb::U32(0), sb::U32(0x1234)});
-    } else if (framing == Framing::kRtpWithCsrcExtensionPadding) {
-      // Two CSRCs, an extension of one word, three bytes of padding.
-      datagram = sb::Cat({sb::U8(0xB2), sb::U8(kRtpMp2t), sb::U16(sequence++), sb::U32(0), sb::U32(0x1234),
-                          sb::U32(1), sb::U32(2), sb::U16(0xABAC), sb::U16(1), sb::U32(0)});
-      payload = sb::Cat({payload, Bytes{0, 0, 3}});
-    }
-    sb::Append(datagram, payload);
-    datagrams.push_back(datagram);
+  for (size_t at = 0; at < stream.size(); at += 7 * 188) {
+    const size_t end = std::min(stream.size(), at + 7 * 188);
+    datagrams.push_back(sb::Cat({header, Bytes(stream.begin() + at, stream.begin() + end), trailer}));
   }
   return datagrams;
 }
@@ -842,18 +649,16 @@ TEST_F(RavelDumpTest, UdpFeedsAreReadUntilStopped) {
     const char* name;
     const char* url;         // %d: the port
     const char* sendTo;
-    Framing framing;
+    Bytes header = {}, trailer = {};  // around the packets of each datagram
   } cases[] = {
-      {.name = "unicast, bare packets", .url = "udp://127.0.0.1:%d", .sendTo = "127.0.0.1",
-       .framing = Framing::kBare},
-      {.name = "every local address (VLC), RTP", .url = "udp://@:%d", .sendTo = "127.0.0.1",
-       .framing = Framing::kRtp},
+      {.name = "unicast, bare packets", .url = "udp://127.0.0.1:%d", .sendTo = "127.0.0.1"},
+      {.name = "every local address (VLC), RTP", .url = "udp://@:%d", .sendTo = "127.0.0.1", .header = kRtp},
       {.name = "unicast, RTP with CSRCs, an extension and padding", .url = "udp://127.0.0.1:%d",
-       .sendTo = "127.0.0.1", .framing = Framing::kRtpWithCsrcExtensionPadding},
+       .sendTo = "127.0.0.1", .header = kRtpWithCsrcExtension, .trailer = {0, 0, 3}},
       {.name = "a sender's address, as ffmpeg reads it: every local address", .url = "udp://192.0.2.1:%d",
-       .sendTo = "127.0.0.1", .framing = Framing::kBare},
+       .sendTo = "127.0.0.1"},
       {.name = "multicast group joined on the loopback interface", .url = "udp://239.255.42.1:%d?localaddr=127.0.0.1",
-       .sendTo = "239.255.42.1", .framing = Framing::kRtp},
+       .sendTo = "239.255.42.1", .header = kRtp},
   };
   const Bytes sample = Sample();
   for (const Case& c : cases) {
@@ -863,7 +668,7 @@ TEST_F(RavelDumpTest, UdpFeedsAreReadUntilStopped) {
     std::snprintf(url, sizeof url, c.url, port);
     const pid_t tool = Start({"--summary", url}, -1);
     const bool bound = WaitUntil([port] { return UdpQueue(port) >= 0; });
-    std::vector<Bytes> datagrams = Datagrams(sample, c.framing);
+    std::vector<Bytes> datagrams = Datagrams(sample, c.header, c.trailer);
     datagrams.insert(datagrams.begin(), Bytes(100, 0x00));  // neither packets nor RTP: reported, not read
     if (bound) Send(c.sendTo, port, datagrams, 3);
     // Every datagram is read before the signal, which ends the input there.
@@ -891,8 +696,6 @@ TEST_F(RavelDumpTest, LiveInputsEndAtTheirEndOrTheStopSignal) {
     size_t cutPacketBytes;          // bytes of one more packet written before the end
     const char* shown;              // in the output before the end
   } cases[] = {
-      {.name = "SIGINT on standard input", .args = {"--summary", "-"}, .signal = SIGINT, .cutPacketBytes = 0,
-       .shown = ""},
       {.name = "SIGTERM on a FIFO", .args = {"--summary", "@"}, .signal = SIGTERM, .cutPacketBytes = 0, .shown = ""},
       {.name = "SIGINT inside a packet", .args = {"--summary", "-"}, .signal = SIGINT, .cutPacketBytes = 100,
        .shown = ""},
@@ -969,21 +772,6 @@ TEST_F(RavelDumpTest, JsonLinesTellEachEventOnce) {
   }
 }
 
-// A live input runs for days: a table that changes keeps its latest version
-// only, however many came before.
-TEST_F(RavelDumpTest, EachTableKeepsOnlyItsLatestVersion) {
-  sb::PacketWriter writer(0x0000);
-  const int kVersions = 40;
-  for (int v = 0; v < kVersions; ++v) {
-    writer.AddSection(PatSection(0x1234, static_cast<uint8_t>(v % 32), {{1, 0x100 + v}}));
-  }
-  ToolRun run = Run({"--summary", Write("versions.ts", writer.Stream())});
-  ASSERT_EQ(0, run.status) << run.err;
-  char row[128];
-  std::snprintf(row, sizeof row, "  %-20s %9d %9d %7d ", "PAT", kVersions, kVersions, 1);
-  EXPECT_NE(std::string::npos, run.err.find(row)) << run.err;
-}
-
 // --- One table of tables -----------------------------------------------------
 
 TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
@@ -991,7 +779,6 @@ TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
   // each decides what the tool must show. Two bodies: the short one passes the
   // walk of the EIT layout, the long one those of the PMT, NIT, SDT and BIT.
   // 0xFF is the stuffing byte between sections, never a table.
-  std::string shown;
   for (size_t bodySize : {6u, 16u}) {
     Bytes file;
     std::vector<Bytes> sections;
@@ -1004,7 +791,6 @@ TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
     }
     ToolRun run = Run({"-q", "--sections", Write("all.sections", file)});
     ASSERT_EQ(0, run.status) << run.err;
-    shown += run.out;
     for (const Bytes& section : sections) {
       char where[32];
       std::snprintf(where, sizeof where, ": table_id 0x%02x,", section[0]);
@@ -1025,13 +811,6 @@ TEST_F(RavelDumpTest, EveryTableIdIsShownAsTheLibrarysTableOfTablesSaysIt) {
           << line;
       EXPECT_EQ(result == kRavelSafeRefused, line.find("refused by the library") != std::string::npos) << line;
     }
-  }
-  // What users see of the tables the library has no class for.
-  for (const char* line : {"== EIT schedule: table_id 0x51, id 0x0051, version 0, 1 sections up to number 0 ",
-                           "== CAT: table_id 0x01, id 0x0001, version 0, section 0 of 1 ",
-                           "== other: table_id 0x80, id 0x0080, version 0, section 0 of 1 "}) {
-    EXPECT_NE(std::string::npos, shown.find(line + std::string("(no class in the library for this table_id)\n")))
-        << line;
   }
 }
 

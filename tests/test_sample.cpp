@@ -1,7 +1,7 @@
 // The committed sample capture of a Brazilian one-segment service
 // (samples/oneseg-brazil.ts): every section assembled by the library's store
-// and parsed by the class of its table_id, its carousel modules, its PCRs, and
-// a fresh run of its generator giving the same bytes.
+// and parsed by the class of its table_id, its carousel modules, and a fresh
+// run of its generator giving the same bytes.
 #include <gtest/gtest.h>
 
 #include <cstring>
@@ -16,7 +16,6 @@
 #include "Ravel_CDsmccDDB.h"
 #include "Ravel_CDsmccDII.h"
 #include "Ravel_CDsmccDSI.h"
-#include "Ravel_CPCR.h"
 #include "Ravel_CTSPktAssembler.h"
 #include "Ravel_CTableAIT.h"
 #include "Ravel_CTableBIT.h"
@@ -37,10 +36,6 @@
 #include "TraceRecorder.h"
 
 namespace {
-
-using th::kCarouselWarning;
-using th::kWarning;
-const unsigned int kBitLoop = th::kBit;
 
 const char kSampleFile[] = RAVEL_SAMPLES_DIR "/oneseg-brazil.ts";
 
@@ -92,37 +87,17 @@ const Assembled& SampleSections() {
   return assembled;
 }
 
-Bytes SectionOf(int pid, size_t index) {
-  const std::vector<Bytes>& list = SampleSections().sections.at(pid);
-  return index < list.size() ? list[index] : Bytes();
-}
-
-// The AIT traces the section's address; only its place in the text is compared.
-std::string WithoutAddress(const std::string& text) {
-  std::string::size_type open = text.find("apRawData=[");
-  if (open == std::string::npos) return text;
-  std::string::size_type close = text.find(']', open);
-  return text.substr(0, open) + "apRawData=[ADDRESS" + text.substr(close);
-}
-
-struct ParseOutcome {
-  int result;
-  TraceLines trace;
-};
-
-// Parses `data` with a T built empty first, so that the trace is that of the parse alone.
+// Parses `data` with the library class T, as a receiver does.
 template <class T, class... Args>
-ParseOutcome ParseWith(unsigned char* data, Args... args) {
+int ParseWith(unsigned char* data, Args... args) {
   T object(args...);
-  TraceRecorder recorder;
-  ParseOutcome outcome = {object.ParseRawData(data), TraceLines()};
-  for (const auto& line : recorder.Lines()) outcome.trace.push_back({line.first, WithoutAddress(line.second)});
-  return outcome;
+  TraceRecorder quiet;  // each class's traces are pinned with the class
+  return object.ParseRawData(data);
 }
 
 // Parses one section with the library class of its table_id (for DSM-CC
 // sections, of its message id, over the message after the section header).
-ParseOutcome ParseByTableId(Bytes section) {
+int ParseByTableId(Bytes section) {
   unsigned char* s = section.data();
   unsigned char* message = s + 8;
   switch (s[0]) {
@@ -146,31 +121,8 @@ ParseOutcome ParseByTableId(Bytes section) {
         case RAVEL_DSMCC_MSG_DDB: return ParseWith<RavelCDsmccDDB>(message, nullptr);
       }
   }
-  return ParseOutcome{kRavelErrInvalidArgument, TraceLines()};
+  return kRavelErrInvalidArgument;
 }
-
-const TraceLines kQuiet;
-const TraceLines kBitTrace = {{kBitLoop, "First Descriptor Loop.. Unkown Descriptor Tag=[0xd7]\n"},
-                              {kWarning, "BIT BroadcasterDescriptor Parsing.. Unkown Descriptor Tag=[0xd8]\n"}};
-const TraceLines kAitTrace = {{kWarning, "RavelCAIT::ParseRawData... apRawData=[ADDRESS]\n"},
-                              {kWarning, "RavelCAIT::processDescriptors...\n"},
-                              {kWarning, "Detected an APPLICATION_DESCRIPTOR"},
-                              {kWarning, "RavelCAIT::processDescriptors...\n"},
-                              {kWarning, "Detected an APPLICATION_NAME_DESCRIPTOR"},
-                              {kWarning, "Application name = Exemplo"},
-                              {kWarning, "RavelCAIT::processDescriptors...\n"},
-                              {kWarning, "Detected an APPLICATION_TRANSP_PROT_DESCRIPTOR"},
-                              {kWarning, "RavelCAIT::processDescriptors...\n"},
-                              {kWarning, "Detected an APPLICATION_GINGA_APP_LOCATION_DESCRIPTOR"},
-                              {kWarning, "Application path = /exemplo"},
-                              {kWarning, "Application filename = main.ncl"}};
-const TraceLines kDsiTrace = {{kCarouselWarning, "RavelCDsmccDSI::ParseRawData... \n"},
-                              {kCarouselWarning, "Private data length [16]\n"}};
-// The table builds its NPT reference empty before parsing into it, and the
-// empty construction reports the null argument at the error level.
-const TraceLines kStreamEventTrace = {{0x80000020u, "Invalid Argument!\n"}};
-const TraceLines kPresentEitTrace = {{kWarning, "raw genre = 0x0!\n"}};
-const TraceLines kFollowingEitTrace = {{kWarning, "raw genre = 0x30!\n"}};
 
 // The carousel's blocks: module 1 (3000 bytes) in blocks 0 to 2, module 2
 // (500 bytes) in block 0.
@@ -190,58 +142,31 @@ TEST(SampleCapture, EverySectionAssemblesAndParsesWithTheClassOfItsTableId) {
   EXPECT_EQ(0, assembled.heldSizeMismatches);
   EXPECT_EQ(0, assembled.storesLeftCollecting);
 
-  struct Expected {
-    uint8_t tableId;
-    const TraceLines* trace;
-  };
-  const Expected dsi = {0x3B, &kDsiTrace}, dii = {0x3B, &kQuiet}, ddb = {0x3C, &kQuiet};
-  struct PidSections {
-    int pid;
-    std::vector<Expected> sections;
-  } cases[] = {
-      {/*pid=*/0x0000, /*sections=*/std::vector<Expected>(4, Expected{0x00, &kQuiet})},
-      {/*pid=*/0x1FC8, /*sections=*/std::vector<Expected>(4, Expected{0x02, &kQuiet})},
-      {/*pid=*/0x0010, /*sections=*/std::vector<Expected>(3, Expected{0x40, &kQuiet})},
-      {/*pid=*/0x0011, /*sections=*/std::vector<Expected>(3, Expected{0x42, &kQuiet})},
-      {/*pid=*/0x0027, /*sections=*/{{0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace},
-                                     {0x4E, &kPresentEitTrace}, {0x4E, &kFollowingEitTrace}}},
-      {/*pid=*/0x0014, /*sections=*/{{0x70, &kQuiet}, {0x73, &kQuiet}}},
-      {/*pid=*/0x0024, /*sections=*/{{0xC4, &kBitTrace}}},
-      {/*pid=*/0x0188, /*sections=*/std::vector<Expected>(2, Expected{0x74, &kAitTrace})},
-      {/*pid=*/0x018A, /*sections=*/{dsi, dii, ddb, ddb, ddb, ddb, dsi, dii, ddb, ddb, ddb, ddb}},
-      {/*pid=*/0x018B, /*sections=*/std::vector<Expected>(2, Expected{0x3D, &kStreamEventTrace})},
-  };
-  size_t pidsWithSections = 0;
-  for (const PidSections& c : cases) {
-    SCOPED_TRACE(c.pid);
-    ASSERT_EQ(1u, assembled.sections.count(c.pid));
-    ++pidsWithSections;
-    const std::vector<Bytes>& sections = assembled.sections.at(c.pid);
-    ASSERT_EQ(c.sections.size(), sections.size());
-    for (size_t i = 0; i < sections.size(); ++i) {
-      SCOPED_TRACE(i);
-      EXPECT_EQ(c.sections[i].tableId, sections[i][0]);
-      ParseOutcome outcome = ParseByTableId(sections[i]);
-      EXPECT_EQ(kRavelOk, outcome.result);
-      EXPECT_EQ(*c.sections[i].trace, outcome.trace);
+  // Which sections come and what each parses to is pinned by the sample's dump
+  // in tests/golden; here, that the receivers' store delivers every one whole
+  // and that each has a class of the library that reads it.
+  size_t sections = 0;
+  for (const auto& pid : assembled.sections) {
+    for (const Bytes& section : pid.second) {
+      EXPECT_EQ(kRavelOk, ParseByTableId(section)) << "PID " << pid.first << " section " << sections;
+      ++sections;
     }
   }
-  EXPECT_EQ(pidsWithSections, assembled.sections.size());
+  EXPECT_EQ(std::size(kSectionPids), assembled.sections.size());
+  EXPECT_EQ(37u, sections);
 }
 
 // Every value of these sections as the library reads it is pinned by the
 // dump of the sample in tests/golden; here, what the dump does not show.
 
 TEST(SampleCapture, CarouselModulesRebuildFromTheirBlocksAndMatchTheirCrc) {
-  Bytes diiSection = SectionOf(0x018A, 1);
+  Bytes diiSection = SampleSections().sections.at(0x018A).at(1);
   RavelCDsmccDII dii(diiSection.data() + 8);
   ASSERT_EQ(2, dii.GetNumberOfModules());
   struct Module {
     uint16_t id;
     unsigned int blocks;
-    std::string begins;
-  } modules[] = {{/*id=*/0x0001, /*blocks=*/3, /*begins=*/"<?xml version"},
-                 {/*id=*/0x0002, /*blocks=*/1, /*begins=*/"-- script.lua"}};
+  } modules[] = {{/*id=*/0x0001, /*blocks=*/3}, {/*id=*/0x0002, /*blocks=*/1}};
   for (const Module& m : modules) {
     SCOPED_TRACE(m.id);
     RavelCModuleInfo* info = dii.GetModuleInfoByID(m.id);
@@ -255,34 +180,9 @@ TEST(SampleCapture, CarouselModulesRebuildFromTheirBlocksAndMatchTheirCrc) {
       module.insert(module.end(), ddb.GetBlockData(), ddb.GetBlockData() + ddb.GetBlockDataLen());
     }
     ASSERT_EQ(info->GetModuleSize(), module.size());
-    EXPECT_EQ(m.begins, std::string(module.begin(), module.begin() + m.begins.size()));
     unsigned int crc = RavelUtil_CRC32(0xFFFFFFFFu, module.data(), static_cast<unsigned int>(module.size()));
     EXPECT_EQ(crc, RavelRead32(info->GetCRC32Descriptor()->aCRC32));
   }
-}
-
-TEST(SampleCapture, VideoCarriesAPcrEveryRoundWhichThePcrReaderDoesNotSee) {
-  Bytes capture = LoadSample();
-  std::vector<uint64_t> pcrs;
-  for (size_t at = 0; at + 188 <= capture.size(); at += 188) {
-    const uint8_t* p = &capture[at];
-    int pid = ((p[1] & 0x1F) << 8) | p[2];
-    if (pid != 0x0181 || !(p[3] & 0x20)) continue;
-    ASSERT_EQ(7, p[4]);
-    ASSERT_EQ(0x10, p[5]);  // PCR_flag
-    pcrs.push_back((static_cast<uint64_t>(p[6]) << 25) | (p[7] << 17) | (p[8] << 9) | (p[9] << 1) | (p[10] >> 7));
-    // The reader takes its flags from the adaptation_field_length byte (7),
-    // so it finds neither a PCR nor an OPCR here.
-    unsigned char packet[188];
-    std::memcpy(packet, p, 188);
-    TraceRecorder recorder;
-    RavelCPCR pcr(nullptr);
-    EXPECT_EQ(kRavelOk, pcr.ParseRawData(packet));
-    EXPECT_EQ(0u, pcr.mPCR);
-    EXPECT_EQ(TraceLines(), recorder.Lines());
-  }
-  ASSERT_EQ(8u, pcrs.size());
-  for (size_t i = 0; i < pcrs.size(); ++i) EXPECT_EQ(0x20000000u + 9000 * i, pcrs[i]) << i;
 }
 
 TEST(SampleCapture, RegeneratingGivesTheCommittedBytes) {
