@@ -2,13 +2,13 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "Ravel_CTableStreamEventDescriptor.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -129,43 +129,23 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
 }
 
 TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
-  enum How { kCopyConstruct, kAssign, kAssignToItself };
-  struct Case {
-    How how;
-    std::vector<int> held;
-  } cases[] = {
-      {kCopyConstruct, {9}},
-      {kAssign, {9}},
-      // The target's descriptors are released before the source is read.
-      {kAssignToItself, {-1}},
-  };
   Bytes section = StreamSection({Npt(9), Event(1), Event(2), Event(3)});
   Bytes other = StreamSection({Event(8), Event(9)});
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.how);
-    RavelCDsmccStreamEvent table(section.data());
-    table.iSession = 0x5A;
-    RavelCDsmccStreamEvent assigned(other.data());
-    TraceRecorder recorder;
-    RavelCDsmccStreamEvent* t = &assigned;
-    std::unique_ptr<RavelCDsmccStreamEvent> copy;
-    if (c.how == kCopyConstruct) {
-      copy.reset(new RavelCDsmccStreamEvent(table));
-      t = copy.get();
-    } else if (c.how == kAssign) {
-      assigned = table;
-    } else {
-      RavelCDsmccStreamEvent& self = table;
-      table = self;
-      t = &table;
-    }
-    EXPECT_TRUE(recorder.Records().empty());  // the NPT reference is copied, not parsed again
-    EXPECT_EQ((std::vector<int>{0x5A, 0x3D, static_cast<int>(section.size() - 3), 3}),
-              (std::vector<int>{t->iSession, t->iTableId, t->iSectionLength, t->iVersionNumber}));
-    EXPECT_STREQ(kName, t->sTableName.GetString());
-    EXPECT_EQ(c.held, Held(*t));
-    if (t != &table) EXPECT_NE(table.GetNPTReference(), t->GetNPTReference());
-  }
+  TraceRecorder recorder;
+  tcc::ExpectCopies<RavelCDsmccStreamEvent>(
+      section.data(), other.data(), [](RavelCDsmccStreamEvent& t) { t.iSession = 0x5A; },
+      [&](RavelCDsmccStreamEvent& copy, const TraceLines&) {
+        EXPECT_EQ((std::vector<int>{0x5A, 0x3D, static_cast<int>(section.size() - 3), 3}),
+                  (std::vector<int>{copy.iSession, copy.iTableId, copy.iSectionLength, copy.iVersionNumber}));
+        EXPECT_STREQ(kName, copy.sTableName.GetString());
+        EXPECT_EQ((std::vector<int>{9}), Held(copy));
+      });
+  // Only the source's parse builds an NPT reference: the copies copy theirs.
+  EXPECT_EQ((TraceLines{kEmptyNpt}), recorder.Lines());
+  // The target's descriptors are released before the source is read.
+  RavelCDsmccStreamEvent self(section.data());
+  self = self;
+  EXPECT_EQ((std::vector<int>{-1}), Held(self));
 }
 
 TEST(StreamEventTable, GeneralEventGetterPanicsOutOfRangeAndGivesNull) {
