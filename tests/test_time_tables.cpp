@@ -11,6 +11,7 @@
 #include "Ravel_CTableTOT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -148,26 +149,17 @@ TEST(TimeTablesParse, NullClearsAndForeignTableIdsKeepTheEarlierTime) {
   }
 }
 
+// Constructed over null, or over each other's section (only the table_id is
+// stored), both hold zeros and no name.
 TEST(TimeTablesParse, ConstructedOverNullOrAForeignSectionHoldsZeros) {
   Bytes tot = TotSection(sb::UtcTime(2020, 4, 5, 0, 0, 0), {});
   Bytes tdt = TdtSection(sb::UtcTime(2020, 4, 5, 0, 0, 0));
-  struct Case {
-    unsigned char* forTdt;
-    unsigned char* forTot;
-    int tdtTableId;
-    int totTableId;
-  } cases[] = {
-      {/*forTdt=*/nullptr, /*forTot=*/nullptr, 0, 0},
-      // Each given the other's section: only the table_id is stored.
-      {tot.data(), tdt.data(), 0x73, 0x70},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.tdtTableId);
-    RavelCTDT timeDate(c.forTdt);
-    RavelCTOT timeOffset(c.forTot);
+  for (bool foreign : {false, true}) {
+    RavelCTDT timeDate(foreign ? tot.data() : nullptr);
+    RavelCTOT timeOffset(foreign ? tdt.data() : nullptr);
     Ints tdtFields(9, 0), totFields(10, 0);
-    tdtFields[0] = c.tdtTableId;
-    totFields[0] = c.totTableId;
+    tdtFields[0] = foreign ? 0x73 : 0;
+    totFields[0] = foreign ? 0x70 : 0;
     EXPECT_EQ(tdtFields, Fields(timeDate));
     EXPECT_EQ(totFields, Fields(timeOffset));
     EXPECT_TRUE(timeDate.sTableName.IsEmpty());
@@ -228,27 +220,22 @@ TEST(TOTCopy, CopiesAreDeepAndSelfAssignmentDropsTheDescriptor) {
   Bytes with = TotSection(sb::UtcTime(2019, 1, 22, 12, 51, 9),
                           {LocalTimeOffsetDescriptor({LocalTimeOffset("FRA", 0, 1), LocalTimeOffset("ESP", 3, 1)})});
   Bytes without = TotSection(sb::UtcTime(2020, 4, 5, 0, 0, 0), {});
-  std::unique_ptr<RavelCTOT> source(new RavelCTOT(with.data()));
-  const Ints fields = Fields(*source);
-  RavelCTOT constructed(*source);
-  RavelCTOT assigned(without.data());
-  assigned = *source;
-  source.reset();
-  for (RavelCTOT* copy : {&constructed, &assigned}) {
-    EXPECT_STREQ("TOT", copy->sTableName.GetString());
-    EXPECT_EQ(fields, Fields(*copy));
-    EXPECT_EQ("FRA ESP ", KeptOffsets(*copy));
-    EXPECT_EQ(3, copy->pLocalTimeOffsetDescriptor->GetLocalTimeOffset(1)->GetCountryRegionId());
-  }
+  const Ints fields = Fields(RavelCTOT(with.data()));
+  tcc::ExpectCopies<RavelCTOT>(with.data(), without.data(), [](RavelCTOT&) {}, [&](RavelCTOT& copy, const TraceLines&) {
+    EXPECT_STREQ("TOT", copy.sTableName.GetString());
+    EXPECT_EQ(fields, Fields(copy));
+    EXPECT_EQ("FRA ESP ", KeptOffsets(copy));
+    EXPECT_EQ(3, copy.pLocalTimeOffsetDescriptor->GetLocalTimeOffset(1)->GetCountryRegionId());
+  });
   // Assigning a table without a descriptor removes the target's.
-  RavelCTOT empty(without.data());
-  constructed = empty;
-  EXPECT_EQ("-", KeptOffsets(constructed));
+  RavelCTOT target(with.data()), empty(without.data());
+  target = empty;
+  EXPECT_EQ("-", KeptOffsets(target));
   // Assigning a table to itself releases its descriptor before reading it.
-  RavelCTOT& alias = assigned;
-  assigned = alias;
-  EXPECT_EQ("-", KeptOffsets(assigned));
-  EXPECT_EQ(fields, Fields(assigned));
+  RavelCTOT self(with.data());
+  self = self;
+  EXPECT_EQ("-", KeptOffsets(self));
+  EXPECT_EQ(fields, Fields(self));
 }
 
 TEST(TimeTablesShow, ExactDumps) {
