@@ -75,15 +75,10 @@ std::vector<unsigned int> ServiceIdsOf(RavelCSDT& sdt) {
   return ids;
 }
 
-std::string NameOf(RavelCServiceDescription* service) {
-  if (service->GetService() == nullptr || service->GetService()->GetServiceName() == nullptr) return "<none>";
-  return service->GetService()->GetServiceName();
-}
-
 // The descriptors a service holds: "service:NAME logo:ID countries:N", each part when present.
 std::string Kept(RavelCServiceDescription& service) {
   std::string kept;
-  if (service.GetService()) kept += "service:" + NameOf(&service);
+  if (service.GetService()) kept += "service:" + std::string(service.GetService()->GetServiceName());
   if (service.GetLogoTransmission()) kept += " logo:" + std::to_string(service.GetLogoTransmission()->GetLogoId());
   if (service.GetCountryAvailability()) {
     kept += " countries:" + std::to_string(service.GetCountryAvailability()->GetNumOfCountryCodes());
@@ -95,32 +90,42 @@ std::string Kept(RavelCServiceDescription& service) {
 
 // The entry constructor's initial flag values are never seen: every parse,
 // a null one included, writes all of them.
-TEST(ServiceDescription, DecodesFlagsAndStatusFromTheirOwnBits) {
+TEST(ServiceDescription, DecodesFlagsFromTheirOwnBitsAndKeepsTheLastOfEachDescriptor) {
   struct Case {
+    const char* label;
     Bytes entry;
-    unsigned short id;
-    unsigned char companyDef, schedule, presentFollowing, running, freeCA;
-    unsigned short loopLength;
+    int result;
+    std::vector<int> fields;  // id, EIT company flag, schedule, present/following, running, free CA, loop length
+    std::string kept;
   } cases[] = {
-      {Bytes{0x48, 0x00, 0xFF, 0xF0, 0x00}, 0x4800, 7, 1, 1, 7, 1, 0},
-      {Bytes{0x49, 0x80, 0xE5, 0x30, 0x00}, 0x4980, 1, 0, 1, 1, 1, 0},
-      {Bytes{0xFF, 0xFF, 0x1E, 0x40, 0x00}, 0xFFFF, 7, 1, 0, 2, 0, 0},
+      {"all flags set", Bytes{0x48, 0x00, 0xFF, 0xF0, 0x00}, kRavelOk, {0x4800, 7, 1, 1, 7, 1, 0}, ""},
+      {"each flag alone", Bytes{0x49, 0x80, 0xE5, 0x30, 0x00}, kRavelOk, {0x4980, 1, 0, 1, 1, 1, 0}, ""},
+      {"reserved bits clear", Bytes{0xFF, 0xFF, 0x1E, 0x40, 0x00}, kRavelOk, {0xFFFF, 7, 1, 0, 2, 0, 0}, ""},
       // A loop of 0xF03 bytes: one descriptor of 3 bytes, fifteen of 256.
-      {sb::Cat({Bytes{0x12, 0x34, 0xE2, 0xFF, 0x03, 0xC1, 0x01, 0x84}, Bytes(15 * 256, 0xFF)}), 0x1234, 0, 1, 0, 7, 1,
-       0xF03},
+      {"a 12-bit loop length", sb::Cat({Bytes{0x12, 0x34, 0xE2, 0xFF, 0x03, 0xC1, 0x01, 0x84}, Bytes(15 * 256, 0xFF)}),
+       kRavelOk, {0x1234, 0, 1, 0, 7, 1, 0xF03}, ""},
+      {"all three kept",
+       ServiceEntry(Service(0x4800, {ServiceDescriptor(1, "", "A"), LogoType1(3, 1, 2), CountryAvailability("BRA")})),
+       kRavelOk, {0x4800, 0, 1, 1, 4, 0, 21}, "service:A logo:3 countries:1"},
+      {"later logo and country replace earlier ones",
+       ServiceEntry(Service(0x4801, {LogoType1(3, 1, 2), CountryAvailability("BRA"), LogoType1(9, 1, 2),
+                                     CountryAvailability("JPNBRA")})),
+       kRavelOk, {0x4801, 0, 1, 1, 4, 0, 33}, "logo:9 countries:2"},
+      {"length 0 clears everything read",
+       ServiceEntry(Service(0x4802, {ServiceDescriptor(1, "", "A"), LogoType1(3, 1, 2), sb::Descriptor(0x49, {})})),
+       kRavelErrCorruptSection, {0, 0, 0, 0, 0, 0, 0}, ""},
+      {"null", Bytes(), kRavelErrInvalidArgument, {0, 0, 0, 0, 0, 0, 0}, ""},
   };
   for (const Case& c : cases) {
-    SCOPED_TRACE(c.id);
+    SCOPED_TRACE(c.label);
     Bytes entry = c.entry;
     RavelCServiceDescription service(nullptr);
-    service.ParseRawData(entry.data());
-    EXPECT_EQ(c.id, service.GetServiceId());
-    EXPECT_EQ(c.companyDef, service.GetEITCompanyDefFlag());
-    EXPECT_EQ(c.schedule, service.GetEITScheduleFlag());
-    EXPECT_EQ(c.presentFollowing, service.GetEITPresentFollowingFlag());
-    EXPECT_EQ(c.running, service.GetRunningStatus());
-    EXPECT_EQ(c.freeCA, service.GetFreeCAMode());
-    EXPECT_EQ(c.loopLength, service.GetDescriptorsLoopLength());
+    EXPECT_EQ(c.result, service.ParseRawData(entry.empty() ? nullptr : entry.data()));
+    EXPECT_EQ(c.fields, (std::vector<int>{service.GetServiceId(), service.GetEITCompanyDefFlag(),
+                                           service.GetEITScheduleFlag(), service.GetEITPresentFollowingFlag(),
+                                           service.GetRunningStatus(), service.GetFreeCAMode(),
+                                           service.GetDescriptorsLoopLength()}));
+    EXPECT_EQ(c.kept, Kept(service));
   }
 }
 
@@ -205,36 +210,6 @@ TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAM
     EXPECT_EQ(c.result == kRavelOk ? 0x0006 : 0, sdt.GetOriginalNetworkId());
     EXPECT_STREQ("SDT Actual", sdt.sTableName.GetString());
   }
-}
-
-TEST(ServiceDescription, MalformedLoopClearsTheServiceAndLaterDescriptorsReplaceEarlierOnes) {
-  struct Case {
-    const char* label;
-    ServiceDef entryDef;
-    int result;
-    std::vector<int> fields;  // id, running status, schedule flag, loop length
-    std::string kept;
-  } cases[] = {
-      {"all three kept", Service(0x4800, {ServiceDescriptor(1, "", "A"), LogoType1(3, 1, 2), CountryAvailability("BRA")}),
-       kRavelOk, {0x4800, 4, 1, 21}, "service:A logo:3 countries:1"},
-      {"later logo and country replace earlier ones",
-       Service(0x4801, {LogoType1(3, 1, 2), CountryAvailability("BRA"), LogoType1(9, 1, 2), CountryAvailability("JPNBRA")}),
-       kRavelOk, {0x4801, 4, 1, 33}, "logo:9 countries:2"},
-      {"length 0 clears everything read",
-       Service(0x4802, {ServiceDescriptor(1, "", "A"), LogoType1(3, 1, 2), sb::Descriptor(0x49, {})}),
-       kRavelErrCorruptSection, {0, 0, 0, 0}, ""},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    Bytes entry = ServiceEntry(c.entryDef);
-    RavelCServiceDescription service(nullptr);
-    EXPECT_EQ(c.result, service.ParseRawData(entry.data()));
-    EXPECT_EQ(c.fields, (std::vector<int>{service.GetServiceId(), service.GetRunningStatus(),
-                                           service.GetEITScheduleFlag(), service.GetDescriptorsLoopLength()}));
-    EXPECT_EQ(c.kept, Kept(service));
-  }
-  RavelCServiceDescription service(nullptr);
-  EXPECT_EQ(kRavelErrInvalidArgument, service.ParseRawData(nullptr));
 }
 
 TEST(SDTMerge, AppendsCopiesOfTheOthersServicesOnlyWhenTheVersionsMatch) {
