@@ -181,29 +181,18 @@ TEST(BITLoops, FirstLoopIsOnlyTracedAndEachRecordKeepsItsFirstDescriptor) {
 }
 
 TEST(BITBroadcasterLoop, RecordParseClearsOnFailureAndReleasesOnReparse) {
-  Bytes badTag = Cat({U8(0x09), Length12(3), Descriptor(0x00, {0x01})});
+  Bytes recordA = kRecordA, badTag = Cat({U8(0x09), Length12(3), Descriptor(0x00, {0x01})});
   Bytes other = Record(0x0A, {SiParameter()});
-  struct Case {
-    const char* label;
-    Bytes* record;
-    int result;
-    TraceLines traces;
-    std::string summary;
-  } cases[] = {
-      {"null clears both fields", nullptr, kRavelErrInvalidArgument, {}, "id=0x00 len=0"},
-      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}}, "id=0x00 len=0"},
-      {"another tag releases the held descriptor", &other, kRavelOk, {RecordUnknown(0xD7)},
-       "id=0x0a len=4"},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCBroadcasterDescriptor record(const_cast<uint8_t*>(kRecordA.data()));
-    ASSERT_EQ(kSummaryA, Summary(record));
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, record.ParseRawData(c.record ? c.record->data() : nullptr));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(c.summary, Summary(record));
-  }
+  RavelCBroadcasterDescriptor record(recordA.data());
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelOk, record.ParseRawData(other.data()));
+  EXPECT_EQ("id=0x0a len=4", Summary(record));  // another tag releases the held descriptor
+  EXPECT_EQ(kRavelErrCorruptSection, record.ParseRawData(badTag.data()));
+  EXPECT_EQ("id=0x00 len=0", Summary(record));
+  EXPECT_EQ((TraceLines{RecordUnknown(0xD7), {kWarning, Invalid(0x00, 1)}}), recorder.Lines());
+  ASSERT_EQ(kRavelOk, record.ParseRawData(recordA.data()));
+  EXPECT_EQ(kRavelErrInvalidArgument, record.ParseRawData(nullptr));
+  EXPECT_EQ("id=0x00 len=0", Summary(record));
 }
 
 TEST(BITMerge, AppendsCopiesOfEveryRecordWithoutComparingAnything) {

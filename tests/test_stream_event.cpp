@@ -67,7 +67,6 @@ TEST(StreamEventTable, ChecksTheCrcOnlyWhenTheSyntaxIndicatorIsOne) {
       {/*syntaxIndicator=*/true, /*corruptCrc=*/false, kRavelOk, {}, kName, {-1, 7}},
       {true, true, kRavelErrCorruptSection, {{kWarning, "Stream Descriptor Event: CRC Error!\n"}}, "", {-1}},
       // A checksum instead of a CRC: reported as unchecked, never verified.
-      {false, false, kRavelOk, unchecked, kName, {-1, 7}},
       {false, true, kRavelOk, unchecked, kName, {-1, 7}},
   };
   for (const Case& c : cases) {
