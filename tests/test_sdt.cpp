@@ -218,31 +218,21 @@ TEST(SDTMerge, AppendsCopiesOfTheOthersServicesOnlyWhenTheVersionsMatch) {
                                   Service(0x4800)},
                                  0x46, 5, 0x0640);
   Bytes otherVersion = SdtSection({Service(0x4990)}, 0x42, 6, 0x7ED0);
-  struct Case {
-    const char* label;
-    Bytes* other;  // null: the target itself
-    TraceLines traces;
-    std::vector<unsigned int> ids;
-  } cases[] = {
-      {"same version: appended, duplicates included", &sameVersion, {}, {0x4800, 0x4801, 0x4980, 0x4800}},
-      {"other version: unchanged", &otherVersion,
-       {{kError, "Two SDT Information have different information! first one=[5], second one=[6]\n"}}, {0x4800, 0x4801}},
-      {"with itself: doubled once", nullptr, {}, {0x4800, 0x4801, 0x4800, 0x4801}},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCSDT target(first.data());
-    std::unique_ptr<RavelCSDT> other(new RavelCSDT(c.other ? c.other->data() : first.data()));
-    TraceRecorder recorder;
-    RavelCSDT& result = c.other ? (target += *other) : (target += target);
-    EXPECT_EQ(&target, &result);
-    EXPECT_EQ(c.traces, recorder.Lines());
-    other.reset();  // the appended services are the target's own copies
-    EXPECT_EQ(c.ids, ServiceIdsOf(target));
-    EXPECT_STREQ("SDT Actual", target.sTableName.GetString());
-    EXPECT_EQ(0x7E, target.GetOriginalNetworkId());
-    EXPECT_EQ(0x7ED0, target.iTableIdExtension);
-  }
+  RavelCSDT target(first.data());
+  std::unique_ptr<RavelCSDT> other(new RavelCSDT(sameVersion.data()));
+  RavelCSDT refused(otherVersion.data());
+  TraceRecorder recorder;
+  EXPECT_EQ(&target, &(target += *other));  // appended, duplicates included
+  other.reset();                            // the appended services are the target's own copies
+  EXPECT_EQ(&target, &(target += refused));
+  EXPECT_EQ((TraceLines{{kError, "Two SDT Information have different information! first one=[5], second one=[6]\n"}}),
+            recorder.Lines());
+  target += target;  // doubled once
+  EXPECT_EQ((std::vector<unsigned int>{0x4800, 0x4801, 0x4980, 0x4800, 0x4800, 0x4801, 0x4980, 0x4800}),
+            ServiceIdsOf(target));
+  EXPECT_STREQ("SDT Actual", target.sTableName.GetString());
+  EXPECT_EQ(0x7E, target.GetOriginalNetworkId());
+  EXPECT_EQ(0x7ED0, target.iTableIdExtension);
 }
 
 TEST(SDTCopy, CopiesHeaderNameNetworkIdAndEveryService) {
