@@ -35,9 +35,9 @@ const std::string kParseFail = "EIT Info Parsing Fail! Maybe data has been corru
 // ---------------------------------------------------------------------------
 // Builders
 
-Bytes ShortEvent(const std::string& name, const std::string& text = "", const std::string& language = "jpn") {
-  return sb::Descriptor(
-      0x4D, sb::Cat({sb::Text(language), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()), sb::Text(text)}));
+Bytes ShortEvent(const std::string& name, const std::string& text = "") {
+  return sb::Descriptor(0x4D,
+                        sb::Cat({sb::Text("jpn"), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()), sb::Text(text)}));
 }
 
 Bytes ExtendedEvent(unsigned int number, unsigned int last, const std::string& text) {
@@ -46,9 +46,8 @@ Bytes ExtendedEvent(unsigned int number, unsigned int last, const std::string& t
 }
 
 // stream_content 2 (audio), main component, quality 1, sampling rate 7.
-Bytes AudioComponent(uint8_t componentTag, const std::string& language = "jpn") {
-  return sb::Descriptor(0xC4, sb::Cat({sb::U8(0xF2), sb::U8(0x03), sb::U8(componentTag), sb::U8(0x0F), sb::U8(0xFF),
-                                       sb::U8(0x5F), sb::Text(language)}));
+Bytes AudioComponent(uint8_t componentTag) {
+  return sb::Descriptor(0xC4, sb::Cat({Bytes{0xF2, 0x03, componentTag, 0x0F, 0xFF, 0x5F}, sb::Text("jpn")}));
 }
 
 Bytes Component(uint8_t componentTag) {
@@ -62,8 +61,7 @@ Bytes ParentalRating(uint8_t rating) { return sb::Descriptor(0x55, sb::Cat({sb::
 Bytes Copyright(uint32_t id) { return sb::Descriptor(0x0D, sb::Cat({sb::U32(id), sb::Text("(c)")})); }
 
 Bytes Series(uint16_t seriesId, const std::string& name) {
-  return sb::Descriptor(0xD5,
-                        sb::Cat({sb::U16(seriesId), sb::U8(0x11), sb::U16(0xE4CD), sb::U24(0x001002), sb::Text(name)}));
+  return sb::Descriptor(0xD5, sb::Cat({sb::U16(seriesId), Bytes{0x11, 0xE4, 0xCD, 0x00, 0x10, 0x02}, sb::Text(name)}));
 }
 
 Bytes DigitalCopyControl() { return sb::Descriptor(0xC1, sb::U8(0x84)); }
@@ -146,21 +144,15 @@ std::vector<int> EventIds(RavelCEIT& eit) {
 
 // One line naming what an event holds, kind by kind, in the dump order.
 std::string Holdings(RavelCEventInfo& e) {
-  std::string s;
-  if (e.pShortEventDescriptor) s += "short:" + std::string(e.pShortEventDescriptor->GetEventName()) + " ";
-  if (e.pContentDescriptor) s += "content:" + std::to_string(e.pContentDescriptor->pGenre[0]) + " ";
-  if (e.pComponentDescriptor) s += "component:" + std::to_string(e.pComponentDescriptor->GetComponentTag()) + " ";
-  if (e.pParentalRatingDescriptor) {
-    s += "rating:" + std::to_string(e.pParentalRatingDescriptor->GetParentalRating(0)->GetMinimumAge()) + " ";
-  }
-  for (int i = 0; i < e.GetAudioComponentCount(); ++i) {
-    s += "audio:" + std::to_string(e.GetAudioComponent(i)->GetComponentTag()) + " ";
-  }
-  if (e.pCopyrightDescriptor) s += "copyright:" + std::to_string(e.pCopyrightDescriptor->GetCopyrightId()) + " ";
-  if (e.pExtendedEventDescriptor) {
-    s += "extended:" + std::to_string(e.pExtendedEventDescriptor->GetDescriptorNumber()) + " ";
-  }
-  if (e.pSeriesDescriptor) s += "series:" + std::to_string(e.pSeriesDescriptor->GetSeriesId()) + " ";
+  std::string s = e.pShortEventDescriptor ? "short:" + std::string(e.pShortEventDescriptor->GetEventName()) + " " : "";
+  auto add = [&](const char* kind, int value) { s += kind + std::to_string(value) + " "; };
+  if (e.pContentDescriptor) add("content:", e.pContentDescriptor->pGenre[0]);
+  if (e.pComponentDescriptor) add("component:", e.pComponentDescriptor->GetComponentTag());
+  if (e.pParentalRatingDescriptor) add("rating:", e.pParentalRatingDescriptor->GetParentalRating(0)->GetMinimumAge());
+  for (int i = 0; i < e.GetAudioComponentCount(); ++i) add("audio:", e.GetAudioComponent(i)->GetComponentTag());
+  if (e.pCopyrightDescriptor) add("copyright:", e.pCopyrightDescriptor->GetCopyrightId());
+  if (e.pExtendedEventDescriptor) add("extended:", e.pExtendedEventDescriptor->GetDescriptorNumber());
+  if (e.pSeriesDescriptor) add("series:", e.pSeriesDescriptor->GetSeriesId());
   return s;
 }
 

@@ -45,14 +45,11 @@ Ints DateOf(const Table& t) {
 
 // table_id, syntax indicator, section_length, (descriptors_loop_length,) date.
 Ints Fields(const RavelCTDT& t) {
-  Ints f = {t.iTableId, t.bSectionSyntaxIndicator, t.iSectionLength};
-  for (int v : DateOf(t)) f.push_back(v);
-  return f;
+  return {t.iTableId, t.bSectionSyntaxIndicator, t.iSectionLength, t.iYear, t.iMonth, t.iDay, t.iHour, t.iMinute, t.iSecond};
 }
 Ints Fields(const RavelCTOT& t) {
-  Ints f = {t.iTableId, t.bSectionSyntaxIndicator, t.iSectionLength, t.iDescriptorsLoopLength};
-  for (int v : DateOf(t)) f.push_back(v);
-  return f;
+  return {t.iTableId, t.bSectionSyntaxIndicator, t.iSectionLength, t.iDescriptorsLoopLength, t.iYear, t.iMonth,
+          t.iDay, t.iHour, t.iMinute, t.iSecond};
 }
 
 // Country codes of the entries of the kept descriptor, "-" when there is none.
@@ -60,8 +57,7 @@ std::string KeptOffsets(RavelCTOT& tot) {
   if (tot.pLocalTimeOffsetDescriptor == nullptr) return "-";
   std::string s;
   for (int i = 0; i < tot.pLocalTimeOffsetDescriptor->GetNumOfLocalTimeOffsets(); ++i) {
-    s += tot.pLocalTimeOffsetDescriptor->GetLocalTimeOffset(i)->GetCountryCode();
-    s += " ";
+    s += std::string(tot.pLocalTimeOffsetDescriptor->GetLocalTimeOffset(i)->GetCountryCode()) + " ";
   }
   return s;
 }
