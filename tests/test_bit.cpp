@@ -51,8 +51,7 @@ Bytes Record(uint8_t broadcasterId, const std::vector<Bytes>& descriptors) {
 Bytes BitBody(bool viewPropriety, const std::vector<Bytes>& firstDescriptors, const std::vector<Bytes>& records) {
   Bytes first = Cat(firstDescriptors);
   // 3 reserved bits, broadcaster_view_propriety, then the 12-bit length.
-  Bytes body = Length12(static_cast<unsigned int>(first.size()), viewPropriety ? 0xF : 0xE);
-  return Cat({body, first, Cat(records)});
+  return Cat({Length12(static_cast<unsigned int>(first.size()), viewPropriety ? 0xF : 0xE), first, Cat(records)});
 }
 
 Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3, uint8_t tableId = 0xC4) {

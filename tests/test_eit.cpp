@@ -50,9 +50,7 @@ Bytes AudioComponent(uint8_t componentTag) {
   return sb::Descriptor(0xC4, sb::Cat({Bytes{0xF2, 0x03, componentTag, 0x0F, 0xFF, 0x5F}, sb::Text("jpn")}));
 }
 
-Bytes Component(uint8_t componentTag) {
-  return sb::Descriptor(0x50, sb::Cat({sb::U8(0xF1), sb::U8(0xB3), sb::U8(componentTag), sb::Text("jpn")}));
-}
+Bytes Component(uint8_t tag) { return sb::Descriptor(0x50, sb::Cat({Bytes{0xF1, 0xB3, tag}, sb::Text("jpn")})); }
 
 Bytes Content(uint8_t genre) { return sb::Descriptor(0x54, sb::Cat({sb::U8(genre), sb::U8(0xFF)})); }
 
@@ -85,9 +83,7 @@ Bytes At(int year, int month, int day, int hour, int minute, int second = 0) {
   return sb::UtcTime(year, month, day, hour, minute, second);
 }
 
-Bytes Duration(int hours, int minutes, int seconds = 0) {
-  return Bytes{sb::Bcd(hours), sb::Bcd(minutes), sb::Bcd(seconds)};
-}
+Bytes Duration(int hours, int minutes, int seconds = 0) { return Bytes{sb::Bcd(hours), sb::Bcd(minutes), sb::Bcd(seconds)}; }
 
 // An event at `start` lasting 30 minutes, with descriptors.
 EventRecord Ev(uint16_t eventId, const Bytes& start, const std::vector<Bytes>& descriptors = {}) {
@@ -154,10 +150,6 @@ std::string Holdings(RavelCEventInfo& e) {
   if (e.pExtendedEventDescriptor) add("extended:", e.pExtendedEventDescriptor->GetDescriptorNumber());
   if (e.pSeriesDescriptor) add("series:", e.pSeriesDescriptor->GetSeriesId());
   return s;
-}
-
-std::vector<unsigned int> FourFields(RavelCEIT& eit) {
-  return {eit.iTransportStreamId, eit.iOriginalNetworkId, eit.iSegmentLastSectionNumber, eit.iLastTableId};
 }
 
 }  // namespace
@@ -372,7 +364,9 @@ TEST(EITParse, AcceptsItsTableIdsAndFailuresClearTheEventsAndBodyFields) {
     EXPECT_STREQ(c.name, eit.sTableName.GetString());
     EXPECT_EQ(c.eitTableId, eit.iEITTableId);
     const bool ok = c.result == kRavelOk;
-    EXPECT_EQ((ok ? std::vector<unsigned int>{0x1111, 0x2222, 8, 0x51} : std::vector<unsigned int>(4, 0)), FourFields(eit));
+    EXPECT_EQ((ok ? std::vector<int>{0x1111, 0x2222, 8, 0x51} : std::vector<int>(4, 0)),
+              (std::vector<int>{eit.iTransportStreamId, eit.iOriginalNetworkId, eit.iSegmentLastSectionNumber,
+                                eit.iLastTableId}));
     EXPECT_EQ((ok ? std::vector<int>{2, 3} : std::vector<int>{}), EventIds(eit));
   }
 }

@@ -35,9 +35,7 @@ Bytes ServiceEntry(const ServiceDef& s) {
 }
 
 // A service with the flags of a running free service: only id and descriptors vary.
-ServiceDef Service(uint16_t id, const std::vector<Bytes>& descriptors = {}) {
-  return ServiceDef{id, 0, true, true, 4, false, descriptors};
-}
+ServiceDef Service(uint16_t id, const std::vector<Bytes>& descriptors = {}) { return {id, 0, true, true, 4, false, descriptors}; }
 
 sb::SectionOptions SdtOptions(uint8_t tableId = 0x42, uint8_t version = 2, uint16_t transportStreamId = 0x7ED0) {
   sb::SectionOptions options;
@@ -65,9 +63,7 @@ Bytes ServiceDescriptor(uint8_t type, const std::string& provider, const std::st
 Bytes LogoType1(uint16_t logoId, uint16_t version, uint16_t downloadId) {
   return sb::Descriptor(0xCF, sb::Cat({sb::U8(1), sb::U16(0xFE00 | logoId), sb::U16(0xF000 | version), sb::U16(downloadId)}));
 }
-Bytes CountryAvailability(const std::string& codes) {
-  return sb::Descriptor(0x49, sb::Cat({sb::U8(0xFF), sb::Text(codes)}));
-}
+Bytes CountryAvailability(const std::string& codes) { return sb::Descriptor(0x49, sb::Cat({sb::U8(0xFF), sb::Text(codes)})); }
 
 std::vector<unsigned int> ServiceIdsOf(RavelCSDT& sdt) {
   std::vector<unsigned int> ids;

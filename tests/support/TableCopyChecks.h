@@ -13,7 +13,8 @@
 namespace tcc {
 
 // `prepare` sets what no parse writes; the source is gone before `check(copy,
-// sourceDump)` runs, so whatever a copy still reads is its own.
+// sourceDump)` runs, the constructed copy first, so whatever a copy still reads
+// is its own.
 template <class T, class Prepare, class Check>
 void ExpectCopies(unsigned char* source, unsigned char* over, Prepare prepare, Check check) {
   std::unique_ptr<T> original(new T(source));
