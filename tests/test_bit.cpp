@@ -9,6 +9,8 @@
 #include "Ravel_CTableBIT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableChecks.h"
+#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -24,17 +26,16 @@ using sb::U8;
 
 const char kInfoFail[] = "BIT Info Parsing Fail! Maybe data has been corrupted!\n";
 
-std::string FirstLoopUnknown(int tag) {
+// An unknown tag: every tag of the first loop, at the BIT level, and a record's
+// first descriptor, as a warning.
+TraceLines::value_type Unknown(bool firstLoop, int tag) {
   char text[96];
-  std::snprintf(text, sizeof(text), "First Descriptor Loop.. Unkown Descriptor Tag=[0x%02x]\n", tag);
-  return text;
+  std::snprintf(text, sizeof(text), "%s Unkown Descriptor Tag=[0x%02x]\n",
+                firstLoop ? "First Descriptor Loop.." : "BIT BroadcasterDescriptor Parsing..", tag);
+  return {firstLoop ? kBit : kWarning, text};
 }
-
-std::string RecordUnknown(int tag) {
-  char text[96];
-  std::snprintf(text, sizeof(text), "BIT BroadcasterDescriptor Parsing.. Unkown Descriptor Tag=[0x%02x]\n", tag);
-  return text;
-}
+TraceLines::value_type FirstLoopUnknown(int tag) { return Unknown(true, tag); }
+TraceLines::value_type RecordUnknown(int tag) { return Unknown(false, tag); }
 
 // Extended broadcaster descriptor of type 1 with one broadcaster entry and no affiliations.
 Bytes ExtBroadcaster(unsigned int terrestrialId, unsigned int onid = 0x7FE1, uint8_t broadcasterId = 0x05) {
@@ -50,8 +51,7 @@ Bytes Record(uint8_t broadcasterId, const std::vector<Bytes>& descriptors) {
 Bytes BitBody(bool viewPropriety, const std::vector<Bytes>& firstDescriptors, const std::vector<Bytes>& records) {
   Bytes first = Cat(firstDescriptors);
   // 3 reserved bits, broadcaster_view_propriety, then the 12-bit length.
-  Bytes body = Length12(static_cast<unsigned int>(first.size()), viewPropriety ? 0xF : 0xE);
-  return Cat({body, first, Cat(records)});
+  return Cat({Length12(static_cast<unsigned int>(first.size()), viewPropriety ? 0xF : 0xE), first, Cat(records)});
 }
 
 Bytes BitSection(const Bytes& body, uint16_t originalNetworkId = 0x7FE1, uint8_t version = 3, uint8_t tableId = 0xC4) {
@@ -95,18 +95,18 @@ TEST(BITParse, KeepsTheExtendedBroadcasterOfEachRecordAndTracesTheFirstLoop) {
   Bytes section = BitSection(BitBody(true, {SiParameter()}, {kRecordA, kRecordB}));
   TraceRecorder recorder;
   RavelCBIT bit(section.data());
-  EXPECT_EQ((TraceLines{{kBit, FirstLoopUnknown(0xD7)}}), recorder.Lines());
+  EXPECT_EQ((TraceLines{FirstLoopUnknown(0xD7)}), recorder.Lines());
   EXPECT_STREQ("BIT", bit.sTableName.GetString());
   EXPECT_EQ((std::vector<int>{0x7FE1, 3, 1, 4, 2}), Header(bit));
   EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Records(bit));
-  RavelCExtendedBroadcasterDescriptor* ext = bit.GetBroadcaster(0)->GetExtendedBroadcaster();
-  EXPECT_EQ(1, ext->GetBroadcasterType());
-  EXPECT_EQ(1, ext->GetNumberOfBroadcasterIds());
-  EXPECT_EQ(0x7FE1, ext->GetOriginalNetworkId(0));
-  EXPECT_EQ(0x05, ext->GetBroadcasterId(0));
+  EXPECT_EQ(0x05, bit.GetBroadcaster(0)->GetExtendedBroadcaster()->GetBroadcasterId(0));
 }
 
 TEST(BITParse, RefusesNullBadCrcAndForeignTableIds) {
+  RavelCBIT empty(nullptr);  // constructed over null: all zero, no name
+  EXPECT_EQ((std::vector<int>{0, 0, 0, 0, 0}), Header(empty));
+  EXPECT_TRUE(empty.sTableName.IsEmpty());
+
   Bytes good = BitSection(BitBody(true, {SiParameter()}, {kRecordA}));
   sb::SectionOptions bad;
   bad.tableId = 0xC4;
@@ -116,72 +116,17 @@ TEST(BITParse, RefusesNullBadCrcAndForeignTableIds) {
   Bytes nitId = BitSection(BitBody(false, {}, {kRecordB}), 0x1234, 3, 0x40);
   bad.tableId = 0x00;
   Bytes bothBad = sb::LongSection(bad, BitBody(false, {}, {kRecordB}));
-  struct Case {
-    const char* label;
-    Bytes* section;
-    int result;
-    TraceLines traces;
-    unsigned char tableId;
-    unsigned short extension;
-  } cases[] = {
-      {"null", nullptr, kRavelErrInvalidArgument, {}, 0xC4, 0x7FE1},
-      {"bad CRC: the header is not read", &badCrc, kRavelErrCorruptSection, {{kWarning, "BIT Section: CRC Error!\n"}},
-       0xC4, 0x7FE1},
-      {"NIT table_id: the header is read", &nitId, kRavelErrInvalidArgument,
-       {{kError, "Table ID isn't for BIT! Table ID=[0x40]\n"}}, 0x40, 0x1234},
-      {"the CRC is checked before the table_id", &bothBad, kRavelErrCorruptSection,
-       {{kWarning, "BIT Section: CRC Error!\n"}}, 0xC4, 0x7FE1},
-  };
-  RavelCBIT empty(nullptr);  // constructed over null: all zero, no name
-  EXPECT_EQ((std::vector<int>{0, 0, 0, 0, 0}), Header(empty));
-  EXPECT_TRUE(empty.sTableName.IsEmpty());
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCBIT bit(good.data());
-    ASSERT_EQ(1, bit.GetBroadcasterCount());
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, bit.ParseRawData(c.section ? c.section->data() : nullptr));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(c.tableId, bit.iTableId);
-    // The body fields belong to the last accepted section.
-    EXPECT_EQ((std::vector<int>{c.extension, 3, 1, 4, 0}), Header(bit));
-    EXPECT_STREQ("BIT", bit.sTableName.GetString());
-  }
+  // Only a foreign table_id's header is read; the body fields belong to the last accepted section.
+  tc::ExpectRefusals<RavelCBIT>(good, tc::Refusals("BIT", badCrc, nitId, "0x40", bothBad),
+                                [&](RavelCBIT& bit, const tc::Refusal& r, TraceRecorder&) {
+                                  const bool foreign = r.section == &nitId;
+                                  EXPECT_EQ(foreign ? 0x40 : 0xC4, bit.iTableId);
+                                  EXPECT_EQ((std::vector<int>{foreign ? 0x1234 : 0x7FE1, 3, 1, 4, 0}), Header(bit));
+                                  EXPECT_STREQ("BIT", bit.sTableName.GetString());
+                                });
 }
 
-TEST(BITFirstLoop, KeepsNothingAndFailsOnlyOnTagOrLengthZero) {
-  struct Case {
-    const char* label;
-    Bytes body;
-    int result;
-    TraceLines traces;
-    unsigned short firstLength;
-    std::vector<std::string> records;
-  } cases[] = {
-      {"length 0: not walked", BitBody(false, {}, {kRecordA}), kRavelOk, {}, 0, {kSummaryA}},
-      {"every tag is traced at the BIT level, known ones too",
-       BitBody(false, {SiParameter(), ExtBroadcaster(0x0C03), Descriptor(0x40, {0x41})}, {kRecordA}), kRavelOk,
-       {{kBit, FirstLoopUnknown(0xD7)}, {kBit, FirstLoopUnknown(0xCE)}, {kBit, FirstLoopUnknown(0x40)}}, 16,
-       {kSummaryA}},
-      {"tag 0 fails the section", BitBody(false, {SiParameter(), Descriptor(0x00, {0x01})}, {kRecordA}),
-       kRavelErrCorruptSection, {{kBit, FirstLoopUnknown(0xD7)}, {kWarning, Invalid(0x00, 1)}}, 7, {}},
-      {"length 0 fails the section", BitBody(false, {Descriptor(0xD7, {})}, {kRecordA}), kRavelErrCorruptSection,
-       {{kWarning, Invalid(0xD7, 0)}}, 2, {}},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    Bytes section = BitSection(c.body);
-    RavelCBIT bit(nullptr);
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, bit.ParseRawData(section.data()));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(c.firstLength, bit.GetFirstDescriptorsLength());
-    EXPECT_EQ(c.records, Records(bit));
-    EXPECT_STREQ("BIT", bit.sTableName.GetString());
-  }
-}
-
-TEST(BITBroadcasterLoop, LooksAtTheFirstDescriptorOfEachRecordOnly) {
+TEST(BITLoops, FirstLoopIsOnlyTracedAndEachRecordKeepsItsFirstDescriptor) {
   // Descriptors length 0: the record's "first descriptor" is the next record's
   // broadcaster_id and the reserved nibble of its length, and the next record
   // starts 3 bytes on.
@@ -193,14 +138,22 @@ TEST(BITBroadcasterLoop, LooksAtTheFirstDescriptorOfEachRecordOnly) {
     TraceLines traces;
     std::vector<std::string> records;
   } cases[] = {
+      {"first loop of length 0: not walked", BitBody(false, {}, {kRecordA}), kRavelOk, {}, {kSummaryA}},
+      {"every tag of the first loop is traced, known ones too",
+       BitBody(false, {SiParameter(), ExtBroadcaster(0x0C03), Descriptor(0x40, {0x41})}, {kRecordA}), kRavelOk,
+       {FirstLoopUnknown(0xD7), FirstLoopUnknown(0xCE), FirstLoopUnknown(0x40)}, {kSummaryA}},
+      {"tag 0 in the first loop fails the section", BitBody(false, {SiParameter(), Descriptor(0x00, {0x01})}, {kRecordA}),
+       kRavelErrCorruptSection, {FirstLoopUnknown(0xD7), {kWarning, Invalid(0x00, 1)}}, {}},
+      {"length 0 in the first loop fails the section", BitBody(false, {Descriptor(0xD7, {})}, {kRecordA}),
+       kRavelErrCorruptSection, {{kWarning, Invalid(0xD7, 0)}}, {}},
       {"an extended broadcaster second, after another tag, is not kept",
        BitBody(false, {}, {Record(0x03, {Descriptor(0xC5, {0x00}), ExtBroadcaster(0x0D04)})}), kRavelOk,
-       {{kWarning, RecordUnknown(0xC5)}}, {"id=0x03 len=12"}},
+       {RecordUnknown(0xC5)}, {"id=0x03 len=12"}},
       {"a malformed second descriptor is never read",
        BitBody(false, {}, {Record(0x03, {ExtBroadcaster(0x0D04), Descriptor(0x00, {})})}), kRavelOk, {},
        {"id=0x03 len=11 ext=0x0d04"}},
       {"descriptors length 0 reads the next record's first two bytes", BitBody(false, {}, {emptyRecord, kRecordB}),
-       kRavelOk, {{kWarning, RecordUnknown(0x02)}}, {"id=0x07 len=0", kSummaryB}},
+       kRavelOk, {RecordUnknown(0x02)}, {"id=0x07 len=0", kSummaryB}},
       {"a first descriptor with tag 0 fails the section and drops earlier records",
        BitBody(false, {}, {kRecordA, Record(0x04, {Descriptor(0x00, {0x01})})}), kRavelErrCorruptSection,
        {{kWarning, Invalid(0x00, 1)}, {kWarning, kInfoFail}}, {}},
@@ -208,11 +161,11 @@ TEST(BITBroadcasterLoop, LooksAtTheFirstDescriptorOfEachRecordOnly) {
        BitBody(false, {}, {kRecordA, kRecordB, Record(0x04, {Descriptor(0xCE, {})})}), kRavelErrCorruptSection,
        {{kWarning, Invalid(0xCE, 0)}, {kWarning, kInfoFail}}, {}},
       {"section_length 11 + first_descriptors_length: no records", BitBody(true, {SiParameter()}, {}), kRavelOk,
-       {{kBit, FirstLoopUnknown(0xD7)}}, {}},
+       {FirstLoopUnknown(0xD7)}, {}},
       // first_descriptors_length 8 with 4 bytes before the CRC_32: the loop length
       // 15 - 11 - 8 wraps, and the first loop already ends with the section.
       {"a first loop past the section end leaves no records", Cat({Length12(8, 0xE), Bytes{0xD7, 0x06, 0x01, 0x02}}),
-       kRavelOk, {{kBit, FirstLoopUnknown(0xD7)}}, {}},
+       kRavelOk, {FirstLoopUnknown(0xD7)}, {}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
@@ -222,90 +175,55 @@ TEST(BITBroadcasterLoop, LooksAtTheFirstDescriptorOfEachRecordOnly) {
     EXPECT_EQ(c.result, bit.ParseRawData(section.data()));
     EXPECT_EQ(c.traces, recorder.Lines());
     EXPECT_EQ(c.records, Records(bit));
+    EXPECT_STREQ("BIT", bit.sTableName.GetString());
   }
 }
 
 TEST(BITBroadcasterLoop, RecordParseClearsOnFailureAndReleasesOnReparse) {
-  Bytes badTag = Cat({U8(0x09), Length12(3), Descriptor(0x00, {0x01})});
+  Bytes recordA = kRecordA, badTag = Cat({U8(0x09), Length12(3), Descriptor(0x00, {0x01})});
   Bytes other = Record(0x0A, {SiParameter()});
-  struct Case {
-    const char* label;
-    Bytes* record;
-    int result;
-    TraceLines traces;
-    std::string summary;
-  } cases[] = {
-      {"null clears both fields", nullptr, kRavelErrInvalidArgument, {}, "id=0x00 len=0"},
-      {"tag 0 clears both fields", &badTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}}, "id=0x00 len=0"},
-      {"another tag releases the held descriptor", &other, kRavelOk, {{kWarning, RecordUnknown(0xD7)}},
-       "id=0x0a len=4"},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCBroadcasterDescriptor record(const_cast<uint8_t*>(kRecordA.data()));
-    ASSERT_EQ(kSummaryA, Summary(record));
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, record.ParseRawData(c.record ? c.record->data() : nullptr));
-    EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(c.summary, Summary(record));
-  }
+  RavelCBroadcasterDescriptor record(recordA.data());
+  TraceRecorder recorder;
+  EXPECT_EQ(kRavelOk, record.ParseRawData(other.data()));
+  EXPECT_EQ("id=0x0a len=4", Summary(record));  // another tag releases the held descriptor
+  EXPECT_EQ(kRavelErrCorruptSection, record.ParseRawData(badTag.data()));
+  EXPECT_EQ("id=0x00 len=0", Summary(record));
+  EXPECT_EQ((TraceLines{RecordUnknown(0xD7), {kWarning, Invalid(0x00, 1)}}), recorder.Lines());
+  ASSERT_EQ(kRavelOk, record.ParseRawData(recordA.data()));
+  EXPECT_EQ(kRavelErrInvalidArgument, record.ParseRawData(nullptr));
+  EXPECT_EQ("id=0x00 len=0", Summary(record));
 }
 
 TEST(BITMerge, AppendsCopiesOfEveryRecordWithoutComparingAnything) {
   Bytes first = BitSection(BitBody(false, {}, {kRecordA, kRecordB}), 0x7FE1, 3);
   Bytes otherNetwork = BitSection(BitBody(true, {SiParameter()}, {Record(0x05, {ExtBroadcaster(0x0E05)})}), 0x0001, 9);
-  struct Case {
-    const char* label;
-    Bytes* other;
-    std::vector<std::string> records;
-  } cases[] = {
-      {"a copy of the same section doubles every record", &first, {kSummaryA, kSummaryB, kSummaryA, kSummaryB}},
-      {"another network and version mix in", &otherNetwork, {kSummaryA, kSummaryB, "id=0x05 len=9 ext=0x0e05"}},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCBIT target(first.data());
-    std::unique_ptr<RavelCBIT> other(new RavelCBIT(c.other->data()));
-    const std::vector<std::string> otherRecords = Records(*other);
-    TraceRecorder recorder;
-    RavelCBIT& result = (target += *other);
-    EXPECT_EQ(&target, &result);
-    EXPECT_TRUE(recorder.Lines().empty());
-    EXPECT_EQ(otherRecords, Records(*other));
-    other.reset();  // the merged records are copies
-    EXPECT_EQ(c.records, Records(target));
-    EXPECT_EQ((std::vector<int>{0x7FE1, 3, 0, 0, static_cast<int>(c.records.size())}), Header(target));
-  }
-  RavelCBIT self(first.data());
-  self += self;
-  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB, kSummaryA, kSummaryB}), Records(self));
+  RavelCBIT target(first.data());
+  std::unique_ptr<RavelCBIT> other(new RavelCBIT(otherNetwork.data()));
+  TraceRecorder recorder;
+  target += target;  // doubles every record once
+  EXPECT_EQ(&target, &(target += *other));  // another network and version mix in
+  other.reset();                            // the merged records are copies
+  EXPECT_TRUE(recorder.Lines().empty());
+  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB, kSummaryA, kSummaryB, "id=0x05 len=9 ext=0x0e05"}),
+            Records(target));
+  EXPECT_EQ((std::vector<int>{0x7FE1, 3, 0, 0, 5}), Header(target));
 }
 
 TEST(BITCopy, CopiesHeaderFieldsAndEveryRecordDeeply) {
   Bytes section = BitSection(BitBody(true, {SiParameter()}, {kRecordA, kRecordB}), 0x7FE2, 6);
   Bytes other = BitSection(BitBody(false, {}, {Record(0x05, {ExtBroadcaster(0x0E05)})}), 0x0001, 1);
-  std::unique_ptr<RavelCBIT> source(new RavelCBIT(section.data()));
-  source->iSession = 0x11;
-  const TraceLines shown = ShowLines(*source);
-  RavelCBIT constructed(*source);
-  RavelCBIT assigned(other.data());
-  assigned = *source;
-  source.reset();
-  EXPECT_EQ(shown, ShowLines(constructed));
-  EXPECT_EQ(shown, ShowLines(assigned));
-  EXPECT_EQ((std::vector<std::string>{kSummaryA, kSummaryB}), Records(assigned));
+  tcc::ExpectCopies<RavelCBIT>(section.data(), other.data(), [](RavelCBIT& t) { t.iSession = 0x11; },
+                               [](RavelCBIT& copy, const TraceLines& shown) { EXPECT_EQ(shown, ShowLines(copy)); });
+  Bytes record = kRecordB;
+  tcc::ExpectCopies<RavelCBroadcasterDescriptor>(record.data(), Bytes(kRecordA).data(), [](RavelCBroadcasterDescriptor&) {},
+                                                 [](RavelCBroadcasterDescriptor& copy, const TraceLines&) {
+                                                   EXPECT_EQ(kSummaryB, Summary(copy));
+                                                 });
   // The records are deleted before the copy: a table assigned to itself has none.
-  assigned = assigned;
-  EXPECT_EQ(0, assigned.GetBroadcasterCount());
-  EXPECT_EQ(4, assigned.GetFirstDescriptorsLength());
-
-  std::unique_ptr<RavelCBroadcasterDescriptor> record(new RavelCBroadcasterDescriptor(const_cast<uint8_t*>(kRecordB.data())));
-  RavelCBroadcasterDescriptor recordCopy(*record);
-  RavelCBroadcasterDescriptor recordAssigned(const_cast<uint8_t*>(kRecordA.data()));
-  recordAssigned = *record;
-  record.reset();
-  EXPECT_EQ(kSummaryB, Summary(recordCopy));
-  EXPECT_EQ(kSummaryB, Summary(recordAssigned));
+  RavelCBIT self(section.data());
+  self = self;
+  EXPECT_EQ(0, self.GetBroadcasterCount());
+  EXPECT_EQ(4, self.GetFirstDescriptorsLength());
 }
 
 TEST(BITShow, DumpsBannersHeaderProprietyAndNumberedRecords) {

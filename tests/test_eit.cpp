@@ -21,6 +21,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_Util.h"
 #include "StreamBuilder.h"
+#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -34,9 +35,9 @@ const std::string kParseFail = "EIT Info Parsing Fail! Maybe data has been corru
 // ---------------------------------------------------------------------------
 // Builders
 
-Bytes ShortEvent(const std::string& name, const std::string& text = "", const std::string& language = "jpn") {
-  return sb::Descriptor(
-      0x4D, sb::Cat({sb::Text(language), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()), sb::Text(text)}));
+Bytes ShortEvent(const std::string& name, const std::string& text = "") {
+  return sb::Descriptor(0x4D,
+                        sb::Cat({sb::Text("jpn"), sb::U8(name.size()), sb::Text(name), sb::U8(text.size()), sb::Text(text)}));
 }
 
 Bytes ExtendedEvent(unsigned int number, unsigned int last, const std::string& text) {
@@ -45,14 +46,11 @@ Bytes ExtendedEvent(unsigned int number, unsigned int last, const std::string& t
 }
 
 // stream_content 2 (audio), main component, quality 1, sampling rate 7.
-Bytes AudioComponent(uint8_t componentTag, const std::string& language = "jpn") {
-  return sb::Descriptor(0xC4, sb::Cat({sb::U8(0xF2), sb::U8(0x03), sb::U8(componentTag), sb::U8(0x0F), sb::U8(0xFF),
-                                       sb::U8(0x5F), sb::Text(language)}));
+Bytes AudioComponent(uint8_t componentTag) {
+  return sb::Descriptor(0xC4, sb::Cat({Bytes{0xF2, 0x03, componentTag, 0x0F, 0xFF, 0x5F}, sb::Text("jpn")}));
 }
 
-Bytes Component(uint8_t componentTag) {
-  return sb::Descriptor(0x50, sb::Cat({sb::U8(0xF1), sb::U8(0xB3), sb::U8(componentTag), sb::Text("jpn")}));
-}
+Bytes Component(uint8_t tag) { return sb::Descriptor(0x50, sb::Cat({Bytes{0xF1, 0xB3, tag}, sb::Text("jpn")})); }
 
 Bytes Content(uint8_t genre) { return sb::Descriptor(0x54, sb::Cat({sb::U8(genre), sb::U8(0xFF)})); }
 
@@ -61,8 +59,7 @@ Bytes ParentalRating(uint8_t rating) { return sb::Descriptor(0x55, sb::Cat({sb::
 Bytes Copyright(uint32_t id) { return sb::Descriptor(0x0D, sb::Cat({sb::U32(id), sb::Text("(c)")})); }
 
 Bytes Series(uint16_t seriesId, const std::string& name) {
-  return sb::Descriptor(0xD5,
-                        sb::Cat({sb::U16(seriesId), sb::U8(0x11), sb::U16(0xE4CD), sb::U24(0x001002), sb::Text(name)}));
+  return sb::Descriptor(0xD5, sb::Cat({sb::U16(seriesId), Bytes{0x11, 0xE4, 0xCD, 0x00, 0x10, 0x02}, sb::Text(name)}));
 }
 
 Bytes DigitalCopyControl() { return sb::Descriptor(0xC1, sb::U8(0x84)); }
@@ -86,9 +83,7 @@ Bytes At(int year, int month, int day, int hour, int minute, int second = 0) {
   return sb::UtcTime(year, month, day, hour, minute, second);
 }
 
-Bytes Duration(int hours, int minutes, int seconds = 0) {
-  return Bytes{sb::Bcd(hours), sb::Bcd(minutes), sb::Bcd(seconds)};
-}
+Bytes Duration(int hours, int minutes, int seconds = 0) { return Bytes{sb::Bcd(hours), sb::Bcd(minutes), sb::Bcd(seconds)}; }
 
 // An event at `start` lasting 30 minutes, with descriptors.
 EventRecord Ev(uint16_t eventId, const Bytes& start, const std::vector<Bytes>& descriptors = {}) {
@@ -143,30 +138,18 @@ std::vector<int> EventIds(RavelCEIT& eit) {
   return ids;
 }
 
-std::string Str(const char* text) { return text ? text : "<null>"; }
-
 // One line naming what an event holds, kind by kind, in the dump order.
 std::string Holdings(RavelCEventInfo& e) {
-  std::string s;
-  if (e.pShortEventDescriptor) s += "short:" + Str(e.pShortEventDescriptor->GetEventName()) + " ";
-  if (e.pContentDescriptor) s += "content:" + std::to_string(e.pContentDescriptor->pGenre[0]) + " ";
-  if (e.pComponentDescriptor) s += "component:" + std::to_string(e.pComponentDescriptor->GetComponentTag()) + " ";
-  if (e.pParentalRatingDescriptor) {
-    s += "rating:" + std::to_string(e.pParentalRatingDescriptor->GetParentalRating(0)->GetMinimumAge()) + " ";
-  }
-  for (int i = 0; i < e.GetAudioComponentCount(); ++i) {
-    s += "audio:" + std::to_string(e.GetAudioComponent(i)->GetComponentTag()) + " ";
-  }
-  if (e.pCopyrightDescriptor) s += "copyright:" + std::to_string(e.pCopyrightDescriptor->GetCopyrightId()) + " ";
-  if (e.pExtendedEventDescriptor) {
-    s += "extended:" + std::to_string(e.pExtendedEventDescriptor->GetDescriptorNumber()) + " ";
-  }
-  if (e.pSeriesDescriptor) s += "series:" + std::to_string(e.pSeriesDescriptor->GetSeriesId()) + " ";
+  std::string s = e.pShortEventDescriptor ? "short:" + std::string(e.pShortEventDescriptor->GetEventName()) + " " : "";
+  auto add = [&](const char* kind, int value) { s += kind + std::to_string(value) + " "; };
+  if (e.pContentDescriptor) add("content:", e.pContentDescriptor->pGenre[0]);
+  if (e.pComponentDescriptor) add("component:", e.pComponentDescriptor->GetComponentTag());
+  if (e.pParentalRatingDescriptor) add("rating:", e.pParentalRatingDescriptor->GetParentalRating(0)->GetMinimumAge());
+  for (int i = 0; i < e.GetAudioComponentCount(); ++i) add("audio:", e.GetAudioComponent(i)->GetComponentTag());
+  if (e.pCopyrightDescriptor) add("copyright:", e.pCopyrightDescriptor->GetCopyrightId());
+  if (e.pExtendedEventDescriptor) add("extended:", e.pExtendedEventDescriptor->GetDescriptorNumber());
+  if (e.pSeriesDescriptor) add("series:", e.pSeriesDescriptor->GetSeriesId());
   return s;
-}
-
-std::vector<unsigned int> FourFields(RavelCEIT& eit) {
-  return {eit.iTransportStreamId, eit.iOriginalNetworkId, eit.iSegmentLastSectionNumber, eit.iLastTableId};
 }
 
 }  // namespace
@@ -188,7 +171,6 @@ TEST(EITEventFields, StartTimesFollowTheDateRuleAndBcdIsNotValidated) {
       {"leap day", At(2012, 2, 29, 23, 59, 59), Duration(1, 0, 5), 0x9, {2012, 2, 29, 23, 59, 59, 0, 0, 0}, {1, 0, 5}, 4, 1},
       {"1 January: previous year's 32 December", At(2013, 1, 1, 0, 0), Duration(0, 1), 0x2,
        {2012, 12, 32, 0, 0, 0, 0, 0, 0}, {0, 1, 0}, 1, 0},
-      {"1 March: 32 February", At(2013, 3, 1, 12, 0), Duration(2, 0), 0xE, {2013, 2, 32, 12, 0, 0, 0, 0, 0}, {2, 0, 0}, 7, 0},
       {"BCD digits unchecked", Bytes{0xE4, 0x89, 0x99, 0x9A, 0xFF}, Bytes{0xFF, 0x9A, 0x99}, 0x1,
        {2019, 1, 22, 99, 100, 165, 0, 0, 0}, {165, 100, 99}, 0, 1},
   };
@@ -196,45 +178,23 @@ TEST(EITEventFields, StartTimesFollowTheDateRuleAndBcdIsNotValidated) {
     SCOPED_TRACE(c.label);
     Bytes events = sb::Cat({sb::U16(0x1234), c.start, c.duration, Bytes{static_cast<uint8_t>(c.flags << 4), 0x00}});
     Bytes section = EitSection(EitOptions(), events);
-    TraceRecorder recorder;
     RavelCEIT eit(section.data());
-    EXPECT_TRUE(recorder.Lines().empty());
-    ASSERT_EQ(1, eit.GetEventCount());
     RavelCEventInfo* e = eit.GetEventInfo(0);
-    EXPECT_EQ(0x1234, e->iEventId);
     EXPECT_EQ(c.time, TimeOf(e->cStartTime));
     EXPECT_EQ(c.duration3, (Ints{e->iDurationHour, e->iDurationMinute, e->iDurationSecond}));
     EXPECT_EQ(c.runningStatus, e->iRunningStatus);
     EXPECT_EQ(c.freeCA, e->bFreeCAMode);
-    EXPECT_EQ(0, e->iDescriptorsLoopLength);
-    EXPECT_EQ("", Holdings(*e));
   }
 }
 
 TEST(EITEventFields, ComparisonsOrderByStartTime) {
-  Bytes early = EventBytes(Ev(1, At(2020, 4, 5, 19, 0)));
-  Bytes late = EventBytes(Ev(2, At(2020, 4, 5, 19, 30)));
-  Bytes firstOfMay = EventBytes(Ev(3, At(2020, 5, 1, 0, 0)));  // decoded as 31 April
-  Bytes lastOfApril = EventBytes(Ev(4, At(2020, 4, 30, 23, 0)));
-  struct Case {
-    const char* label;
-    Bytes* a;
-    Bytes* b;
-    int lt, le, gt, ge;
-  } cases[] = {
-      {"earlier", &early, &late, 1, 1, 0, 0}, {"later", &late, &early, 0, 0, 1, 1},
-      {"equal", &early, &early, 0, 1, 0, 1},
-      {"day 31 of April sorts after 30 April", &firstOfMay, &lastOfApril, 0, 0, 1, 1},
-  };
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
-    RavelCEventInfo a(c.a->data());
-    RavelCEventInfo b(c.b->data());
-    EXPECT_EQ(c.lt, a < b);
-    EXPECT_EQ(c.le, a <= b);
-    EXPECT_EQ(c.gt, a > b);
-    EXPECT_EQ(c.ge, a >= b);
-  }
+  Bytes earlyRaw = EventBytes(Ev(1, At(2020, 4, 5, 19, 0)));
+  Bytes lateRaw = EventBytes(Ev(2, At(2020, 4, 5, 19, 30)));
+  RavelCEventInfo early(earlyRaw.data()), late(lateRaw.data());
+  auto order = [](RavelCEventInfo& a, RavelCEventInfo& b) { return Ints{a < b, a <= b, a > b, a >= b}; };
+  EXPECT_EQ((Ints{1, 1, 0, 0}), order(early, late));
+  EXPECT_EQ((Ints{0, 0, 1, 1}), order(late, early));
+  EXPECT_EQ((Ints{0, 1, 0, 1}), order(early, early));
 }
 
 // ---------------------------------------------------------------------------
@@ -252,32 +212,25 @@ TEST(EITEventDescriptors, LastOfEachKindWinsAndEveryAudioComponentIsKept) {
         Component(0x00), Content(0x12), ShortEvent("News")},
        "short:News content:18 component:0 rating:10 audio:16 copyright:9 extended:0 series:77 ",
        {"raw genre = 0x12!\n"}},
-      {"two short events: the second", {ShortEvent("First"), ShortEvent("Second")}, "short:Second ", {}},
-      {"three extended events: only the last text survives",
-       {ExtendedEvent(0, 2, "a"), ExtendedEvent(1, 2, "b"), ExtendedEvent(2, 2, "c")}, "extended:2 ", {}},
-      {"three audio components, all in arrival order",
-       {AudioComponent(0x12), AudioComponent(0x10), AudioComponent(0x11)}, "audio:18 audio:16 audio:17 ", {}},
-      {"repeated single kinds interleaved with audio",
-       {Component(1), AudioComponent(0x10), Component(2), Content(0x20), AudioComponent(0x11), Content(0x30),
+      {"two short events and three extended ones: the last of each",
+       {ShortEvent("First"), ExtendedEvent(0, 2, "a"), ShortEvent("Second"), ExtendedEvent(1, 2, "b"),
+        ExtendedEvent(2, 2, "c")}, "short:Second extended:2 ", {}},
+      {"repeated single kinds interleaved with audio components, all kept in arrival order",
+       {Component(1), AudioComponent(0x11), Component(2), Content(0x20), AudioComponent(0x10), Content(0x30),
         ParentalRating(0x03), ParentalRating(0x04), Copyright(1), Copyright(2), Series(1, "a"), Series(2, "b")},
-       "content:48 component:2 rating:14 audio:16 audio:17 copyright:2 series:2 ",
+       "content:48 component:2 rating:14 audio:17 audio:16 copyright:2 series:2 ",
        {"raw genre = 0x20!\n", "raw genre = 0x30!\n"}},
       {"digital copy control and unknown tags are traced, not kept",
-       {DigitalCopyControl(), sb::Descriptor(0xC7, Bytes(14, 0x00)), ShortEvent("N"),
-        sb::Descriptor(0xD6, Bytes{0x11, 0x48, 0x00, 0x0E, 0xDD}), sb::Descriptor(0x49, Bytes{0x01})},
-       "short:N ", {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
-        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xc7]\n",
-        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xd6]\n",
-        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0x49]\n"}},
+       {DigitalCopyControl(), ShortEvent("N"), sb::Descriptor(0xD6, Bytes{0x11, 0x48, 0x00, 0x0E, 0xDD})}, "short:N ",
+       {"EIT EventInfo Parsing.. Digital Copy Control Descriptor Tag=[0xc1]\n",
+        "EIT EventInfo Parsing.. Unknown Descriptor Tag=[0xd6]\n"}},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
     Bytes section = EitSection(EitOptions(), {Ev(7, At(2020, 4, 5, 19, 0), c.descriptors)});
     TraceRecorder recorder;
     RavelCEIT eit(section.data());
-    TraceLines expected;
-    for (const std::string& w : c.warnings) expected.push_back({kWarning, w});
-    EXPECT_EQ(expected, recorder.Lines());
+    EXPECT_EQ(At(kWarning, c.warnings), recorder.Lines());
     ASSERT_EQ(1, eit.GetEventCount());
     EXPECT_EQ(c.holdings, Holdings(*eit.GetEventInfo(0)));
     EXPECT_EQ(sb::Cat(c.descriptors).size(), eit.GetEventInfo(0)->iDescriptorsLoopLength);
@@ -288,15 +241,9 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
   Bytes rich = EventBytes(Ev(1, At(2020, 4, 5, 19, 0), {ShortEvent("A"), AudioComponent(0x10), AudioComponent(0x11)}));
   Bytes bare = EventBytes(Ev(2, At(2020, 4, 5, 19, 30)));
   Bytes broken = EventBytes(Ev(3, At(2020, 4, 5, 20, 0), {ShortEvent("B"), AudioComponent(0x12), Bytes{0x54, 0x00}}));
-
   RavelCEventInfo event(rich.data());
-  ASSERT_EQ("short:A audio:16 audio:17 ", Holdings(event));
-
-  // A parse without descriptors keeps none of the earlier ones.
   EXPECT_EQ(kRavelOk, event.ParseRawData(bare.data()));
-  EXPECT_EQ(2, event.iEventId);
   EXPECT_EQ("", Holdings(event));
-  ASSERT_NE(nullptr, event.pAudioComponentList);
 
   // A zero-length descriptor clears everything and frees the list itself.
   TraceRecorder recorder;
@@ -306,57 +253,33 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
   EXPECT_EQ(nullptr, event.pShortEventDescriptor);
   EXPECT_EQ(0, event.iEventId);
   EXPECT_EQ(Ints(9, 0), TimeOf(event.cStartTime));
-  EXPECT_EQ(0, event.iDescriptorsLoopLength);
-  EXPECT_EQ(0, event.GetAudioComponentCount());
   EXPECT_EQ(nullptr, event.GetAudioComponent(0));
-
   // Without a list the event still dumps and copies; a copy gets a list of its own.
   EXPECT_EQ(6u, ShowLines(event).size());
-  RavelCEventInfo copy(event);
-  EXPECT_NE(nullptr, copy.pAudioComponentList);
-  EXPECT_EQ(0, copy.GetAudioComponentCount());
+  EXPECT_NE(nullptr, RavelCEventInfo(event).pAudioComponentList);
 
-  // The next parse allocates a new list.
   EXPECT_EQ(kRavelOk, event.ParseRawData(rich.data()));
-  ASSERT_NE(nullptr, event.pAudioComponentList);
   EXPECT_EQ("short:A audio:16 audio:17 ", Holdings(event));
-
-  // Null: fields cleared, no descriptors, an empty list.
+  // Null: fields cleared, no descriptors, an empty list; parsing never writes iSpare.
   event.iSpare = 0x5A;
   EXPECT_EQ(kRavelErrInvalidArgument, event.ParseRawData(nullptr));
-  EXPECT_EQ(0, event.iEventId);
   EXPECT_EQ(0, event.iRunningStatus);
   EXPECT_EQ("", Holdings(event));
   EXPECT_NE(nullptr, event.pAudioComponentList);
-  EXPECT_EQ(0x5A, event.iSpare);  // parsing never writes it
+  EXPECT_EQ(0x5A, event.iSpare);
 }
 
 TEST(EITEventDescriptors, CopiesAreDeepAndSelfAssignmentDropsTheDescriptors) {
-  Bytes raw = EventBytes(EventRecord{
-      0x0EDE,
-      At(2020, 4, 5, 19, 30),
-      Duration(0, 30),
-      2,
-      1,
-      {ShortEvent("Name", "Text"), Content(0x82), Component(0xB3), ParentalRating(0x05), AudioComponent(0x10),
-       AudioComponent(0x11), Copyright(4), ExtendedEvent(1, 1, "more"), Series(9, "Series")}});
-  const std::string all =
-      "short:Name content:130 component:179 rating:16 audio:16 audio:17 copyright:4 extended:1 series:9 ";
-  std::unique_ptr<RavelCEventInfo> source(new RavelCEventInfo(raw.data()));
-  source->iSpare = 0x33;
-  ASSERT_EQ(all, Holdings(*source));
-  const TraceLines shown = ShowLines(*source);
-
-  RavelCEventInfo constructed(*source);
+  Bytes raw = EventBytes(EventRecord{0x0EDE, At(2020, 4, 5, 19, 30), Duration(0, 30), 2, 1,
+                                     {ShortEvent("Name", "Text"), Content(0x82), Component(0xB3), ParentalRating(0x05),
+                                      AudioComponent(0x10), AudioComponent(0x11), Copyright(4),
+                                      ExtendedEvent(1, 1, "more"), Series(9, "Series")}});
   Bytes other = EventBytes(Ev(5, At(2021, 1, 1, 0, 0), {AudioComponent(0x20), ShortEvent("Old")}));
-  RavelCEventInfo assigned(other.data());
-  assigned = *source;
-  source.reset();
-  for (RavelCEventInfo* copy : {&constructed, &assigned}) {
-    EXPECT_EQ(all, Holdings(*copy));
-    EXPECT_EQ(shown, ShowLines(*copy));  // every field and descriptor
-    EXPECT_EQ(0x33, copy->iSpare);
-  }
+  tcc::ExpectCopies<RavelCEventInfo>(raw.data(), other.data(), [](RavelCEventInfo& e) { e.iSpare = 0x33; },
+                                     [](RavelCEventInfo& copy, const TraceLines& shown) {
+                                       EXPECT_EQ(shown, ShowLines(copy));  // every field and descriptor
+                                       EXPECT_EQ(0x33, copy.iSpare);
+                                     });
 
   // The list's count is 8 bits wide: of 257 audio components a copy and the
   // dump take one, although the list holds (and releases) all of them.
@@ -364,113 +287,87 @@ TEST(EITEventDescriptors, CopiesAreDeepAndSelfAssignmentDropsTheDescriptors) {
   many.front() = AudioComponent(0x31);
   Bytes crowded = EventBytes(Ev(6, At(2020, 4, 5, 19, 0), many));
   RavelCEventInfo full(crowded.data());
-  EXPECT_EQ(1, full.GetAudioComponentCount());
   EXPECT_EQ(0x30, full.GetAudioComponent(256)->GetComponentTag());
   RavelCEventInfo fullCopy(full);
   EXPECT_EQ("audio:49 ", Holdings(fullCopy));
-  EXPECT_EQ(nullptr, fullCopy.GetAudioComponent(1));
 
   // Assigning an event to itself releases its descriptors before reading them.
-  RavelCEventInfo& alias = assigned;
-  assigned = alias;
-  EXPECT_EQ("", Holdings(assigned));
-  EXPECT_EQ(0x0EDE, assigned.iEventId);
-  EXPECT_EQ(0x33, assigned.iSpare);
+  RavelCEventInfo self(raw.data());
+  self = self;
+  EXPECT_EQ("", Holdings(self));
+  EXPECT_EQ(0x0EDE, self.iEventId);
 }
 
 // ---------------------------------------------------------------------------
 // Table parse
 
-TEST(EITParse, AcceptsPresentFollowingTheFirstActualScheduleAndOtherSchedules) {
-  struct Case {
-    uint8_t tableId;
-    int result;
-    const char* name;
-  } cases[] = {
-      {0x4D, kRavelErrInvalidArgument, nullptr}, {0x4E, kRavelOk, "EIT Actual"},
-      {0x4F, kRavelOk, "EIT Other"},             {0x50, kRavelOk, "EIT schedule Actual"},
-      {0x51, kRavelErrInvalidArgument, nullptr}, {0x5F, kRavelErrInvalidArgument, nullptr},
-      {0x60, kRavelOk, "EIT schedule Other"},    {0x6F, kRavelOk, "EIT schedule Other"},
-      {0x70, kRavelErrInvalidArgument, nullptr},
-  };
-  Bytes previous = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0))});
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.tableId);
-    EitOptions options;
-    options.tableId = c.tableId;
-    options.serviceId = 0x4801;
-    options.transportStreamId = 0x1111;
-    options.originalNetworkId = 0x2222;
-    options.segmentLastSectionNumber = 8;
-    options.lastTableId = 0x51;
-    Bytes section = EitSection(options, {Ev(2, At(2020, 4, 5, 20, 0)), Ev(3, At(2020, 4, 5, 21, 0))});
-    RavelCEIT eit(previous.data());
-    ASSERT_EQ(1, eit.GetEventCount());
-    TraceRecorder recorder;
-    EXPECT_EQ(c.result, eit.ParseRawData(section.data()));
-    EXPECT_EQ(c.tableId, eit.iTableId);  // the header is parsed either way
-    EXPECT_EQ(0x4801, eit.iTableIdExtension);
-    if (c.result == kRavelOk) {
-      EXPECT_TRUE(recorder.Lines().empty());
-      EXPECT_STREQ(c.name, eit.sTableName.GetString());
-      EXPECT_EQ(c.tableId, eit.iEITTableId);
-      EXPECT_EQ((std::vector<unsigned int>{0x1111, 0x2222, 8, 0x51}), FourFields(eit));
-      EXPECT_EQ((std::vector<int>{2, 3}), EventIds(eit));
-    } else {
-      char text[64];
-      snprintf(text, sizeof(text), "Table ID isn't for EIT! Table ID=[0x%02x]\n", c.tableId);
-      EXPECT_EQ((TraceLines{{kError, text}}), recorder.Lines());
-      EXPECT_STREQ("EIT Actual", eit.sTableName.GetString());  // from the earlier parse
-      EXPECT_EQ(0x4E, eit.iEITTableId);
-      EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
-      EXPECT_EQ(0, eit.GetEventCount());
-    }
-  }
+namespace {
+
+// Service 0x4801, version 9, body fields unlike the defaults; the second event
+// holds `descriptors`.
+Bytes Candidate(uint8_t tableId, const std::vector<Bytes>& descriptors = {}, bool corruptCrc = false) {
+  EitOptions options;
+  options.tableId = tableId;
+  options.serviceId = 0x4801;
+  options.version = 9;
+  options.transportStreamId = 0x1111;
+  options.originalNetworkId = 0x2222;
+  options.segmentLastSectionNumber = 8;
+  options.lastTableId = 0x51;
+  options.corruptCrc = corruptCrc;
+  return EitSection(options, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}), Ev(3, At(2020, 4, 5, 21, 0), descriptors)});
 }
 
-TEST(EITParse, FailuresClearTheEventsAndTheTableFields) {
-  EitOptions otherOptions;
-  otherOptions.tableId = 0x4F;
-  otherOptions.version = 9;
-  otherOptions.serviceId = 0x0101;
-  Bytes zeroLength = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("ok")}),
-                                               Ev(3, At(2020, 4, 5, 21, 0), {Bytes{0x4D, 0x00}})});
-  Bytes zeroTag = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0), {Bytes{0x00, 0x03, 1, 2, 3}})});
-  otherOptions.corruptCrc = true;
-  Bytes badCrc = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
-  otherOptions.tableId = 0x51;
-  Bytes badCrcAndTableId = EitSection(otherOptions, {Ev(2, At(2020, 4, 5, 20, 0))});
+TraceLines Foreign(const char* id) { return {{kError, std::string("Table ID isn't for EIT! Table ID=[") + id + "]\n"}}; }
 
+}  // namespace
+
+TEST(EITParse, AcceptsItsTableIdsAndFailuresClearTheEventsAndBodyFields) {
+  const TraceLines crcError{{kWarning, "EIT Section: CRC Error!\n"}};
   struct Case {
     const char* label;
-    Bytes* section;
+    Bytes section;  // empty: null
     int result;
     TraceLines traces;
-    bool headerParsed;
+    bool headerRead;
+    const char* name;  // a refused table_id leaves the earlier one, and the EIT's own table_id
+    int eitTableId;
   } cases[] = {
-      {"null", nullptr, kRavelErrInvalidArgument, {}, false},
-      {"bad CRC: the header is not parsed", &badCrc, kRavelErrCorruptSection, {{kWarning, "EIT Section: CRC Error!\n"}},
-       false},
-      {"the CRC is checked before the table_id", &badCrcAndTableId, kRavelErrCorruptSection,
-       {{kWarning, "EIT Section: CRC Error!\n"}}, false},
-      {"zero-length descriptor in the second event", &zeroLength, kRavelErrCorruptSection,
-       {{kWarning, Invalid(0x4D, 0)}, {kWarning, kParseFail}}, true},
-      {"descriptor tag 0", &zeroTag, kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 3)}, {kWarning, kParseFail}}, true},
+      {"0x4D", Candidate(0x4D), kRavelErrInvalidArgument, Foreign("0x4d"), true, "EIT Actual", 0x4E},
+      {"0x4E", Candidate(0x4E), kRavelOk, {}, true, "EIT Actual", 0x4E},
+      {"0x4F", Candidate(0x4F), kRavelOk, {}, true, "EIT Other", 0x4F},
+      {"0x50", Candidate(0x50), kRavelOk, {}, true, "EIT schedule Actual", 0x50},
+      {"0x51", Candidate(0x51), kRavelErrInvalidArgument, Foreign("0x51"), true, "EIT Actual", 0x4E},
+      {"0x5F", Candidate(0x5F), kRavelErrInvalidArgument, Foreign("0x5f"), true, "EIT Actual", 0x4E},
+      {"0x60", Candidate(0x60), kRavelOk, {}, true, "EIT schedule Other", 0x60},
+      {"0x6F", Candidate(0x6F), kRavelOk, {}, true, "EIT schedule Other", 0x6F},
+      {"0x70", Candidate(0x70), kRavelErrInvalidArgument, Foreign("0x70"), true, "EIT Actual", 0x4E},
+      {"null", Bytes(), kRavelErrInvalidArgument, {}, false, "EIT Actual", 0x4E},
+      {"bad CRC: the header is not parsed", Candidate(0x4F, {}, true), kRavelErrCorruptSection, crcError, false,
+       "EIT Actual", 0x4E},
+      {"the CRC is checked before the table_id", Candidate(0x51, {}, true), kRavelErrCorruptSection, crcError, false,
+       "EIT Actual", 0x4E},
+      {"zero-length descriptor in the second event", Candidate(0x4F, {Bytes{0x4D, 0x00}}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0x4D, 0)}, {kWarning, kParseFail}}, true, "EIT Other", 0x4F},
+      {"descriptor tag 0", Candidate(0x4F, {Bytes{0x00, 0x03, 1, 2, 3}}), kRavelErrCorruptSection,
+       {{kWarning, Invalid(0x00, 3)}, {kWarning, kParseFail}}, true, "EIT Other", 0x4F},
   };
   Bytes previous = EitSection(EitOptions(), {Ev(1, At(2020, 4, 5, 19, 0)), Ev(5, At(2020, 4, 5, 19, 30))});
-  for (const Case& c : cases) {
+  for (Case& c : cases) {
     SCOPED_TRACE(c.label);
     RavelCEIT eit(previous.data());
-    ASSERT_EQ(2, eit.GetEventCount());
     TraceRecorder recorder;
-    EXPECT_EQ(c.result, eit.ParseRawData(c.section ? c.section->data() : nullptr));
+    EXPECT_EQ(c.result, eit.ParseRawData(c.section.empty() ? nullptr : c.section.data()));
     EXPECT_EQ(c.traces, recorder.Lines());
-    EXPECT_EQ(0, eit.GetEventCount());
-    EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), FourFields(eit));
-    // Header and name of a section whose header was parsed stay; the others keep the earlier ones.
-    EXPECT_EQ((c.headerParsed ? std::vector<int>{0x4F, 9, 0x0101, 0x4F} : std::vector<int>{0x4E, 4, 0x4800, 0x4E}),
-              (std::vector<int>{eit.iTableId, eit.iVersionNumber, eit.iTableIdExtension, eit.iEITTableId}));
-    EXPECT_STREQ(c.headerParsed ? "EIT Other" : "EIT Actual", eit.sTableName.GetString());
+    EXPECT_EQ((c.headerRead ? std::vector<int>{c.section[0], 9, 0x4801} : std::vector<int>{0x4E, 4, 0x4800}),
+              (std::vector<int>{eit.iTableId, eit.iVersionNumber, eit.iTableIdExtension}));
+    EXPECT_STREQ(c.name, eit.sTableName.GetString());
+    EXPECT_EQ(c.eitTableId, eit.iEITTableId);
+    const bool ok = c.result == kRavelOk;
+    EXPECT_EQ((ok ? std::vector<int>{0x1111, 0x2222, 8, 0x51} : std::vector<int>(4, 0)),
+              (std::vector<int>{eit.iTransportStreamId, eit.iOriginalNetworkId, eit.iSegmentLastSectionNumber,
+                                eit.iLastTableId}));
+    EXPECT_EQ((ok ? std::vector<int>{2, 3} : std::vector<int>{}), EventIds(eit));
   }
 }
 
@@ -492,83 +389,66 @@ TEST(EITMerge, JoinsMatchingTablesSortedByStartTimeKeepingTiesInOrder) {
        {12, 21, 10, 11, 20, 22}},
       {"the first of a month sorts as day 32 of the month before",
        {Ev(1, At(2013, 3, 1, 0, 0)), Ev(2, At(2013, 2, 28, 23, 0))}, {Ev(3, At(2013, 3, 2, 0, 0))}, {2, 1, 3}},
-      {"seconds decide", {Ev(1, At(2020, 4, 5, 19, 0, 2))}, {Ev(2, At(2020, 4, 5, 19, 0, 1))}, {2, 1}},
       {"empty other: the held events are sorted", {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {},
        {1, 2}},
       {"empty target", {}, {Ev(2, At(2020, 4, 5, 21, 0)), Ev(1, At(2020, 4, 5, 19, 0))}, {1, 2}},
   };
+  // Table_id, service_id and section numbers are not compared.
+  EitOptions theirOptions;
+  theirOptions.tableId = 0x4F;
+  theirOptions.serviceId = 0x4801;
+  theirOptions.sectionNumber = 1;
+  theirOptions.segmentLastSectionNumber = 7;
   for (const Case& c : cases) {
     SCOPED_TRACE(c.label);
-    EitOptions mineOptions;
-    EitOptions theirOptions;
-    // Table_id, service_id and section numbers are not compared.
-    theirOptions.tableId = 0x4F;
-    theirOptions.serviceId = 0x4801;
-    theirOptions.sectionNumber = 1;
-    theirOptions.segmentLastSectionNumber = 7;
-    Bytes a = EitSection(mineOptions, c.mine);
+    Bytes a = EitSection(EitOptions(), c.mine);
     Bytes b = EitSection(theirOptions, c.theirs);
     RavelCEIT target(a.data());
     RavelCEIT other(b.data());
     TraceRecorder recorder;
-    RavelCEIT& result = (target += other);
-    EXPECT_EQ(&target, &result);
+    EXPECT_EQ(&target, &(target += other));
     EXPECT_TRUE(recorder.Lines().empty());
     EXPECT_EQ(c.ids, EventIds(target));
     EXPECT_EQ(static_cast<int>(c.theirs.size()), other.GetEventCount());
-    EXPECT_EQ(0x4E, target.iTableId);
-    EXPECT_EQ(0x4800, target.iTableIdExtension);
-    EXPECT_EQ(1, target.iSegmentLastSectionNumber);
+    EXPECT_EQ((std::vector<int>{0x4E, 0x4800, 1}),
+              (std::vector<int>{target.iTableId, target.iTableIdExtension, target.iSegmentLastSectionNumber}));
   }
 }
 
 TEST(EITMerge, RefusesTablesThatDisagreeWithThreeTraceLines) {
-  struct Case {
-    const char* label;
-    uint16_t transportStreamId;
-    uint16_t originalNetworkId;
-    uint8_t version;
-  } cases[] = {
-      {"transport stream", 0x7ED2, 0x7ED1, 4}, {"original network", 0x7ED0, 0x0001, 4}, {"version", 0x7ED0, 0x7ED1, 5},
-  };
   Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.label);
+  for (int differing = 0; differing < 3; ++differing) {
+    SCOPED_TRACE(differing);
     EitOptions options;
-    options.transportStreamId = c.transportStreamId;
-    options.originalNetworkId = c.originalNetworkId;
-    options.version = c.version;
+    if (differing == 0) options.transportStreamId = 0x7ED2;
+    if (differing == 1) options.originalNetworkId = 0x0001;
+    if (differing == 2) options.version = 5;
     Bytes b = EitSection(options, {Ev(0, At(2020, 4, 5, 18, 0))});
     RavelCEIT target(a.data());
     RavelCEIT other(b.data());
     TraceRecorder recorder;
     target += other;
-    char otherLine[96];
-    snprintf(otherLine, sizeof(otherLine), "OTHER: TS ID=[%d], Org Network ID=[%d], VersionNum=[%d]\n",
-             c.transportStreamId, c.originalNetworkId, c.version);
-    EXPECT_EQ((TraceLines{{kError, "Two EIT Information have different information!\n"},
-                          {kError, "THIS: TS ID=[32464], Org Network ID=[32465], VersionNum=[4]\n"},
-                          {kError, otherLine}}),
+    const std::string otherLine = "OTHER: TS ID=[" + std::to_string(options.transportStreamId) + "], Org Network ID=[" +
+                                  std::to_string(options.originalNetworkId) + "], VersionNum=[" +
+                                  std::to_string(options.version) + "]\n";
+    EXPECT_EQ(At(kError, {"Two EIT Information have different information!\n",
+                          "THIS: TS ID=[32464], Org Network ID=[32465], VersionNum=[4]\n", otherLine}),
               recorder.Lines());
     EXPECT_EQ((std::vector<int>{2, 1}), EventIds(target));  // not even sorted
   }
 }
 
-TEST(EITMerge, TheSameSectionTwiceDoublesItsEvents) {
-  Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0)), Ev(1, At(2020, 4, 5, 19, 0))});
+TEST(EITMerge, TheSameSectionTwiceDoublesItsEventsAsCopies) {
+  Bytes a = EitSection(EitOptions(), {Ev(2, At(2020, 4, 5, 20, 0), {ShortEvent("kept"), AudioComponent(9)}),
+                                      Ev(1, At(2020, 4, 5, 19, 0))});
   RavelCEIT target(a.data());
-  RavelCEIT again(a.data());
-  target += again;
+  std::unique_ptr<RavelCEIT> again(new RavelCEIT(a.data()));
+  target += *again;
+  again.reset();
   EXPECT_EQ((std::vector<int>{1, 1, 2, 2}), EventIds(target));
+  EXPECT_EQ("short:kept audio:9 ", Holdings(*target.GetEventInfo(3)));
   target += target;  // the count is taken before appending
   EXPECT_EQ((std::vector<int>{1, 1, 1, 1, 2, 2, 2, 2}), EventIds(target));
-
-  // Merged events are copies: the other table can go.
-  Bytes withText = EitSection(EitOptions(), {Ev(3, At(2020, 4, 5, 18, 0), {ShortEvent("kept"), AudioComponent(9)})});
-  std::unique_ptr<RavelCEIT> other(new RavelCEIT(withText.data()));
-  target += *other;
-  other.reset();
-  EXPECT_EQ("short:kept audio:9 ", Holdings(*target.GetEventInfo(0)));
 }
 
 // ---------------------------------------------------------------------------
@@ -583,24 +463,20 @@ TEST(EITCopy, DeepCopiesWithoutTheTableIdCopyAndSelfAssignmentEmpties) {
   Bytes section = EitSection(options, {Ev(1, At(2020, 4, 5, 19, 0), {ShortEvent("One"), AudioComponent(0x10)}),
                                        Ev(2, At(2020, 4, 5, 19, 30), {ExtendedEvent(0, 0, "Two")})});
   Bytes otherSection = EitSection(EitOptions(), {Ev(7, At(2020, 1, 1, 0, 0))});
-  std::unique_ptr<RavelCEIT> source(new RavelCEIT(section.data()));
-  source->iSession = 0x42;
-  const TraceLines shown = ShowLines(*source);  // header, body, events and their descriptors
-  RavelCEIT constructed(*source);
-  RavelCEIT assigned(otherSection.data());
-  assigned = *source;
-  source.reset();
-  EXPECT_EQ(shown, ShowLines(constructed));
-  EXPECT_EQ(shown, ShowLines(assigned));
   // The table_id the EIT keeps apart is not copied: a new copy has 0, a target keeps its own.
-  EXPECT_EQ(0x00, constructed.iEITTableId);
-  EXPECT_EQ(0x4E, assigned.iEITTableId);
+  std::vector<int> eitTableIds;
+  tcc::ExpectCopies<RavelCEIT>(section.data(), otherSection.data(), [](RavelCEIT& t) { t.iSession = 0x42; },
+                               [&](RavelCEIT& copy, const TraceLines& shown) {
+                                 EXPECT_EQ(shown, ShowLines(copy));  // header, body, events and their descriptors
+                                 eitTableIds.push_back(copy.iEITTableId);
+                               });
+  EXPECT_EQ((std::vector<int>{0x00, 0x4E}), eitTableIds);
 
-  RavelCEIT& alias = assigned;
-  assigned = alias;
-  EXPECT_EQ(0, assigned.GetEventCount());
-  EXPECT_EQ(0x4801, assigned.iTableIdExtension);
-  EXPECT_EQ(0x7ED0, assigned.iTransportStreamId);
+  RavelCEIT self(section.data());
+  self = self;
+  EXPECT_EQ(0, self.GetEventCount());
+  EXPECT_EQ(0x4801, self.iTableIdExtension);
+  EXPECT_EQ(0x7ED0, self.iTransportStreamId);
 }
 
 // ---------------------------------------------------------------------------
@@ -668,15 +544,12 @@ TEST(EITShow, DumpsHeaderBodyEventsAndDescriptorsInAFixedOrder) {
                       "Start Time=[2013.1.2 - 0:0:0]\n", "Duration=[0:30:0]\n", "Running Status=[4]\n",
                       "FreeCAMode=[0]\n", "Descriptors Loop Len=[0]\n", kRule}));
   EXPECT_EQ(expected, ShowLines(eit));
-}
 
-TEST(EITShow, EmptyTableShowsAnUnknownName) {
-  RavelCEIT eit(nullptr);
-  EXPECT_EQ(0, eit.GetEventCount());
-  TraceLines expected = TableHead(EmptyHeaderLines());
+  RavelCEIT empty(nullptr);  // shows an unknown name
+  expected = TableHead(EmptyHeaderLines());
   Add(expected, Dump({"# Body Information\n", "Transport Stream ID = [0x0000]\n", "Original Network ID = [0x0000]\n",
                       "Segment Last Section Num=[0]\n", "Last Table ID=[0]\n", kRule}));
-  EXPECT_EQ(expected, ShowLines(eit));
+  EXPECT_EQ(expected, ShowLines(empty));
 }
 
 // ---------------------------------------------------------------------------

@@ -2,13 +2,13 @@
 #include <gtest/gtest.h>
 
 #include <cstdio>
-#include <memory>
 #include <string>
 #include <vector>
 
 #include "Ravel_CTableStreamEventDescriptor.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
+#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -61,14 +61,11 @@ TEST(StreamEventTable, ChecksTheCrcOnlyWhenTheSyntaxIndicatorIsOne) {
     bool corruptCrc;
     int result;
     TraceLines trace;
-    const char* name;
-    std::vector<int> held;
   } cases[] = {
-      {/*syntaxIndicator=*/true, /*corruptCrc=*/false, kRavelOk, {}, kName, {-1, 7}},
-      {true, true, kRavelErrCorruptSection, {{kWarning, "Stream Descriptor Event: CRC Error!\n"}}, "", {-1}},
+      {/*syntaxIndicator=*/true, /*corruptCrc=*/false, kRavelOk, {}},
+      {true, true, kRavelErrCorruptSection, {{kWarning, "Stream Descriptor Event: CRC Error!\n"}}},
       // A checksum instead of a CRC: reported as unchecked, never verified.
-      {false, false, kRavelOk, unchecked, kName, {-1, 7}},
-      {false, true, kRavelOk, unchecked, kName, {-1, 7}},
+      {false, true, kRavelOk, unchecked},
   };
   for (const Case& c : cases) {
     SCOPED_TRACE(testing::Message() << c.syntaxIndicator << c.corruptCrc);
@@ -80,8 +77,9 @@ TEST(StreamEventTable, ChecksTheCrcOnlyWhenTheSyntaxIndicatorIsOne) {
     // The header is read even when the CRC fails.
     EXPECT_EQ((std::vector<int>{0x3D, c.syntaxIndicator, static_cast<int>(section.size() - 3), 3}),
               (std::vector<int>{table.iTableId, table.bSectionSyntaxIndicator, table.iSectionLength, table.iVersionNumber}));
-    EXPECT_STREQ(c.name, table.sTableName.GetString());
-    EXPECT_EQ(c.held, Held(table));
+    // Neither name nor descriptors after a CRC error.
+    EXPECT_STREQ(c.result == kRavelOk ? kName : "", table.sTableName.GetString());
+    EXPECT_EQ((c.result == kRavelOk ? std::vector<int>{-1, 7} : std::vector<int>{-1}), Held(table));
   }
 }
 
@@ -129,43 +127,23 @@ TEST(StreamEventTable, KeepsTheLastNptReferenceAndEveryGeneralEvent) {
 }
 
 TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
-  enum How { kCopyConstruct, kAssign, kAssignToItself };
-  struct Case {
-    How how;
-    std::vector<int> held;
-  } cases[] = {
-      {kCopyConstruct, {9}},
-      {kAssign, {9}},
-      // The target's descriptors are released before the source is read.
-      {kAssignToItself, {-1}},
-  };
   Bytes section = StreamSection({Npt(9), Event(1), Event(2), Event(3)});
   Bytes other = StreamSection({Event(8), Event(9)});
-  for (const Case& c : cases) {
-    SCOPED_TRACE(c.how);
-    RavelCDsmccStreamEvent table(section.data());
-    table.iSession = 0x5A;
-    RavelCDsmccStreamEvent assigned(other.data());
-    TraceRecorder recorder;
-    RavelCDsmccStreamEvent* t = &assigned;
-    std::unique_ptr<RavelCDsmccStreamEvent> copy;
-    if (c.how == kCopyConstruct) {
-      copy.reset(new RavelCDsmccStreamEvent(table));
-      t = copy.get();
-    } else if (c.how == kAssign) {
-      assigned = table;
-    } else {
-      RavelCDsmccStreamEvent& self = table;
-      table = self;
-      t = &table;
-    }
-    EXPECT_TRUE(recorder.Records().empty());  // the NPT reference is copied, not parsed again
-    EXPECT_EQ((std::vector<int>{0x5A, 0x3D, static_cast<int>(section.size() - 3), 3}),
-              (std::vector<int>{t->iSession, t->iTableId, t->iSectionLength, t->iVersionNumber}));
-    EXPECT_STREQ(kName, t->sTableName.GetString());
-    EXPECT_EQ(c.held, Held(*t));
-    if (t != &table) EXPECT_NE(table.GetNPTReference(), t->GetNPTReference());
-  }
+  TraceRecorder recorder;
+  tcc::ExpectCopies<RavelCDsmccStreamEvent>(
+      section.data(), other.data(), [](RavelCDsmccStreamEvent& t) { t.iSession = 0x5A; },
+      [&](RavelCDsmccStreamEvent& copy, const TraceLines&) {
+        EXPECT_EQ((std::vector<int>{0x5A, 0x3D, static_cast<int>(section.size() - 3), 3}),
+                  (std::vector<int>{copy.iSession, copy.iTableId, copy.iSectionLength, copy.iVersionNumber}));
+        EXPECT_STREQ(kName, copy.sTableName.GetString());
+        EXPECT_EQ((std::vector<int>{9}), Held(copy));
+      });
+  // Only the source's parse builds an NPT reference: the copies copy theirs.
+  EXPECT_EQ((TraceLines{kEmptyNpt}), recorder.Lines());
+  // The target's descriptors are released before the source is read.
+  RavelCDsmccStreamEvent self(section.data());
+  self = self;
+  EXPECT_EQ((std::vector<int>{-1}), Held(self));
 }
 
 TEST(StreamEventTable, GeneralEventGetterPanicsOutOfRangeAndGivesNull) {
