@@ -10,7 +10,6 @@
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
 #include "TableChecks.h"
-#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -212,10 +211,10 @@ TEST(BITMerge, AppendsCopiesOfEveryRecordWithoutComparingAnything) {
 TEST(BITCopy, CopiesHeaderFieldsAndEveryRecordDeeply) {
   Bytes section = BitSection(BitBody(true, {SiParameter()}, {kRecordA, kRecordB}), 0x7FE2, 6);
   Bytes other = BitSection(BitBody(false, {}, {Record(0x05, {ExtBroadcaster(0x0E05)})}), 0x0001, 1);
-  tcc::ExpectCopies<RavelCBIT>(section.data(), other.data(), [](RavelCBIT& t) { t.iSession = 0x11; },
+  tc::ExpectCopies<RavelCBIT>(section.data(), other.data(), [](RavelCBIT& t) { t.iSession = 0x11; },
                                [](RavelCBIT& copy, const TraceLines& shown) { EXPECT_EQ(shown, ShowLines(copy)); });
   Bytes record = kRecordB;
-  tcc::ExpectCopies<RavelCBroadcasterDescriptor>(record.data(), Bytes(kRecordA).data(), [](RavelCBroadcasterDescriptor&) {},
+  tc::ExpectCopies<RavelCBroadcasterDescriptor>(record.data(), Bytes(kRecordA).data(), [](RavelCBroadcasterDescriptor&) {},
                                                  [](RavelCBroadcasterDescriptor& copy, const TraceLines&) {
                                                    EXPECT_EQ(kSummaryB, Summary(copy));
                                                  });

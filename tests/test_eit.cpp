@@ -21,7 +21,7 @@
 #include "Ravel_ResultCode.h"
 #include "Ravel_Util.h"
 #include "StreamBuilder.h"
-#include "TableCopyChecks.h"
+#include "TableChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -275,7 +275,7 @@ TEST(EITEventDescriptors, CopiesAreDeepAndSelfAssignmentDropsTheDescriptors) {
                                       AudioComponent(0x10), AudioComponent(0x11), Copyright(4),
                                       ExtendedEvent(1, 1, "more"), Series(9, "Series")}});
   Bytes other = EventBytes(Ev(5, At(2021, 1, 1, 0, 0), {AudioComponent(0x20), ShortEvent("Old")}));
-  tcc::ExpectCopies<RavelCEventInfo>(raw.data(), other.data(), [](RavelCEventInfo& e) { e.iSpare = 0x33; },
+  tc::ExpectCopies<RavelCEventInfo>(raw.data(), other.data(), [](RavelCEventInfo& e) { e.iSpare = 0x33; },
                                      [](RavelCEventInfo& copy, const TraceLines& shown) {
                                        EXPECT_EQ(shown, ShowLines(copy));  // every field and descriptor
                                        EXPECT_EQ(0x33, copy.iSpare);
@@ -465,7 +465,7 @@ TEST(EITCopy, DeepCopiesWithoutTheTableIdCopyAndSelfAssignmentEmpties) {
   Bytes otherSection = EitSection(EitOptions(), {Ev(7, At(2020, 1, 1, 0, 0))});
   // The table_id the EIT keeps apart is not copied: a new copy has 0, a target keeps its own.
   std::vector<int> eitTableIds;
-  tcc::ExpectCopies<RavelCEIT>(section.data(), otherSection.data(), [](RavelCEIT& t) { t.iSession = 0x42; },
+  tc::ExpectCopies<RavelCEIT>(section.data(), otherSection.data(), [](RavelCEIT& t) { t.iSession = 0x42; },
                                [&](RavelCEIT& copy, const TraceLines& shown) {
                                  EXPECT_EQ(shown, ShowLines(copy));  // header, body, events and their descriptors
                                  eitTableIds.push_back(copy.iEITTableId);

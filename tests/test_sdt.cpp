@@ -10,7 +10,6 @@
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
 #include "TableChecks.h"
-#include "TableCopyChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -236,7 +235,7 @@ TEST(SDTCopy, CopiesHeaderNameNetworkIdAndEveryService) {
                               Service(0x4800)},
                              0x46, 3, 0x0640);
   Bytes other = SdtSection({Service(0x0001), Service(0x0002), Service(0x0003)}, 0x42, 1, 0x7ED0);
-  tcc::ExpectCopies<RavelCSDT>(section.data(), other.data(), [](RavelCSDT& t) { t.iSession = 0x11; },
+  tc::ExpectCopies<RavelCSDT>(section.data(), other.data(), [](RavelCSDT& t) { t.iSession = 0x11; },
                                [](RavelCSDT& copy, TraceLines expected) {
                                  // The service descriptor's own copy carries no names; all else is the source's.
                                  ASSERT_LT(22u, expected.size());

@@ -8,7 +8,7 @@
 #include "Ravel_CTableStreamEventDescriptor.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
-#include "TableCopyChecks.h"
+#include "TableChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -130,7 +130,7 @@ TEST(StreamEventTable, CopiesKeepTheNptReferenceButNoGeneralEvent) {
   Bytes section = StreamSection({Npt(9), Event(1), Event(2), Event(3)});
   Bytes other = StreamSection({Event(8), Event(9)});
   TraceRecorder recorder;
-  tcc::ExpectCopies<RavelCDsmccStreamEvent>(
+  tc::ExpectCopies<RavelCDsmccStreamEvent>(
       section.data(), other.data(), [](RavelCDsmccStreamEvent& t) { t.iSession = 0x5A; },
       [&](RavelCDsmccStreamEvent& copy, const TraceLines&) {
         EXPECT_EQ((std::vector<int>{0x5A, 0x3D, static_cast<int>(section.size() - 3), 3}),

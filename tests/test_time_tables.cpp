@@ -11,7 +11,7 @@
 #include "Ravel_CTableTOT.h"
 #include "Ravel_ResultCode.h"
 #include "StreamBuilder.h"
-#include "TableCopyChecks.h"
+#include "TableChecks.h"
 #include "TestHelpers.h"
 #include "TraceRecorder.h"
 
@@ -204,7 +204,7 @@ TEST(TOTCopy, CopiesAreDeepAndSelfAssignmentDropsTheDescriptor) {
                           {LocalTimeOffsetDescriptor({LocalTimeOffset("FRA", 0, 1), LocalTimeOffset("ESP", 3, 1)})});
   Bytes without = TotSection(sb::UtcTime(2020, 4, 5, 0, 0, 0), {});
   const Ints fields = Fields(RavelCTOT(with.data()));
-  tcc::ExpectCopies<RavelCTOT>(with.data(), without.data(), [](RavelCTOT&) {}, [&](RavelCTOT& copy, const TraceLines&) {
+  tc::ExpectCopies<RavelCTOT>(with.data(), without.data(), [](RavelCTOT&) {}, [&](RavelCTOT& copy, const TraceLines&) {
     EXPECT_STREQ("TOT", copy.sTableName.GetString());
     EXPECT_EQ(fields, Fields(copy));
     EXPECT_EQ("FRA ESP ", KeptOffsets(copy));

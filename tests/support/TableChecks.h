@@ -67,6 +67,23 @@ void ExpectDeepCopies(T* source, T& target, Describe describe) {
   EXPECT_EQ(expected, describe(target));
 }
 
+// The same for a table built over `source`: `prepare` sets what no parse writes,
+// and `check(copy, sourceDump)` sees each copy against the source's dump.
+template <class T, class Prepare, class Check>
+void ExpectCopies(unsigned char* source, unsigned char* over, Prepare prepare, Check check) {
+  std::unique_ptr<T> original(new T(source));
+  prepare(*original);
+  const TraceLines shown = th::ShowLines(*original);
+  T constructed(*original);
+  T assigned(over);
+  assigned = *original;
+  original.reset();
+  for (T* copy : {&constructed, &assigned}) {
+    SCOPED_TRACE(copy == &constructed ? "constructed" : "assigned");
+    check(*copy, shown);
+  }
+}
+
 // Assignment to itself, as a caller holding two references to one object does it.
 template <class T>
 T& SelfAssign(T& object) {
