@@ -90,6 +90,8 @@ TEST(GeneralEventDescriptor, ReadsTheTimeByModeAndTheMessageFromFixedPositions) 
   EXPECT_EQ((TraceLines{{kDump, "\t EventMsgGroupID=[0], TimeMode=[0]\n"}, {kWarning, "Unknown Time Mode =[0x0]\n"},
                         {kDump, "\t EventMsgType=[0], EventMsgID=[0x0000]\n"}}),
             BodyLines(empty));
+  const RavelCEventRelativeTime& relative = empty.GetEventMsgRelativeTime();  // not shown in mode 0
+  EXPECT_EQ(0, relative.iHours | relative.iMinutes | relative.iSeconds);
 }
 
 TEST(GeneralEventDescriptor, PrivateDataLengthWrapsInEightBits) {
