@@ -68,7 +68,17 @@ TEST(ServiceDescriptor, ReadsBothNamesAndLeavesEmptyOnesNull) {
 }
 
 // Linkage, stream identifier, system management and type-1 logo refusals are in
-// the descriptor pattern table.
+// the descriptor pattern table, which compares with an object built over nothing;
+// a refused linkage parse also zeroes what an earlier parse read.
+TEST(LinkageDescriptor, RefusedParseZeroesEveryField) {
+  Bytes raw = Descriptor(0x4A, Cat({U16(0x7ED0), U16(1), U16(0x4800), Bytes{0x02}}));
+  Bytes foreign = Descriptor(0x42, Bytes{1, 2, 3, 4, 5, 6, 7});
+  RavelCLinkageDescriptor d(raw.data());
+  d.ParseRawData(foreign.data());
+  EXPECT_EQ(Dump({"\tTransportStreamId=[0x0000], OrginalNetworkId=[0x0000], ServiceId=[0x0000], LinkageType=[0x00]\n"}),
+            BodyLines(d));
+}
+
 TEST(ServiceDescriptorFailure, TsInfoZeroesOnNullOnlyAndTheOthersKeepScalarsButNotLists) {
   Bytes foreign = Descriptor(0x42, Bytes{0x01, 0x02, 0x03, 0x04, 0x05, 0x06, 0x07});
   Bytes tsRaw = Descriptor(0xCD, Cat({Bytes{0x05, (1 << 2) | 1}, Text("A"), Bytes{0x0F, 1}, U16(0x4800)}));

@@ -185,6 +185,8 @@ TEST(SDTServiceLoop, KeepsServiceLogoAndCountryDescriptorsAndFailsTheSectionOnAM
        SdtBody(0x0640, {Service(0x4800, {ServiceDescriptor(0x01, "", "One")}),
                         Service(0x4801, {LogoType1(1, 2, 3), sb::Descriptor(0xC1, {})})}),
        kRavelErrCorruptSection, {{kWarning, Invalid(0xC1, 0)}, infoFail}, {}},
+      {"a stray byte before the CRC_32 starts a service that reads into it",
+       sb::Cat({SdtBody(0x0640, {Service(0x0101)}), sb::U8(0x01)}), kRavelOk, {}, {"0101 ", "012c "}},
       {"tag 0 fails the section", SdtBody(0x0640, {Service(0x4800, {sb::Descriptor(0x00, {0x01})})}),
        kRavelErrCorruptSection, {{kWarning, Invalid(0x00, 1)}, infoFail}, {}},
   };
