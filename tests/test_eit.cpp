@@ -322,6 +322,14 @@ TraceLines Foreign(const char* id) { return {{kError, std::string("Table ID isn'
 
 }  // namespace
 
+Bytes StrayByteBeforeCrc() {
+  Bytes section = Candidate(0x4F);
+  section.insert(section.end() - 4, 0x01);
+  section[2] = static_cast<uint8_t>(section[2] + 1);
+  sb::FixCrc(section);
+  return section;
+}
+
 TEST(EITParse, AcceptsItsTableIdsAndFailuresClearTheEventsAndBodyFields) {
   const TraceLines crcError{{kWarning, "EIT Section: CRC Error!\n"}};
   struct Case {
@@ -369,6 +377,10 @@ TEST(EITParse, AcceptsItsTableIdsAndFailuresClearTheEventsAndBodyFields) {
                                 eit.iLastTableId}));
     EXPECT_EQ((ok ? std::vector<int>{2, 3} : std::vector<int>{}), EventIds(eit));
   }
+  // The event loop runs to the first CRC_32 byte: a stray byte before it starts an event.
+  Bytes stray = StrayByteBeforeCrc();
+  RavelCEIT withStray(stray.data());
+  EXPECT_EQ((std::vector<int>{2, 3, 0x0100 | stray[stray.size() - 4]}), EventIds(withStray));
 }
 
 // ---------------------------------------------------------------------------
