@@ -25,7 +25,7 @@ class RavelCBitInputStream {
 
   const unsigned char* pBuffer;
   unsigned int iLength;
-  unsigned int iBitPosition;
+  unsigned int iBitPosition = 0;
 };
 
 #endif

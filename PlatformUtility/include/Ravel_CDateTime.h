@@ -8,15 +8,15 @@ class RavelCDateTime {
  public:
   RavelCDateTime();
 
-  int iYear;
-  int iMonth;
-  int iDay;
-  int iHour;
-  int iMinute;
-  int iSecond;
-  int iMilliSecond;
-  int iDayOfWeek;
-  int iTimeZone;
+  int iYear = 0;
+  int iMonth = 0;
+  int iDay = 0;
+  int iHour = 0;
+  int iMinute = 0;
+  int iSecond = 0;
+  int iMilliSecond = 0;
+  int iDayOfWeek = 0;
+  int iTimeZone = 0;
 
   int operator<(const RavelCDateTime& other) const;
   int operator<=(const RavelCDateTime& other) const;

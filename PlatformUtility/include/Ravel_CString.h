@@ -22,7 +22,7 @@ class RavelCString {
   bool IsEmpty() const;
 
  private:
-  char* pText;
+  char* pText = 0;
 };
 
 #endif

@@ -3,7 +3,7 @@
 #include <cstring>
 
 RavelCBitInputStream::RavelCBitInputStream(const unsigned char* buffer, unsigned int length, unsigned char)
-    : pBuffer(buffer), iLength(buffer ? length : 0u), iBitPosition(0) {}
+    : pBuffer(buffer), iLength(buffer ? length : 0u) {}
 
 RavelCBitInputStream::~RavelCBitInputStream() {}
 

@@ -1,8 +1,6 @@
 #include "Ravel_CDateTime.h"
 
-RavelCDateTime::RavelCDateTime()
-    : iYear(0), iMonth(0), iDay(0), iHour(0), iMinute(0), iSecond(0), iMilliSecond(0), iDayOfWeek(0),
-      iTimeZone(0) {}
+RavelCDateTime::RavelCDateTime() {}
 
 int RavelCDateTime::Compare(const RavelCDateTime& other) const {
   const int mine[] = {iYear, iMonth, iDay, iHour, iMinute, iSecond, iMilliSecond};

@@ -14,7 +14,7 @@ char* Duplicate(const char* text) {
 
 }  // namespace
 
-RavelCString::RavelCString() : pText(0) {}
+RavelCString::RavelCString() {}
 
 RavelCString::RavelCString(const char* text) : pText(Duplicate(text)) {}
 

@@ -34,7 +34,7 @@ class RavelCAdditionalGingaInfo {
   unsigned char bIndependentFlag;
   unsigned int iApplicationIdentifierOrgId;
   unsigned short iApplicationIdentifierAppId;
-  RavelCObjectCarouselTransmissionFormat* pData;  // owned; null unless transmission format 2
+  RavelCObjectCarouselTransmissionFormat* pData = 0;  // owned; null unless transmission format 2
 
  private:
   void Clear();

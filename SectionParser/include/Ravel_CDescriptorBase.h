@@ -42,8 +42,8 @@ class RavelCDescriptorBase {
   unsigned char GetDescriptorLength() const { return iDescriptorLength; }
   const char* GetDescriptorName() const { return sDescriptorName.GetString(); }
 
-  unsigned char iDescriptorTag;
-  unsigned char iDescriptorLength;
+  unsigned char iDescriptorTag = 0;
+  unsigned char iDescriptorLength = 0;
   RavelCString sDescriptorName;
 
  protected:

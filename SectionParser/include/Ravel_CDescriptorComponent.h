@@ -27,10 +27,10 @@ class RavelCComponentDescriptor : public RavelCDescriptorBase {
   unsigned char GetComponentTag() const { return iComponentTag; }
   unsigned int GetISO639LanguageCode() const { return iISO639LanguageCode; }
 
-  unsigned char iStreamContent;  // 4 bits
-  unsigned char iComponentType;
-  unsigned char iComponentTag;
-  unsigned int iISO639LanguageCode;  // 24 bits: 'p','o','r' gives 0x00706F72
+  unsigned char iStreamContent = 0;  // 4 bits
+  unsigned char iComponentType = 0;
+  unsigned char iComponentTag = 0;
+  unsigned int iISO639LanguageCode = 0;  // 24 bits: 'p','o','r' gives 0x00706F72
 
  private:
   void Clear();

@@ -22,8 +22,8 @@ class RavelCCompressionTypeDescriptor : public RavelCDescriptorBase {
   // Size of the module once decompressed.
   unsigned int GetOriginalSize() const { return iOriginalSize; }
 
-  unsigned char iCompressionType;
-  unsigned int iOriginalSize;
+  unsigned char iCompressionType = 0;
+  unsigned int iOriginalSize = 0;
 };
 
 #endif

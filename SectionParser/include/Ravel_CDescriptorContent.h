@@ -28,9 +28,9 @@ class RavelCContentDescriptor : public RavelCDescriptorBase {
   // The user byte of the entry at `index`; out of range traces as GetGenre and gives 0.
   unsigned char GetUserGenre(int index);
 
-  unsigned char* pGenre;      // new[], iGenreCount entries: level 1 << 4 | level 2
-  unsigned char* pUserGenre;  // new[], iGenreCount entries: the two user nibbles
-  int iGenreCount;            // descriptor_length >> 1
+  unsigned char* pGenre = 0;      // new[], iGenreCount entries: level 1 << 4 | level 2
+  unsigned char* pUserGenre = 0;  // new[], iGenreCount entries: the two user nibbles
+  int iGenreCount = 0;            // descriptor_length >> 1
 
  private:
   void Release();

@@ -25,9 +25,9 @@ class RavelCCopyrightDescriptor : public RavelCDescriptorBase {
   // Null when no descriptor has been parsed; always terminated.
   const char* GetCopyrightInfo() const { return pCopyrightInfo; }
 
-  unsigned int iCopyrightId;
+  unsigned int iCopyrightId = 0;
   // malloc'd, (length - 1) mod 256 + 1 bytes: the info bytes and a closing 0.
-  char* pCopyrightInfo;
+  char* pCopyrightInfo = 0;
 
  private:
   void Release();

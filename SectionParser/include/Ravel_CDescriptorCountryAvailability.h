@@ -26,7 +26,7 @@ class RavelCCountryAvailabilityDescriptor : public RavelCDescriptorBase {
   // The code record at `index`; out of range panics through the array and yields null.
   RavelCCountryCode* GetCountryCode(int index) { return aCountryCodes[index]; }
 
-  unsigned char iCountryAvailabilityFlag;
+  unsigned char iCountryAvailabilityFlag = 0;
   RavelCArray<RavelCCountryCode*> aCountryCodes;  // owned records
 
  private:

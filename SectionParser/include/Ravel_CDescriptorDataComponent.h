@@ -20,7 +20,7 @@ class RavelCDataComponentDescriptor : public RavelCDescriptorBase {
 
   unsigned short GetDataComponentId() const { return iDataComponentId; }
 
-  unsigned short iDataComponentId;
+  unsigned short iDataComponentId = 0;
 };
 
 #endif

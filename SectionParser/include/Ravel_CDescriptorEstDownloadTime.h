@@ -20,7 +20,7 @@ class RavelCEstDownloadTimeDescriptor : public RavelCDescriptorBase {
 
   unsigned int GetEstDownloadTime() const { return iEstDownloadTime; }
 
-  unsigned int iEstDownloadTime;
+  unsigned int iEstDownloadTime = 0;
 };
 
 #endif

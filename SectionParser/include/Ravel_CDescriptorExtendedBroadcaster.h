@@ -32,8 +32,8 @@ class RavelCExtendedBroadcasterDescriptor : public RavelCDescriptorBase {
   unsigned short GetOriginalNetworkId(int index) const { return InRange(index) ? aOriginalNetworkIds[index] : 0; }
   unsigned char GetBroadcasterId(int index) const { return InRange(index) ? aBroadcasterIds[index] : 0; }
 
-  unsigned char iBroadcasterType;             // 0..15
-  unsigned short iTerrestrialBroadcasterId;   // the terrestrial sound broadcaster id for type 2
+  unsigned char iBroadcasterType = 0;             // 0..15
+  unsigned short iTerrestrialBroadcasterId = 0;   // the terrestrial sound broadcaster id for type 2
   unsigned char iNumberOfAffiliationIds;      // 0..15
   unsigned char iNumberOfBroadcasterIds;      // 0..15
   unsigned char aAffiliationIds[kMaxIds];

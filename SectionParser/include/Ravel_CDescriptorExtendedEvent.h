@@ -54,11 +54,11 @@ class RavelCExtendedEventDescriptor : public RavelCDescriptorBase {
   // Null when no descriptor has been parsed.
   const char* GetText() const { return pText; }
 
-  unsigned char iDescriptorNumber;
-  unsigned char iLastDescriptorNumber;
+  unsigned char iDescriptorNumber = 0;
+  unsigned char iLastDescriptorNumber = 0;
   char szLanguageCode[4];
   RavelCArray<RavelCExtendedEvent*> aItems;  // owned records
-  char* pText;                               // malloc'd
+  char* pText = 0;                               // malloc'd
 
  private:
   void Release();

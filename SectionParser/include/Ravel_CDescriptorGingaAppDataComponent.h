@@ -24,8 +24,8 @@ class RavelCGingaAppDataComponentDescriptor : public RavelCDescriptorBase {
   unsigned short GetDataComponentId() const { return iDataComponentId; }
   RavelCAdditionalGingaInfo* GetAdditionalGingaInfo() const { return pAdditionalGingaInfo; }
 
-  unsigned short iDataComponentId;
-  RavelCAdditionalGingaInfo* pAdditionalGingaInfo;  // owned; null until a successful parse
+  unsigned short iDataComponentId = 0;
+  RavelCAdditionalGingaInfo* pAdditionalGingaInfo = 0;  // owned; null until a successful parse
 
  private:
   void Release();

@@ -25,7 +25,7 @@ class RavelCInfoDescriptor : public RavelCDescriptorBase {
 
   char szLanguageCode[4];
   // new[] buffer: the text bytes followed by two 0 bytes.
-  char* pText;
+  char* pText = 0;
 
  private:
   void ReleaseText();

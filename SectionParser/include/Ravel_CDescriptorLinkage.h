@@ -24,10 +24,10 @@ class RavelCLinkageDescriptor : public RavelCDescriptorBase {
   unsigned short GetServiceId() const { return iServiceId; }
   unsigned char GetLinkageType() const { return iLinkageType; }
 
-  unsigned short iTransportStreamId;
-  unsigned short iOriginalNetworkId;
-  unsigned short iServiceId;
-  unsigned char iLinkageType;
+  unsigned short iTransportStreamId = 0;
+  unsigned short iOriginalNetworkId = 0;
+  unsigned short iServiceId = 0;
+  unsigned char iLinkageType = 0;
 };
 
 #endif

@@ -20,7 +20,7 @@ class RavelCLocationDescriptor : public RavelCDescriptorBase {
 
   unsigned char GetLocationTag() const { return iLocationTag; }
 
-  unsigned char iLocationTag;
+  unsigned char iLocationTag = 0;
 };
 
 #endif

@@ -29,13 +29,13 @@ class RavelCLogoTransmissionDescriptor : public RavelCDescriptorBase {
   const char* GetLogoCharacters() const { return pLogoCharacters; }
   int GetLogoCharactersLength() const;
 
-  unsigned char iLogoTransmissionType;
-  unsigned short iLogoId;          // 9 bits
-  unsigned short iLogoVersion;     // 12 bits
-  unsigned short iDownloadDataId;
+  unsigned char iLogoTransmissionType = 0;
+  unsigned short iLogoId = 0;          // 9 bits
+  unsigned short iLogoVersion = 0;     // 12 bits
+  unsigned short iDownloadDataId = 0;
   // malloc'd; holds descriptor_length - 1 characters. The buffer has two bytes
   // more than the characters, both 0, so it can also be used as a C text.
-  char* pLogoCharacters;
+  char* pLogoCharacters = 0;
 
  private:
   void Release();

@@ -21,8 +21,8 @@ class RavelCModuleLinkDescriptor : public RavelCDescriptorBase {
   unsigned char GetPosition() const { return iPosition; }
   unsigned short GetModuleId() const { return iModuleId; }
 
-  unsigned char iPosition;
-  unsigned short iModuleId;
+  unsigned char iPosition = 0;
+  unsigned short iModuleId = 0;
 };
 
 #endif

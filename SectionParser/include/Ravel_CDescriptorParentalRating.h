@@ -31,8 +31,8 @@ class RavelCParentalRating {
   unsigned char GetMinimumAge() const { return iMinimumAge; }
 
   char szCountryCode[4];
-  unsigned char iContent;     // Brazil only; left as it is under the Japanese rules
-  unsigned char iMinimumAge;
+  unsigned char iContent = 0;     // Brazil only; left as it is under the Japanese rules
+  unsigned char iMinimumAge = 0;
 };
 
 class RavelCParentalRatingDescriptor : public RavelCDescriptorBase {

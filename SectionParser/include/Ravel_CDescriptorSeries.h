@@ -34,14 +34,14 @@ class RavelCSeriesDescriptor : public RavelCDescriptorBase {
   // Null when the descriptor carries no name (length below 9).
   const char* GetSeriesName() const { return pSeriesName; }
 
-  unsigned short iSeriesId;
-  unsigned char iRepeatLabel;
-  unsigned char iProgramPattern;
-  unsigned char iExpireDateValidFlag;
-  unsigned short iExpireDate;
-  unsigned short iEpisodeNumber;      // 12 bits
-  unsigned short iLastEpisodeNumber;  // 12 bits
-  char* pSeriesName;                  // malloc'd, length - 7 bytes with the closing 0
+  unsigned short iSeriesId = 0;
+  unsigned char iRepeatLabel = 0;
+  unsigned char iProgramPattern = 0;
+  unsigned char iExpireDateValidFlag = 0;
+  unsigned short iExpireDate = 0;
+  unsigned short iEpisodeNumber = 0;      // 12 bits
+  unsigned short iLastEpisodeNumber = 0;  // 12 bits
+  char* pSeriesName = 0;                  // malloc'd, length - 7 bytes with the closing 0
 
  private:
   void Release();

@@ -24,9 +24,9 @@ class RavelCServiceDescriptor : public RavelCDescriptorBase {
   const char* GetServiceProviderName() const { return pServiceProviderName; }
   const char* GetServiceName() const { return pServiceName; }
 
-  unsigned char iServiceType;
-  char* pServiceProviderName;  // malloc'd, NUL-terminated; null for a zero count
-  char* pServiceName;          // malloc'd, NUL-terminated; null for a zero count
+  unsigned char iServiceType = 0;
+  char* pServiceProviderName = 0;  // malloc'd, NUL-terminated; null for a zero count
+  char* pServiceName = 0;          // malloc'd, NUL-terminated; null for a zero count
 
  private:
   void Release();

@@ -21,9 +21,9 @@ class RavelCServiceListDescriptor : public RavelCDescriptorBase {
   // 1 with both outputs set for 0 <= index < count; otherwise a trace, both 0, and 0.
   int GetServiceInfo(int index, unsigned short& serviceId, unsigned short& serviceType);
 
-  unsigned short* pServiceIds;   // iServiceCount entries (new[]), null when empty
-  unsigned char* pServiceTypes;  // iServiceCount entries (new[]), null when empty
-  int iServiceCount;             // descriptor_length / 3; a trailing 1 or 2 bytes are ignored
+  unsigned short* pServiceIds = 0;   // iServiceCount entries (new[]), null when empty
+  unsigned char* pServiceTypes = 0;  // iServiceCount entries (new[]), null when empty
+  int iServiceCount = 0;             // descriptor_length / 3; a trailing 1 or 2 bytes are ignored
 
  private:
   void Release();

@@ -29,8 +29,8 @@ class RavelCShortEventDescriptor : public RavelCDescriptorBase {
   const char* GetText() const { return pEventDescription; }
 
   char szLanguageCode[4];
-  char* pEventName;         // malloc'd
-  char* pEventDescription;  // malloc'd
+  char* pEventName = 0;         // malloc'd
+  char* pEventDescription = 0;  // malloc'd
 
  private:
   void Release();

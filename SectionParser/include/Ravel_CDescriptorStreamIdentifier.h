@@ -21,7 +21,7 @@ class RavelCStreamIdentifierDescriptor : public RavelCDescriptorBase {
 
   unsigned char GetComponentTag() const { return iComponentTag; }
 
-  unsigned char iComponentTag;
+  unsigned char iComponentTag = 0;
 };
 
 #endif

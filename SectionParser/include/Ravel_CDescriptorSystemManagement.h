@@ -24,9 +24,9 @@ class RavelCSystemManagementDescriptor : public RavelCDescriptorBase {
   unsigned char GetBroadcastingIdentifier() const { return iBroadcastingIdentifier; }
   unsigned char GetAdditionalBroadcastingIdentification() const { return iAdditionalBroadcastingIdentification; }
 
-  unsigned char iBroadcastingFlag;
-  unsigned char iBroadcastingIdentifier;
-  unsigned char iAdditionalBroadcastingIdentification;
+  unsigned char iBroadcastingFlag = 0;
+  unsigned char iBroadcastingIdentifier = 0;
+  unsigned char iAdditionalBroadcastingIdentification = 0;
 };
 
 #endif

@@ -30,9 +30,9 @@ class RavelCTSInformationDescriptor : public RavelCDescriptorBase {
   // The record at index 0..3 (only the first GetTransmissionTypeCount() are filled), or null.
   RavelCTxType* GetTxType(int index) { return index >= 0 && index < kTxTypeSlots ? &cTxTypes[index] : 0; }
 
-  unsigned char iRemoteControlKeyId;
+  unsigned char iRemoteControlKeyId = 0;
   RavelCString sTsName;
-  unsigned char iTransmissionTypeCount;
+  unsigned char iTransmissionTypeCount = 0;
   RavelCTxType cTxTypes[kTxTypeSlots];
 
  private:

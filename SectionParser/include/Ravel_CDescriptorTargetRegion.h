@@ -23,8 +23,8 @@ class RavelCTargetRegionDescriptor : public RavelCDescriptorBase {
   unsigned char GetRegionSpecType() const { return iRegionSpecType; }
 
   // malloc'd, (length - 1) mod 256 + 1 bytes: the region bytes and a closing 0.
-  char* pRegionSpec;
-  unsigned char iRegionSpecType;
+  char* pRegionSpec = 0;
+  unsigned char iRegionSpecType = 0;
 
  private:
   void Release();

@@ -31,11 +31,11 @@ class RavelCTerrDeliverySystemDescriptor : public RavelCDescriptorBase {
   // (1-4: 4, 5-16: 2, 17-23 and 26: 3, 24-25: 5), 0 with a trace for the others.
   int GetRegionId() const;
 
-  unsigned short iAreaCode;        // 12 bits
-  unsigned char iGuardInterval;    // 2 bits
-  unsigned char iTransmissionMode; // 2 bits
-  int iFrequencyCount;             // (descriptor_length - 2) / 2; -1 for a length of 0
-  unsigned short* pFrequencies;    // iFrequencyCount entries (new[]), null when there are none
+  unsigned short iAreaCode = 0;        // 12 bits
+  unsigned char iGuardInterval = 0;    // 2 bits
+  unsigned char iTransmissionMode = 0; // 2 bits
+  int iFrequencyCount = 0;             // (descriptor_length - 2) / 2; -1 for a length of 0
+  unsigned short* pFrequencies = 0;    // iFrequencyCount entries (new[]), null when there are none
 
  private:
   void Release();

@@ -38,11 +38,11 @@ class RavelCDsmccDDB : public RavelCDsmccBase {
   const unsigned char* GetBlockData() const { return pBlockData; }
   int GetBlockDataLen() const { return iBlockDataLen; }
 
-  unsigned short iModuleId;
-  unsigned char iModuleVersion;
-  unsigned short iBlockNumber;
-  unsigned char* pBlockData;  // malloc'ed, iBlockDataLen bytes
-  int iBlockDataLen;
+  unsigned short iModuleId = 0;
+  unsigned char iModuleVersion = 0;
+  unsigned short iBlockNumber = 0;
+  unsigned char* pBlockData = 0;  // malloc'ed, iBlockDataLen bytes
+  int iBlockDataLen = 0;
 
  private:
   void ReleaseBlock();

@@ -47,17 +47,17 @@ class RavelCModuleInfo {
   RavelCEstDownloadTimeDescriptor* GetEstDownloadTimeDescriptor() const { return pEstDownloadTimeDescriptor; }
   RavelCCompressionTypeDescriptor* GetCompressionTypeDescriptor() const { return pCompressionTypeDescriptor; }
 
-  unsigned short iModuleId;
-  unsigned int iModuleSize;
-  unsigned char iModuleVersion;
-  unsigned char iModuleInfoLength;
-  RavelCTypeDescriptor* pTypeDescriptor;
-  RavelCNameDescriptor* pNameDescriptor;
-  RavelCInfoDescriptor* pInfoDescriptor;
-  RavelCModuleLinkDescriptor* pModuleLinkDescriptor;
-  RavelCCRC32Descriptor* pCRC32Descriptor;
-  RavelCEstDownloadTimeDescriptor* pEstDownloadTimeDescriptor;
-  RavelCCompressionTypeDescriptor* pCompressionTypeDescriptor;
+  unsigned short iModuleId = 0;
+  unsigned int iModuleSize = 0;
+  unsigned char iModuleVersion = 0;
+  unsigned char iModuleInfoLength = 0;
+  RavelCTypeDescriptor* pTypeDescriptor = 0;
+  RavelCNameDescriptor* pNameDescriptor = 0;
+  RavelCInfoDescriptor* pInfoDescriptor = 0;
+  RavelCModuleLinkDescriptor* pModuleLinkDescriptor = 0;
+  RavelCCRC32Descriptor* pCRC32Descriptor = 0;
+  RavelCEstDownloadTimeDescriptor* pEstDownloadTimeDescriptor = 0;
+  RavelCCompressionTypeDescriptor* pCompressionTypeDescriptor = 0;
 
  private:
   void DeleteDescriptors();

@@ -22,8 +22,8 @@ class RavelCDsmccDSI : public RavelCDsmccBase {
   unsigned char* GetPrivateData() const { return pPrivateData; }
 
   RavelCNASP cNASP;
-  int iPrivateDataLength;
-  unsigned char* pPrivateData;
+  int iPrivateDataLength = 0;
+  unsigned char* pPrivateData = 0;
 };
 
 #endif

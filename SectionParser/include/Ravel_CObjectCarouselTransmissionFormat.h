@@ -17,10 +17,10 @@ class RavelCObjectCarouselTransmissionFormat {
   unsigned char GetFileStorableFlag() const { return bFileStorableFlag; }
   unsigned char GetEventSectionFlag() const { return bEventSectionFlag; }
 
-  unsigned int iCarouselId;
-  unsigned char bOnDemandRetrievalFlag;
-  unsigned char bFileStorableFlag;
-  unsigned char bEventSectionFlag;
+  unsigned int iCarouselId = 0;
+  unsigned char bOnDemandRetrievalFlag = 0;
+  unsigned char bFileStorableFlag = 0;
+  unsigned char bEventSectionFlag = 0;
 };
 
 #endif

@@ -22,7 +22,7 @@ class RavelCPCR {
   virtual int ParseRawData(unsigned char* packet);
   virtual void Show();
 
-  unsigned long long mPCR;  // milliseconds
+  unsigned long long mPCR = 0;  // milliseconds
 };
 
 #endif

@@ -222,15 +222,15 @@ class RavelCSafeSection {
   template <class T>
   RavelSafeResult ParseCallers(const unsigned char* bytes, int count, T& table);
 
-  unsigned char* pBuffer;  // iCapacity bytes, the first iDataSize the checked bytes
-  int iCapacity;
-  int iDataSize;
+  unsigned char* pBuffer = 0;  // iCapacity bytes, the first iDataSize the checked bytes
+  int iCapacity = 0;
+  int iDataSize = 0;
   RavelSafeRefusal cRefusal;
-  int iParseResult;
-  RavelCTableBase* pTable;
-  RavelCTDT* pTDT;
-  RavelCTOT* pTOT;
-  RavelCDsmccBase* pMessage;
+  int iParseResult = 0;
+  RavelCTableBase* pTable = 0;
+  RavelCTDT* pTDT = 0;
+  RavelCTOT* pTOT = 0;
+  RavelCDsmccBase* pMessage = 0;
   int iRow;  // row of the class that made pTable or pMessage, -1 when none
 };
 

@@ -54,22 +54,22 @@ class RavelCSectionAssembler {
   void ClearPacketBuffer();
 
   // Sections handed out whole.
-  unsigned int iSectionsDelivered;
+  unsigned int iSectionsDelivered = 0;
   // Sections started but lost: a packet missing or repeated too often, the
   // next section starting early, or an invalid packet in the middle.
-  unsigned int iSectionsCut;
+  unsigned int iSectionsCut = 0;
   // Packets dropped: transport_error_indicator set; a repeat of the previous
   // packet; no sync byte, reserved adaptation_field_control, an adaptation
   // field leaving no payload or a pointer_field past the packet end.
-  unsigned int iPacketsTransportError;
-  unsigned int iPacketsRepeated;
-  unsigned int iPacketsInvalid;
+  unsigned int iPacketsTransportError = 0;
+  unsigned int iPacketsRepeated = 0;
+  unsigned int iPacketsInvalid = 0;
   // Counter steps other than +1 that the adaptation field did not announce
   // with its discontinuity_indicator.
-  unsigned int iContinuityBreaks;
+  unsigned int iContinuityBreaks = 0;
   // Payload bytes of sections whose start was never received (after a break
   // or at the start of the stream), skipped until the next section start.
-  unsigned int iBytesWithoutStart;
+  unsigned int iBytesWithoutStart = 0;
 
  private:
   RavelCSectionAssembler(const RavelCSectionAssembler&);
@@ -89,9 +89,9 @@ class RavelCSectionAssembler {
   RavelSectionHandler pHandler;
   void* pContext;
   int iLastCounter;   // -1 before the first packet with payload
-  int iRepeats;       // times the last counter has been seen again
-  int iHeld;          // bytes of the section in progress; 0 when none
-  int iSectionSize;   // its size, 0 while its first three bytes are not all held
+  int iRepeats = 0;       // times the last counter has been seen again
+  int iHeld = 0;          // bytes of the section in progress; 0 when none
+  int iSectionSize = 0;   // its size, 0 while its first three bytes are not all held
   unsigned char aSection[RAVEL_MAX_SECTION_SIZE];
 };
 

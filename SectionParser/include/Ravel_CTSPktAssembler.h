@@ -24,7 +24,7 @@ class RavelCPktEntry {
   int GetData(unsigned char* destination, int& count);
 
   unsigned char aData[188];
-  unsigned char iDataLen;  // 0 to 188; 0 once consumed
+  unsigned char iDataLen = 0;  // 0 to 188; 0 once consumed
 };
 
 // Completed sections of one or two AddTSPacket calls. The buffers are malloc'ed
@@ -40,7 +40,7 @@ class RavelCSectionData {
 
   unsigned char* pSection[RAVEL_MAX_ASSEMBLED_SECTIONS];
   int iSectionSize[RAVEL_MAX_ASSEMBLED_SECTIONS];  // table_id to the end of the CRC
-  int iSectionCount;
+  int iSectionCount = 0;
 
   // Takes ownership of a malloc'ed section that owns the bytes said above. A record already holding five
   // sections cannot store more: the buffer is freed and the section dropped.
@@ -68,7 +68,7 @@ class RavelCTSPktStore {
   int ClearPacketBuffer();
 
   unsigned short iPID;  // of the packet that started the section in progress; 0xFFFF when idle
-  int iCurBufSize;      // bytes held in the pieces
+  int iCurBufSize = 0;      // bytes held in the pieces
   int iLastConIndex;    // continuity_counter of the last stored packet; 255 when idle
   int iSectionLen;      // section_length + 3 of the section in progress; -1 while unknown
   RavelCPointerArray<RavelCPktEntry> iPacketArray;

@@ -31,9 +31,9 @@ class RavelCBroadcasterDescriptor {
   unsigned short GetBroadcasterDescriptorsLength() const { return iBroadcasterDescriptorsLength; }
   RavelCExtendedBroadcasterDescriptor* GetExtendedBroadcaster() { return pExtendedBroadcasterDescriptor; }
 
-  unsigned char iBroadcasterId;
-  unsigned short iBroadcasterDescriptorsLength;  // 12 bits
-  RavelCExtendedBroadcasterDescriptor* pExtendedBroadcasterDescriptor;  // owned, or null
+  unsigned char iBroadcasterId = 0;
+  unsigned short iBroadcasterDescriptorsLength = 0;  // 12 bits
+  RavelCExtendedBroadcasterDescriptor* pExtendedBroadcasterDescriptor = 0;  // owned, or null
 
  private:
   void DeleteDescriptor();
@@ -58,8 +58,8 @@ class RavelCBIT : public RavelCTableBase {
   // The record at `index` (bounds-checked by the array).
   RavelCBroadcasterDescriptor* GetBroadcaster(int index) { return aBroadcasterDescriptor[index]; }
 
-  unsigned char bBroadcasterViewPropriety;
-  unsigned short iFirstDescriptorsLength;  // 12 bits
+  unsigned char bBroadcasterViewPropriety = 0;
+  unsigned short iFirstDescriptorsLength = 0;  // 12 bits
   RavelCArray<RavelCBroadcasterDescriptor*> aBroadcasterDescriptor;  // section order, owned
 };
 

@@ -20,7 +20,7 @@ class RavelCTableBase {
   int SetTableName(const RavelCString& name);
   int SetTableName(const char* name);
 
-  unsigned char iSession;  // the caller's tag; the library only clears and prints it
+  unsigned char iSession = 0;  // the caller's tag; the library only clears and prints it
   unsigned char iTableId;
   unsigned char bSectionSyntaxIndicator;
   unsigned short iSectionLength;

@@ -70,18 +70,18 @@ class RavelCEventInfo {
   unsigned char iRunningStatus;                               // 3 bits
   unsigned char bFreeCAMode;                                  // 1 bit
   unsigned short iDescriptorsLoopLength;                      // 12 bits
-  unsigned char iSpare;                                       // cleared and copied, never parsed
-  RavelCShortEventDescriptor* pShortEventDescriptor;          // 0x4D, owned
-  RavelCContentDescriptor* pContentDescriptor;                // 0x54, owned
-  RavelCComponentDescriptor* pComponentDescriptor;            // 0x50, owned
-  RavelCParentalRatingDescriptor* pParentalRatingDescriptor;  // 0x55, owned
+  unsigned char iSpare = 0;                                       // cleared and copied, never parsed
+  RavelCShortEventDescriptor* pShortEventDescriptor = 0;          // 0x4D, owned
+  RavelCContentDescriptor* pContentDescriptor = 0;                // 0x54, owned
+  RavelCComponentDescriptor* pComponentDescriptor = 0;            // 0x50, owned
+  RavelCParentalRatingDescriptor* pParentalRatingDescriptor = 0;  // 0x55, owned
   // Every audio component descriptor (0xC4) in arrival order; the list releases
   // them when emptied. Null only after a parse failed on a malformed descriptor.
-  list_head* pAudioComponentList;
-  RavelCCopyrightDescriptor* pCopyrightDescriptor;  // 0x0D, owned
+  list_head* pAudioComponentList = 0;
+  RavelCCopyrightDescriptor* pCopyrightDescriptor = 0;  // 0x0D, owned
   // Only the last of an event's extended event descriptors is kept.
-  RavelCExtendedEventDescriptor* pExtendedEventDescriptor;  // 0x4E, owned
-  RavelCSeriesDescriptor* pSeriesDescriptor;                // 0xD5, owned
+  RavelCExtendedEventDescriptor* pExtendedEventDescriptor = 0;  // 0x4E, owned
+  RavelCSeriesDescriptor* pSeriesDescriptor = 0;                // 0xD5, owned
 
  private:
   void DeleteDescriptors();
@@ -113,11 +113,11 @@ class RavelCEIT : public RavelCTableBase {
   // The event at `index` (bounds-checked by the array).
   RavelCEventInfo* GetEventInfo(int index) { return aEventInfo[index]; }
 
-  unsigned char iEITTableId;  // table_id of the last accepted section
-  unsigned short iTransportStreamId;
-  unsigned short iOriginalNetworkId;
-  unsigned char iSegmentLastSectionNumber;
-  unsigned char iLastTableId;
+  unsigned char iEITTableId = 0;  // table_id of the last accepted section
+  unsigned short iTransportStreamId = 0;
+  unsigned short iOriginalNetworkId = 0;
+  unsigned char iSegmentLastSectionNumber = 0;
+  unsigned char iLastTableId = 0;
   RavelCPointerArray<RavelCEventInfo> aEventInfo;  // owned events
 
  private:

@@ -42,13 +42,13 @@ class RavelCTSInfo {
   RavelCTSInformationDescriptor* GetTSInformation() { return pTSInformation; }
   RavelCPartialReceptionDescriptor* GetPartialReception() { return pPartialReception; }
 
-  unsigned short iTransportStreamId;
-  unsigned short iOriginalNetworkId;
-  unsigned short iTransportDescriptorsLength;  // 12 bits
-  RavelCServiceListDescriptor* pServiceList;                // owned, or null
-  RavelCTerrDeliverySystemDescriptor* pTerrDeliverySystem;  // owned, or null
-  RavelCTSInformationDescriptor* pTSInformation;            // owned, or null
-  RavelCPartialReceptionDescriptor* pPartialReception;      // owned, or null
+  unsigned short iTransportStreamId = 0;
+  unsigned short iOriginalNetworkId = 0;
+  unsigned short iTransportDescriptorsLength = 0;  // 12 bits
+  RavelCServiceListDescriptor* pServiceList = 0;                // owned, or null
+  RavelCTerrDeliverySystemDescriptor* pTerrDeliverySystem = 0;  // owned, or null
+  RavelCTSInformationDescriptor* pTSInformation = 0;            // owned, or null
+  RavelCPartialReceptionDescriptor* pPartialReception = 0;      // owned, or null
 
  private:
   void DeleteDescriptors();
@@ -75,9 +75,9 @@ class RavelCNIT : public RavelCTableBase {
   // The transport stream at `index` (bounds-checked by the array).
   RavelCTSInfo* GetTSInfo(int index) { return aTSInfoList[index]; }
 
-  RavelCLinkageDescriptor* pLinkage;                    // owned, or null
-  RavelCNetworkNameDescriptor* pNetworkName;            // owned, or null
-  RavelCSystemManagementDescriptor* pSystemManagement;  // owned, or null
+  RavelCLinkageDescriptor* pLinkage = 0;                    // owned, or null
+  RavelCNetworkNameDescriptor* pNetworkName = 0;            // owned, or null
+  RavelCSystemManagementDescriptor* pSystemManagement = 0;  // owned, or null
   RavelCArray<RavelCTSInfo*> aTSInfoList;               // section order, owned
 
  private:

@@ -21,8 +21,8 @@ class RavelCPMTInfo {
   unsigned short GetProgramNumber() const { return iProgramNumber; }
   unsigned short GetPID() const { return iPID; }
 
-  unsigned short iProgramNumber;
-  unsigned short iPID;  // program_map_PID, 13 bits
+  unsigned short iProgramNumber = 0;
+  unsigned short iPID = 0;  // program_map_PID, 13 bits
 };
 
 class RavelCPAT : public RavelCTableBase {

@@ -44,15 +44,15 @@ class RavelCMapInfo {
   RavelCDataComponentDescriptor* GetDataComponent() { return pDataComponent; }
   RavelCTargetRegionDescriptor* GetTargetRegion() { return pTargetRegion; }
 
-  unsigned char iStreamType;
-  unsigned short iElementaryPID;  // 13 bits
-  unsigned short iESInfoLength;   // 12 bits
+  unsigned char iStreamType = 0;
+  unsigned short iElementaryPID = 0;  // 13 bits
+  unsigned short iESInfoLength = 0;   // 12 bits
   // CA_PID of the last CA descriptor seen since construction; a parse without
   // one leaves it as it was.
-  unsigned short iCAPID;
-  RavelCStreamIdentifierDescriptor* pStreamIdentifier;  // owned, or null
-  RavelCDataComponentDescriptor* pDataComponent;        // owned, or null
-  RavelCTargetRegionDescriptor* pTargetRegion;          // owned, or null
+  unsigned short iCAPID = 0;
+  RavelCStreamIdentifierDescriptor* pStreamIdentifier = 0;  // owned, or null
+  RavelCDataComponentDescriptor* pDataComponent = 0;        // owned, or null
+  RavelCTargetRegionDescriptor* pTargetRegion = 0;          // owned, or null
 
  private:
   void DeleteDescriptors();
@@ -87,10 +87,10 @@ class RavelCPMT : public RavelCTableBase {
   RavelCMapInfo* GetMapInfo(int index) { return aMapInfoList[index]; }
   RavelCParentalRatingDescriptor* GetParentalRating() { return pParentalRating; }
 
-  unsigned short iPCRPID;             // 13 bits
-  unsigned short iProgramInfoLength;  // 12 bits
+  unsigned short iPCRPID = 0;             // 13 bits
+  unsigned short iProgramInfoLength = 0;  // 12 bits
   RavelCArray<RavelCMapInfo*> aMapInfoList;  // the streams in section order, owned
-  RavelCParentalRatingDescriptor* pParentalRating;  // owned, or null
+  RavelCParentalRatingDescriptor* pParentalRating = 0;  // owned, or null
 
  private:
   // The PMT has no copy constructor, only the assignment.

@@ -48,16 +48,16 @@ class RavelCServiceDescription {
   RavelCLogoTransmissionDescriptor* GetLogoTransmission() { return pLogoTransmission; }
   RavelCCountryAvailabilityDescriptor* GetCountryAvailability() { return pCountryAvailability; }
 
-  unsigned short iServiceId;
-  unsigned char iEITCompanyDefFlag;  // EIT_user_defined_flags, 3 bits
-  unsigned char bEITScheduleFlag;
-  unsigned char bEITPresentFollowingFlag;
-  unsigned char iRunningStatus;  // 3 bits
-  unsigned char bFreeCAMode;
-  unsigned short iDescriptorsLoopLength;  // 12 bits
-  RavelCServiceDescriptor* pService;                          // owned, or null
-  RavelCLogoTransmissionDescriptor* pLogoTransmission;        // owned, or null
-  RavelCCountryAvailabilityDescriptor* pCountryAvailability;  // owned, or null
+  unsigned short iServiceId = 0;
+  unsigned char iEITCompanyDefFlag = 0;  // EIT_user_defined_flags, 3 bits
+  unsigned char bEITScheduleFlag = 0;
+  unsigned char bEITPresentFollowingFlag = 0;
+  unsigned char iRunningStatus = 0;  // 3 bits
+  unsigned char bFreeCAMode = 0;
+  unsigned short iDescriptorsLoopLength = 0;  // 12 bits
+  RavelCServiceDescriptor* pService = 0;                          // owned, or null
+  RavelCLogoTransmissionDescriptor* pLogoTransmission = 0;        // owned, or null
+  RavelCCountryAvailabilityDescriptor* pCountryAvailability = 0;  // owned, or null
 
  private:
   void ClearScalars();
@@ -84,7 +84,7 @@ class RavelCSDT : public RavelCTableBase {
 
   // The upper byte of original_network_id alone (0x0640 is kept as 0x0006):
   // receivers compare against this value as the table has always stored it.
-  unsigned short iOriginalNetworkId;
+  unsigned short iOriginalNetworkId = 0;
   RavelCArray<RavelCServiceDescription*> aServiceList;  // the services in section order, owned
 
  private:

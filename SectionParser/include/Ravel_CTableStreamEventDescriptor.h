@@ -32,7 +32,7 @@ class RavelCDsmccStreamEvent : public RavelCTableBase {
   // bound panic, then null.
   RavelCGeneralEventDescriptor* GetGeneralEvent(int index) { return cGeneralEvents[index]; }
 
-  RavelCNPTReferenceDescriptor* pNPTReference;
+  RavelCNPTReferenceDescriptor* pNPTReference = 0;
   // A plain array of pointers: the table deletes the descriptors itself.
   RavelCArray<RavelCGeneralEventDescriptor*> cGeneralEvents;
 

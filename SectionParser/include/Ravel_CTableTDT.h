@@ -25,17 +25,17 @@ class RavelCTDT {
   int SetTableName(const char* name);
 
   RavelCString sTableName;  // "TDT" once a TDT has been parsed
-  unsigned char iTableId;
-  unsigned char bSectionSyntaxIndicator;
-  unsigned short iSectionLength;  // 12 bits
+  unsigned char iTableId = 0;
+  unsigned char bSectionSyntaxIndicator = 0;
+  unsigned short iSectionLength = 0;  // 12 bits
   // Date by the receiver's MJD rule (the first of a month is day 31 or 32 of the
   // month before), time by the BCD rule.
-  int iYear;
-  int iMonth;
-  int iDay;
-  int iHour;
-  int iMinute;
-  int iSecond;
+  int iYear = 0;
+  int iMonth = 0;
+  int iDay = 0;
+  int iHour = 0;
+  int iMinute = 0;
+  int iSecond = 0;
 };
 
 #endif

@@ -48,7 +48,7 @@ class RavelCTOT {
   int iSecond;
   unsigned short iDescriptorsLoopLength;  // 12 bits
   // The last local time offset descriptor (0x58) of the loop, or null. Owned.
-  RavelCLocalTimeOffsetDescriptor* pLocalTimeOffsetDescriptor;
+  RavelCLocalTimeOffsetDescriptor* pLocalTimeOffsetDescriptor = 0;
 
  private:
   void ClearFields();

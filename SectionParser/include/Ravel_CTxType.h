@@ -24,9 +24,9 @@ class RavelCTxType {
   // Bytes the record takes in the descriptor: 2 + 2 x number of services.
   int GetRecordSize() const { return 2 + 2 * iNumOfService; }
 
-  unsigned char iTransmissionTypeInfo;
-  unsigned char iNumOfService;
-  unsigned short* pServiceIds;  // iNumOfService entries (new[]), null when there are none
+  unsigned char iTransmissionTypeInfo = 0;
+  unsigned char iNumOfService = 0;
+  unsigned short* pServiceIds = 0;  // iNumOfService entries (new[]), null when there are none
 
  private:
   void Release();

@@ -9,9 +9,9 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CAdditionalGingaInfo");
 // Only the object carousel format carries a record of its own.
 static const unsigned char kObjectCarouselFormat = 2;
 
-RavelCAdditionalGingaInfo::RavelCAdditionalGingaInfo() : pData(0) { Clear(); }
+RavelCAdditionalGingaInfo::RavelCAdditionalGingaInfo() { Clear(); }
 
-RavelCAdditionalGingaInfo::RavelCAdditionalGingaInfo(const RavelCAdditionalGingaInfo& other) : pData(0) {
+RavelCAdditionalGingaInfo::RavelCAdditionalGingaInfo(const RavelCAdditionalGingaInfo& other) {
   Clear();
   *this = other;
 }

@@ -6,7 +6,7 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorBase");
 
-RavelCDescriptorBase::RavelCDescriptorBase() : iDescriptorTag(0), iDescriptorLength(0), sDescriptorName() {
+RavelCDescriptorBase::RavelCDescriptorBase() : sDescriptorName() {
   RavelCDescriptorBase::ParseRawData(0);
 }
 

@@ -11,8 +11,7 @@ const RavelCDescriptorKind RavelCComponentDescriptor::kKind = {
     0x50, "Component Descriptor", "This Descriptor isn't Component Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCComponentDescriptor::RavelCComponentDescriptor(unsigned char* raw)
-    : iStreamContent(0), iComponentType(0), iComponentTag(0), iISO639LanguageCode(0) {
+RavelCComponentDescriptor::RavelCComponentDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

@@ -15,8 +15,7 @@ const RavelCDescriptorKind RavelCCompressionTypeDescriptor::kKind = {
     RAVEL_WRONG_TAG_MASK,
     false, kRavelTraceSourcePath};
 
-RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(unsigned char* raw)
-    : iCompressionType(0), iOriginalSize(0) {
+RavelCCompressionTypeDescriptor::RavelCCompressionTypeDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

@@ -12,12 +12,12 @@ const RavelCDescriptorKind RavelCContentDescriptor::kKind = {
     0x54, "Content Descriptor", "This Descriptor isn't Content Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Content Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCContentDescriptor::RavelCContentDescriptor(unsigned char* raw) : pGenre(0), pUserGenre(0), iGenreCount(0) {
+RavelCContentDescriptor::RavelCContentDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCContentDescriptor::RavelCContentDescriptor(RavelCContentDescriptor& other)
-    : RavelCDescriptorBase(other), pGenre(0), pUserGenre(0), iGenreCount(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

@@ -15,12 +15,12 @@ const RavelCDescriptorKind RavelCCopyrightDescriptor::kKind = {
     0x0D, "Copyright Descriptor", "This Descriptor isn't Copyright Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Copyright Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCCopyrightDescriptor::RavelCCopyrightDescriptor(unsigned char* raw) : iCopyrightId(0), pCopyrightInfo(0) {
+RavelCCopyrightDescriptor::RavelCCopyrightDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCCopyrightDescriptor::RavelCCopyrightDescriptor(RavelCCopyrightDescriptor& other)
-    : RavelCDescriptorBase(other), iCopyrightId(0), pCopyrightInfo(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

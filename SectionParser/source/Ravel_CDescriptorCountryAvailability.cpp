@@ -13,12 +13,12 @@ const RavelCDescriptorKind RavelCCountryAvailabilityDescriptor::kKind = {
     "\t=================== Country Availability Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCCountryAvailabilityDescriptor::RavelCCountryAvailabilityDescriptor(unsigned char* raw)
-    : iCountryAvailabilityFlag(0), aCountryCodes() {
+    : aCountryCodes() {
   ParseRawData(raw);
 }
 
 RavelCCountryAvailabilityDescriptor::RavelCCountryAvailabilityDescriptor(RavelCCountryAvailabilityDescriptor& other)
-    : RavelCDescriptorBase(other), iCountryAvailabilityFlag(0), aCountryCodes() {
+    : RavelCDescriptorBase(other), aCountryCodes() {
   *this = other;
 }
 

@@ -11,7 +11,7 @@ const RavelCDescriptorKind RavelCDataComponentDescriptor::kKind = {
     0xFD, "Data Component Descriptor", "This Descriptor isn't Data Component Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Data Component Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(unsigned char* raw) : iDataComponentId(0) {
+RavelCDataComponentDescriptor::RavelCDataComponentDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

@@ -15,7 +15,7 @@ const RavelCDescriptorKind RavelCEstDownloadTimeDescriptor::kKind = {
     RAVEL_WRONG_TAG_MASK,
     false, kRavelTraceSourcePath};
 
-RavelCEstDownloadTimeDescriptor::RavelCEstDownloadTimeDescriptor(unsigned char* raw) : iEstDownloadTime(0) {
+RavelCEstDownloadTimeDescriptor::RavelCEstDownloadTimeDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

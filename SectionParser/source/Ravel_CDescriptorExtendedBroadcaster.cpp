@@ -14,8 +14,7 @@ const RavelCDescriptorKind RavelCExtendedBroadcasterDescriptor::kKind = {
     "This Descriptor isn't Extended Broadcaster Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Extended Broadcaster Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(unsigned char* raw)
-    : iBroadcasterType(0), iTerrestrialBroadcasterId(0) {
+RavelCExtendedBroadcasterDescriptor::RavelCExtendedBroadcasterDescriptor(unsigned char* raw) {
   Release();
   ParseRawData(raw);
 }

@@ -36,13 +36,13 @@ const RavelCDescriptorKind RavelCExtendedEventDescriptor::kKind = {
     "\t=================== Extended Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCExtendedEventDescriptor::RavelCExtendedEventDescriptor(unsigned char* raw)
-    : iDescriptorNumber(0), iLastDescriptorNumber(0), aItems(), pText(0) {
+    : aItems() {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   ParseRawData(raw);
 }
 
 RavelCExtendedEventDescriptor::RavelCExtendedEventDescriptor(RavelCExtendedEventDescriptor& other)
-    : RavelCDescriptorBase(other), iDescriptorNumber(0), iLastDescriptorNumber(0), aItems(), pText(0) {
+    : RavelCDescriptorBase(other), aItems() {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   *this = other;
 }

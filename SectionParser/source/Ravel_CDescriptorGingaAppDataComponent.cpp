@@ -14,14 +14,13 @@ const RavelCDescriptorKind RavelCGingaAppDataComponentDescriptor::kKind = {
     "This Descriptor isn't Ginga Application Data Component! Descriptor Tag=[0x%x]\n", 0 /* no Show */,
     RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCGingaAppDataComponentDescriptor::RavelCGingaAppDataComponentDescriptor(unsigned char* raw)
-    : iDataComponentId(0), pAdditionalGingaInfo(0) {
+RavelCGingaAppDataComponentDescriptor::RavelCGingaAppDataComponentDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCGingaAppDataComponentDescriptor::RavelCGingaAppDataComponentDescriptor(
     RavelCGingaAppDataComponentDescriptor& other)
-    : RavelCDescriptorBase(other), iDataComponentId(0), pAdditionalGingaInfo(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

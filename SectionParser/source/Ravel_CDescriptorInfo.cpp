@@ -17,12 +17,12 @@ const RavelCDescriptorKind RavelCInfoDescriptor::kKind = {
     RAVEL_UTILITY_WARNING,
     false, kRavelTraceSourcePath};
 
-RavelCInfoDescriptor::RavelCInfoDescriptor(unsigned char* raw) : pText(0) {
+RavelCInfoDescriptor::RavelCInfoDescriptor(unsigned char* raw) {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   ParseRawData(raw);
 }
 
-RavelCInfoDescriptor::RavelCInfoDescriptor(RavelCInfoDescriptor& other) : RavelCDescriptorBase(other), pText(0) {
+RavelCInfoDescriptor::RavelCInfoDescriptor(RavelCInfoDescriptor& other) : RavelCDescriptorBase(other) {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   *this = other;
 }

@@ -11,8 +11,7 @@ const RavelCDescriptorKind RavelCLinkageDescriptor::kKind = {
     0x4A, "Linkage Descriptor", "This Descriptor isn't Linkage Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Linkage Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCLinkageDescriptor::RavelCLinkageDescriptor(unsigned char* raw)
-    : iTransportStreamId(0), iOriginalNetworkId(0), iServiceId(0), iLinkageType(0) {
+RavelCLinkageDescriptor::RavelCLinkageDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

@@ -14,7 +14,7 @@ const RavelCDescriptorKind RavelCLocationDescriptor::kKind = {
     RAVEL_WRONG_TAG_MASK,
     false, kRavelTraceSourcePath};
 
-RavelCLocationDescriptor::RavelCLocationDescriptor(unsigned char* raw) : iLocationTag(0) { ParseRawData(raw); }
+RavelCLocationDescriptor::RavelCLocationDescriptor(unsigned char* raw) { ParseRawData(raw); }
 
 RavelCLocationDescriptor::RavelCLocationDescriptor(RavelCLocationDescriptor&) = default;
 

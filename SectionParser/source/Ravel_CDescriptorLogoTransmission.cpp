@@ -48,18 +48,12 @@ char* DuplicateLogoCharacters(const char* text, int descriptorLength) {
 
 }  // namespace
 
-RavelCLogoTransmissionDescriptor::RavelCLogoTransmissionDescriptor(unsigned char* raw)
-    : iLogoTransmissionType(0), iLogoId(0), iLogoVersion(0), iDownloadDataId(0), pLogoCharacters(0) {
+RavelCLogoTransmissionDescriptor::RavelCLogoTransmissionDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCLogoTransmissionDescriptor::RavelCLogoTransmissionDescriptor(RavelCLogoTransmissionDescriptor& other)
-    : RavelCDescriptorBase(other),
-      iLogoTransmissionType(0),
-      iLogoId(0),
-      iLogoVersion(0),
-      iDownloadDataId(0),
-      pLogoCharacters(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

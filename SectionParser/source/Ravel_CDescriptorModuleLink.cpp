@@ -15,7 +15,7 @@ const RavelCDescriptorKind RavelCModuleLinkDescriptor::kKind = {
     RAVEL_WRONG_TAG_MASK,
     false, kRavelTraceSourcePath};
 
-RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(unsigned char* raw) : iPosition(0), iModuleId(0) {
+RavelCModuleLinkDescriptor::RavelCModuleLinkDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

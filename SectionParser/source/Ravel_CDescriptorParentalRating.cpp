@@ -10,11 +10,11 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorParentalRating");
 
-RavelCParentalRating::RavelCParentalRating() : iContent(0), iMinimumAge(0) {
+RavelCParentalRating::RavelCParentalRating() {
   std::memset(szCountryCode, 0, sizeof(szCountryCode));
 }
 
-RavelCParentalRating::RavelCParentalRating(unsigned char* raw) : iContent(0), iMinimumAge(0) {
+RavelCParentalRating::RavelCParentalRating(unsigned char* raw) {
   std::memset(szCountryCode, 0, sizeof(szCountryCode));
   ParseRawData(raw);
 }

@@ -12,28 +12,12 @@ const RavelCDescriptorKind RavelCSeriesDescriptor::kKind = {
     0xD5, "Series Descriptor", "This Descriptor isn't Series Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Series Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCSeriesDescriptor::RavelCSeriesDescriptor(unsigned char* raw)
-    : iSeriesId(0),
-      iRepeatLabel(0),
-      iProgramPattern(0),
-      iExpireDateValidFlag(0),
-      iExpireDate(0),
-      iEpisodeNumber(0),
-      iLastEpisodeNumber(0),
-      pSeriesName(0) {
+RavelCSeriesDescriptor::RavelCSeriesDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCSeriesDescriptor::RavelCSeriesDescriptor(RavelCSeriesDescriptor& other)
-    : RavelCDescriptorBase(other),
-      iSeriesId(0),
-      iRepeatLabel(0),
-      iProgramPattern(0),
-      iExpireDateValidFlag(0),
-      iExpireDate(0),
-      iEpisodeNumber(0),
-      iLastEpisodeNumber(0),
-      pSeriesName(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

@@ -11,13 +11,12 @@ const RavelCDescriptorKind RavelCServiceDescriptor::kKind = {
     0x48, "Service Descriptor", "This Descriptor isn't Service Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Service Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCServiceDescriptor::RavelCServiceDescriptor(unsigned char* raw)
-    : iServiceType(0), pServiceProviderName(0), pServiceName(0) {
+RavelCServiceDescriptor::RavelCServiceDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCServiceDescriptor::RavelCServiceDescriptor(RavelCServiceDescriptor& other)
-    : RavelCDescriptorBase(other), iServiceType(0), pServiceProviderName(0), pServiceName(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

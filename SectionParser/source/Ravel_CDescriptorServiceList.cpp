@@ -12,13 +12,12 @@ const RavelCDescriptorKind RavelCServiceListDescriptor::kKind = {
     "This Descriptor isn't Service List Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Service List Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCServiceListDescriptor::RavelCServiceListDescriptor(unsigned char* raw)
-    : pServiceIds(0), pServiceTypes(0), iServiceCount(0) {
+RavelCServiceListDescriptor::RavelCServiceListDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCServiceListDescriptor::RavelCServiceListDescriptor(RavelCServiceListDescriptor& other)
-    : RavelCDescriptorBase(other), pServiceIds(0), pServiceTypes(0), iServiceCount(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

@@ -13,13 +13,13 @@ const RavelCDescriptorKind RavelCShortEventDescriptor::kKind = {
     0x4D, "Short Event Descriptor", "This Descriptor isn't Short Event Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Short Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCShortEventDescriptor::RavelCShortEventDescriptor(unsigned char* raw) : pEventName(0), pEventDescription(0) {
+RavelCShortEventDescriptor::RavelCShortEventDescriptor(unsigned char* raw) {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   ParseRawData(raw);
 }
 
 RavelCShortEventDescriptor::RavelCShortEventDescriptor(RavelCShortEventDescriptor& other)
-    : RavelCDescriptorBase(other), pEventName(0), pEventDescription(0) {
+    : RavelCDescriptorBase(other) {
   std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   *this = other;
 }

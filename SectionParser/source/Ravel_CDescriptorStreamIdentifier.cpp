@@ -10,7 +10,7 @@ const RavelCDescriptorKind RavelCStreamIdentifierDescriptor::kKind = {
     0x52, "Stream Id Descriptor", "This Descriptor isn't Stream Identifier Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Stream Identifier Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(unsigned char* raw) : iComponentTag(0) {
+RavelCStreamIdentifierDescriptor::RavelCStreamIdentifierDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

@@ -11,8 +11,7 @@ const RavelCDescriptorKind RavelCSystemManagementDescriptor::kKind = {
     "This Descriptor isn't System Management Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== System Management Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true, kRavelTraceSourcePath};
 
-RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(unsigned char* raw)
-    : iBroadcastingFlag(0), iBroadcastingIdentifier(0), iAdditionalBroadcastingIdentification(0) {
+RavelCSystemManagementDescriptor::RavelCSystemManagementDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 

@@ -12,7 +12,7 @@ const RavelCDescriptorKind RavelCTSInformationDescriptor::kKind = {
     "\t=================== TS Information Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCTSInformationDescriptor::RavelCTSInformationDescriptor(unsigned char* raw)
-    : iRemoteControlKeyId(0), sTsName(), iTransmissionTypeCount(0) {
+    : sTsName() {
   ParseRawData(raw);
 }
 

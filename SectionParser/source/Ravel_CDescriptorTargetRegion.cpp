@@ -14,12 +14,12 @@ const RavelCDescriptorKind RavelCTargetRegionDescriptor::kKind = {
     0xC6, "Region Descriptor", "This Descriptor isn't Target Region Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Target Region Descriptor =====================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
-RavelCTargetRegionDescriptor::RavelCTargetRegionDescriptor(unsigned char* raw) : pRegionSpec(0), iRegionSpecType(0) {
+RavelCTargetRegionDescriptor::RavelCTargetRegionDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCTargetRegionDescriptor::RavelCTargetRegionDescriptor(RavelCTargetRegionDescriptor& other)
-    : RavelCDescriptorBase(other), pRegionSpec(0), iRegionSpecType(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

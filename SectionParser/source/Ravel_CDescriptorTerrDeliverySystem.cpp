@@ -13,18 +13,12 @@ const RavelCDescriptorKind RavelCTerrDeliverySystemDescriptor::kKind = {
     "This Descriptor isn't Terrestrial Delivery System Descriptor! Descriptor Tag=[0x%x]\n",
     "\t=================== Terrestrial Delivery Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, true, kRavelTraceSourcePath};
 
-RavelCTerrDeliverySystemDescriptor::RavelCTerrDeliverySystemDescriptor(unsigned char* raw)
-    : iAreaCode(0), iGuardInterval(0), iTransmissionMode(0), iFrequencyCount(0), pFrequencies(0) {
+RavelCTerrDeliverySystemDescriptor::RavelCTerrDeliverySystemDescriptor(unsigned char* raw) {
   ParseRawData(raw);
 }
 
 RavelCTerrDeliverySystemDescriptor::RavelCTerrDeliverySystemDescriptor(RavelCTerrDeliverySystemDescriptor& other)
-    : RavelCDescriptorBase(other),
-      iAreaCode(0),
-      iGuardInterval(0),
-      iTransmissionMode(0),
-      iFrequencyCount(0),
-      pFrequencies(0) {
+    : RavelCDescriptorBase(other) {
   *this = other;
 }
 

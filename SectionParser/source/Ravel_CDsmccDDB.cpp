@@ -21,12 +21,12 @@ unsigned char* CopyBlock(const unsigned char* source, int length) {
 }  // namespace
 
 RavelCDsmccDDB::RavelCDsmccDDB(unsigned char* data)
-    : RavelCDsmccBase(0), iModuleId(0), iModuleVersion(0), iBlockNumber(0), pBlockData(0), iBlockDataLen(0) {
+    : RavelCDsmccBase(0) {
   ParseRawData(data);
 }
 
 RavelCDsmccDDB::RavelCDsmccDDB(const RavelCDsmccDDB& other)
-    : RavelCDsmccBase(0), iModuleId(0), iModuleVersion(0), iBlockNumber(0), pBlockData(0), iBlockDataLen(0) {
+    : RavelCDsmccBase(0) {
   *this = other;
 }
 

@@ -10,33 +10,11 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDsmccDII");
 // ---------------------------------------------------------------------------
 // RavelCModuleInfo
 
-RavelCModuleInfo::RavelCModuleInfo(unsigned char* record)
-    : iModuleId(0),
-      iModuleSize(0),
-      iModuleVersion(0),
-      iModuleInfoLength(0),
-      pTypeDescriptor(0),
-      pNameDescriptor(0),
-      pInfoDescriptor(0),
-      pModuleLinkDescriptor(0),
-      pCRC32Descriptor(0),
-      pEstDownloadTimeDescriptor(0),
-      pCompressionTypeDescriptor(0) {
+RavelCModuleInfo::RavelCModuleInfo(unsigned char* record) {
   ParseRawData(record);
 }
 
-RavelCModuleInfo::RavelCModuleInfo(RavelCModuleInfo& other)
-    : iModuleId(0),
-      iModuleSize(0),
-      iModuleVersion(0),
-      iModuleInfoLength(0),
-      pTypeDescriptor(0),
-      pNameDescriptor(0),
-      pInfoDescriptor(0),
-      pModuleLinkDescriptor(0),
-      pCRC32Descriptor(0),
-      pEstDownloadTimeDescriptor(0),
-      pCompressionTypeDescriptor(0) {
+RavelCModuleInfo::RavelCModuleInfo(RavelCModuleInfo& other) {
   *this = other;
 }
 

@@ -57,7 +57,7 @@ void RavelCNASP::Show() {
 // RavelCDsmccDSI
 
 RavelCDsmccDSI::RavelCDsmccDSI(unsigned char* data)
-    : RavelCDsmccBase(0), cNASP(0), iPrivateDataLength(0), pPrivateData(0) {
+    : RavelCDsmccBase(0), cNASP(0) {
   ParseRawData(data);
 }
 

@@ -6,8 +6,7 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CObjectCarouselTransmissionFormat");
 
-RavelCObjectCarouselTransmissionFormat::RavelCObjectCarouselTransmissionFormat()
-    : iCarouselId(0), bOnDemandRetrievalFlag(0), bFileStorableFlag(0), bEventSectionFlag(0) {}
+RavelCObjectCarouselTransmissionFormat::RavelCObjectCarouselTransmissionFormat() {}
 
 int RavelCObjectCarouselTransmissionFormat::ParseRawData(const unsigned char* raw) {
   *this = RavelCObjectCarouselTransmissionFormat();

@@ -22,7 +22,7 @@ unsigned long long ClockOf(const unsigned char* adaptation) {
 
 }  // namespace
 
-RavelCPCR::RavelCPCR(unsigned char* packet) : mPCR(0) { ParseRawData(packet); }
+RavelCPCR::RavelCPCR(unsigned char* packet) { ParseRawData(packet); }
 
 RavelCPCR::RavelCPCR(const RavelCPCR&) = default;
 

@@ -209,16 +209,7 @@ RavelSafeRefusal Accepted() {
 const int RavelCSafeSection::kMaxSectionSize;
 
 RavelCSafeSection::RavelCSafeSection()
-    : pBuffer(0),
-      iCapacity(0),
-      iDataSize(0),
-      cRefusal(Accepted()),
-      iParseResult(0),
-      pTable(0),
-      pTDT(0),
-      pTOT(0),
-      pMessage(0),
-      iRow(-1) {}
+    : cRefusal(Accepted()), iRow(-1) {}
 
 RavelCSafeSection::~RavelCSafeSection() {
   Clear();

@@ -18,9 +18,7 @@ const unsigned char kStuffingByte = 0xFF;
 // could be interposed and is never inlined. All their callers are in this file.
 
 RavelCSectionAssembler::RavelCSectionAssembler(RavelSectionHandler handler, void* context)
-    : iSectionsDelivered(0), iSectionsCut(0), iPacketsTransportError(0), iPacketsRepeated(0), iPacketsInvalid(0),
-      iContinuityBreaks(0), iBytesWithoutStart(0), pHandler(handler), pContext(context), iLastCounter(kNoCounter),
-      iRepeats(0), iHeld(0), iSectionSize(0) {}
+    : pHandler(handler), pContext(context), iLastCounter(kNoCounter) {}
 
 RavelCSectionAssembler::~RavelCSectionAssembler() {}
 

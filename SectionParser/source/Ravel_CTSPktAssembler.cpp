@@ -49,9 +49,9 @@ inline void EmitSection(const unsigned char* section, int size, RavelCSectionDat
 // ---------------------------------------------------------------------------
 // RavelCPktEntry
 
-RavelCPktEntry::RavelCPktEntry() : iDataLen(0) { memset(aData, 0, sizeof(aData)); }
+RavelCPktEntry::RavelCPktEntry() { memset(aData, 0, sizeof(aData)); }
 
-RavelCPktEntry::RavelCPktEntry(const unsigned char* data, int len) : iDataLen(0) {
+RavelCPktEntry::RavelCPktEntry(const unsigned char* data, int len) {
   if (len >= static_cast<int>(sizeof(aData)) + 1) memset(aData, 0, sizeof(aData));
   SetData(data, len);
 }
@@ -82,14 +82,14 @@ int RavelCPktEntry::GetData(unsigned char* destination, int& count) {
 // ---------------------------------------------------------------------------
 // RavelCSectionData
 
-RavelCSectionData::RavelCSectionData() : iSectionCount(0) {
+RavelCSectionData::RavelCSectionData() {
   for (int i = 0; i < RAVEL_MAX_ASSEMBLED_SECTIONS; ++i) {
     pSection[i] = 0;
     iSectionSize[i] = 0;
   }
 }
 
-RavelCSectionData::RavelCSectionData(const RavelCSectionData& other) : iSectionCount(0) {
+RavelCSectionData::RavelCSectionData(const RavelCSectionData& other) {
   for (int i = 0; i < RAVEL_MAX_ASSEMBLED_SECTIONS; ++i) {
     pSection[i] = 0;
     iSectionSize[i] = 0;
@@ -152,10 +152,10 @@ void RavelCSectionData::CopyFrom(const RavelCSectionData& other) {
 // RavelCTSPktStore
 
 RavelCTSPktStore::RavelCTSPktStore()
-    : iPID(kIdlePID), iCurBufSize(0), iLastConIndex(kIdleConIndex), iSectionLen(kUnknownSectionLen) {}
+    : iPID(kIdlePID), iLastConIndex(kIdleConIndex), iSectionLen(kUnknownSectionLen) {}
 
 RavelCTSPktStore::RavelCTSPktStore(RavelCTSPktStore& other)
-    : iPID(kIdlePID), iCurBufSize(0), iLastConIndex(kIdleConIndex), iSectionLen(kUnknownSectionLen) {
+    : iPID(kIdlePID), iLastConIndex(kIdleConIndex), iSectionLen(kUnknownSectionLen) {
   *this = other;
 }
 

@@ -26,13 +26,11 @@ const int kSectionLengthWithoutLoops = 11;
 // ---------------------------------------------------------------------------
 // RavelCBroadcasterDescriptor
 
-RavelCBroadcasterDescriptor::RavelCBroadcasterDescriptor(unsigned char* record)
-    : iBroadcasterId(0), iBroadcasterDescriptorsLength(0), pExtendedBroadcasterDescriptor(0) {
+RavelCBroadcasterDescriptor::RavelCBroadcasterDescriptor(unsigned char* record) {
   ParseRawData(record);
 }
 
-RavelCBroadcasterDescriptor::RavelCBroadcasterDescriptor(RavelCBroadcasterDescriptor& other)
-    : iBroadcasterId(0), iBroadcasterDescriptorsLength(0), pExtendedBroadcasterDescriptor(0) {
+RavelCBroadcasterDescriptor::RavelCBroadcasterDescriptor(RavelCBroadcasterDescriptor& other) {
   *this = other;
 }
 
@@ -92,12 +90,12 @@ void RavelCBroadcasterDescriptor::Show() {
 // RavelCBIT
 
 RavelCBIT::RavelCBIT(unsigned char* section)
-    : RavelCTableBase(0), bBroadcasterViewPropriety(0), iFirstDescriptorsLength(0), aBroadcasterDescriptor() {
+    : RavelCTableBase(0), aBroadcasterDescriptor() {
   RavelCBIT::ParseRawData(section);
 }
 
 RavelCBIT::RavelCBIT(RavelCBIT& other)
-    : RavelCTableBase(0), bBroadcasterViewPropriety(0), iFirstDescriptorsLength(0), aBroadcasterDescriptor() {
+    : RavelCTableBase(0), aBroadcasterDescriptor() {
   CopyHeader(other);
   *this = other;
 }

@@ -8,7 +8,7 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableBase");
 
-RavelCTableBase::RavelCTableBase(unsigned char* section) : iSession(0), sTableName() {
+RavelCTableBase::RavelCTableBase(unsigned char* section) : sTableName() {
   // Runs the base parse: derived constructors pass null here to clear the header.
   // A parse never writes the caller's tag, so it starts cleared either way.
   RavelCTableBase::ParseRawData(section);

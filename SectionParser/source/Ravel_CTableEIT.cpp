@@ -61,31 +61,13 @@ void ReleaseAudioComponent(void* element) { delete static_cast<RavelCAudioCompon
 // ---------------------------------------------------------------------------
 // RavelCEventInfo
 
-RavelCEventInfo::RavelCEventInfo(unsigned char* event)
-    : iSpare(0),
-      pShortEventDescriptor(0),
-      pContentDescriptor(0),
-      pComponentDescriptor(0),
-      pParentalRatingDescriptor(0),
-      pAudioComponentList(0),
-      pCopyrightDescriptor(0),
-      pExtendedEventDescriptor(0),
-      pSeriesDescriptor(0) {
+RavelCEventInfo::RavelCEventInfo(unsigned char* event) {
   ClearFields();
   ResetAudioComponentList();
   if (event != 0) ParseRawData(event);
 }
 
-RavelCEventInfo::RavelCEventInfo(RavelCEventInfo& other)
-    : iSpare(0),
-      pShortEventDescriptor(0),
-      pContentDescriptor(0),
-      pComponentDescriptor(0),
-      pParentalRatingDescriptor(0),
-      pAudioComponentList(0),
-      pCopyrightDescriptor(0),
-      pExtendedEventDescriptor(0),
-      pSeriesDescriptor(0) {
+RavelCEventInfo::RavelCEventInfo(RavelCEventInfo& other) {
   ClearFields();
   ResetAudioComponentList();
   *this = other;
@@ -277,24 +259,12 @@ int RavelCEventInfo::operator>=(const RavelCEventInfo& other) const { return cSt
 // RavelCEIT
 
 RavelCEIT::RavelCEIT(unsigned char* section)
-    : RavelCTableBase(0),
-      iEITTableId(0),
-      iTransportStreamId(0),
-      iOriginalNetworkId(0),
-      iSegmentLastSectionNumber(0),
-      iLastTableId(0),
-      aEventInfo() {
+    : RavelCTableBase(0), aEventInfo() {
   ParseRawData(section);
 }
 
 RavelCEIT::RavelCEIT(RavelCEIT& other)
-    : RavelCTableBase(0),
-      iEITTableId(0),
-      iTransportStreamId(0),
-      iOriginalNetworkId(0),
-      iSegmentLastSectionNumber(0),
-      iLastTableId(0),
-      aEventInfo() {
+    : RavelCTableBase(0), aEventInfo() {
   CopyHeader(other);
   *this = other;
 }

@@ -33,25 +33,11 @@ const int kNetworkDescriptorsAt = 10;
 // ---------------------------------------------------------------------------
 // RavelCTSInfo
 
-RavelCTSInfo::RavelCTSInfo(unsigned char* entry)
-    : iTransportStreamId(0),
-      iOriginalNetworkId(0),
-      iTransportDescriptorsLength(0),
-      pServiceList(0),
-      pTerrDeliverySystem(0),
-      pTSInformation(0),
-      pPartialReception(0) {
+RavelCTSInfo::RavelCTSInfo(unsigned char* entry) {
   ParseRawData(entry);
 }
 
-RavelCTSInfo::RavelCTSInfo(RavelCTSInfo& other)
-    : iTransportStreamId(0),
-      iOriginalNetworkId(0),
-      iTransportDescriptorsLength(0),
-      pServiceList(0),
-      pTerrDeliverySystem(0),
-      pTSInformation(0),
-      pPartialReception(0) {
+RavelCTSInfo::RavelCTSInfo(RavelCTSInfo& other) {
   *this = other;
 }
 
@@ -147,12 +133,12 @@ void RavelCTSInfo::Show() {
 // RavelCNIT
 
 RavelCNIT::RavelCNIT(unsigned char* section)
-    : RavelCTableBase(0), pLinkage(0), pNetworkName(0), pSystemManagement(0), aTSInfoList() {
+    : RavelCTableBase(0), aTSInfoList() {
   ParseRawData(section);
 }
 
 RavelCNIT::RavelCNIT(RavelCNIT& other)
-    : RavelCTableBase(0), pLinkage(0), pNetworkName(0), pSystemManagement(0), aTSInfoList() {
+    : RavelCTableBase(0), aTSInfoList() {
   *this = other;
 }
 

@@ -26,7 +26,7 @@ bool RavelPAT_IsOneSegPMTPID(unsigned short pid) { return pid >= kOneSegPMTPIDFi
 // ---------------------------------------------------------------------------
 // RavelCPMTInfo
 
-RavelCPMTInfo::RavelCPMTInfo(unsigned char* entry) : iProgramNumber(0), iPID(0) { ParseRawData(entry); }
+RavelCPMTInfo::RavelCPMTInfo(unsigned char* entry) { ParseRawData(entry); }
 
 RavelCPMTInfo::~RavelCPMTInfo() {}
 

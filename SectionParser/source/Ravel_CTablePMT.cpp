@@ -41,15 +41,11 @@ const int kSelectionIndexRange = 256;
 // ---------------------------------------------------------------------------
 // RavelCMapInfo
 
-RavelCMapInfo::RavelCMapInfo(unsigned char* entry)
-    : iStreamType(0), iElementaryPID(0), iESInfoLength(0), iCAPID(0), pStreamIdentifier(0), pDataComponent(0),
-      pTargetRegion(0) {
+RavelCMapInfo::RavelCMapInfo(unsigned char* entry) {
   ParseRawData(entry);
 }
 
-RavelCMapInfo::RavelCMapInfo(RavelCMapInfo& other)
-    : iStreamType(0), iElementaryPID(0), iESInfoLength(0), iCAPID(0), pStreamIdentifier(0), pDataComponent(0),
-      pTargetRegion(0) {
+RavelCMapInfo::RavelCMapInfo(RavelCMapInfo& other) {
   *this = other;
 }
 
@@ -145,7 +141,7 @@ void RavelCMapInfo::Show() {
 // RavelCPMT
 
 RavelCPMT::RavelCPMT(unsigned char* section)
-    : RavelCTableBase(0), iPCRPID(0), iProgramInfoLength(0), aMapInfoList(), pParentalRating(0) {
+    : RavelCTableBase(0), aMapInfoList() {
   ParseRawData(section);
 }
 

@@ -26,15 +26,11 @@ const unsigned char kTagLogoTransmission = 0xCF;
 // ---------------------------------------------------------------------------
 // RavelCServiceDescription
 
-RavelCServiceDescription::RavelCServiceDescription(unsigned char* entry)
-    : iServiceId(0), iEITCompanyDefFlag(0), bEITScheduleFlag(0), bEITPresentFollowingFlag(0), iRunningStatus(0),
-      bFreeCAMode(0), iDescriptorsLoopLength(0), pService(0), pLogoTransmission(0), pCountryAvailability(0) {
+RavelCServiceDescription::RavelCServiceDescription(unsigned char* entry) {
   ParseRawData(entry);
 }
 
-RavelCServiceDescription::RavelCServiceDescription(RavelCServiceDescription& other)
-    : iServiceId(0), iEITCompanyDefFlag(0), bEITScheduleFlag(0), bEITPresentFollowingFlag(0), iRunningStatus(0),
-      bFreeCAMode(0), iDescriptorsLoopLength(0), pService(0), pLogoTransmission(0), pCountryAvailability(0) {
+RavelCServiceDescription::RavelCServiceDescription(RavelCServiceDescription& other) {
   *this = other;
 }
 
@@ -146,11 +142,11 @@ void RavelCServiceDescription::Show() {
 // ---------------------------------------------------------------------------
 // RavelCSDT
 
-RavelCSDT::RavelCSDT(unsigned char* section) : RavelCTableBase(0), iOriginalNetworkId(0), aServiceList() {
+RavelCSDT::RavelCSDT(unsigned char* section) : RavelCTableBase(0), aServiceList() {
   ParseRawData(section);
 }
 
-RavelCSDT::RavelCSDT(RavelCSDT& other) : RavelCTableBase(0), iOriginalNetworkId(0), aServiceList() {
+RavelCSDT::RavelCSDT(RavelCSDT& other) : RavelCTableBase(0), aServiceList() {
   *this = other;
 }
 

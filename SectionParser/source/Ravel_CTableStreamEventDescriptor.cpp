@@ -13,12 +13,12 @@ RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTableStreamEventDescriptor");
 #define RAVEL_TAG_GENERAL_EVENT 0x40
 
 RavelCDsmccStreamEvent::RavelCDsmccStreamEvent(unsigned char* section)
-    : RavelCTableBase(0), pNPTReference(0), cGeneralEvents() {
+    : RavelCTableBase(0), cGeneralEvents() {
   ParseRawData(section);
 }
 
 RavelCDsmccStreamEvent::RavelCDsmccStreamEvent(RavelCDsmccStreamEvent& other)
-    : RavelCTableBase(0), pNPTReference(0), cGeneralEvents() {
+    : RavelCTableBase(0), cGeneralEvents() {
   *this = other;
 }
 

@@ -14,16 +14,7 @@ const unsigned char kTDTTableId = 0x70;
 }  // namespace
 
 RavelCTDT::RavelCTDT(unsigned char* section)
-    : sTableName(),
-      iTableId(0),
-      bSectionSyntaxIndicator(0),
-      iSectionLength(0),
-      iYear(0),
-      iMonth(0),
-      iDay(0),
-      iHour(0),
-      iMinute(0),
-      iSecond(0) {
+    : sTableName() {
   ParseRawData(section);
 }
 

@@ -18,12 +18,12 @@ const int kDescriptorLoopStart = 10;
 
 }  // namespace
 
-RavelCTOT::RavelCTOT(unsigned char* section) : sTableName(), pLocalTimeOffsetDescriptor(0) {
+RavelCTOT::RavelCTOT(unsigned char* section) : sTableName() {
   ClearFields();
   ParseRawData(section);
 }
 
-RavelCTOT::RavelCTOT(RavelCTOT& other) : sTableName(), pLocalTimeOffsetDescriptor(0) {
+RavelCTOT::RavelCTOT(RavelCTOT& other) : sTableName() {
   ClearFields();
   *this = other;
 }

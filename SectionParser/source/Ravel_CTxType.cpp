@@ -6,14 +6,13 @@
 
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CTxType");
 
-RavelCTxType::RavelCTxType() : iTransmissionTypeInfo(0), iNumOfService(0), pServiceIds(0) {}
+RavelCTxType::RavelCTxType() {}
 
-RavelCTxType::RavelCTxType(unsigned char* raw) : iTransmissionTypeInfo(0), iNumOfService(0), pServiceIds(0) {
+RavelCTxType::RavelCTxType(unsigned char* raw) {
   ParseRawData(raw);
 }
 
-RavelCTxType::RavelCTxType(const RavelCTxType& other)
-    : iTransmissionTypeInfo(0), iNumOfService(0), pServiceIds(0) {
+RavelCTxType::RavelCTxType(const RavelCTxType& other) {
   *this = other;
 }
 
