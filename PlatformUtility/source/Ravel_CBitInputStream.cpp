@@ -30,11 +30,11 @@ unsigned char RavelCBitInputStream::ReadBit(unsigned char& status) {
 }
 
 unsigned char RavelCBitInputStream::ReadByte(int bitCount, unsigned char& status) {
-  return static_cast<unsigned char>(ReadBits(bitCount > 8 ? 8 : bitCount, status));
+  return static_cast<unsigned char>(ReadBits(bitCount, status));
 }
 
 unsigned short RavelCBitInputStream::ReadShort(int bitCount, unsigned char& status) {
-  return static_cast<unsigned short>(ReadBits(bitCount > 16 ? 16 : bitCount, status));
+  return static_cast<unsigned short>(ReadBits(bitCount, status));
 }
 
 unsigned int RavelCBitInputStream::ReadInt(int bitCount, unsigned char& status) {

@@ -21,7 +21,7 @@ class RavelCCRC32Descriptor : public RavelCDescriptorBase {
   // The four CRC bytes, most significant first.
   const unsigned char* GetCRC32() const { return aCRC32; }
 
-  unsigned char aCRC32[4];
+  unsigned char aCRC32[4] = {};
 };
 
 #endif

@@ -56,7 +56,7 @@ class RavelCExtendedEventDescriptor : public RavelCDescriptorBase {
 
   unsigned char iDescriptorNumber = 0;
   unsigned char iLastDescriptorNumber = 0;
-  char szLanguageCode[4];
+  char szLanguageCode[4] = {};
   RavelCArray<RavelCExtendedEvent*> aItems;  // owned records
   char* pText = 0;                               // malloc'd
 

@@ -24,7 +24,7 @@ class RavelCGingaAppDescriptor : public RavelCDescriptorBase {
   // The field itself: it is not terminated when all 255 bytes are set.
   const char* GetParameter() const { return szParameter; }
 
-  char szParameter[255];
+  char szParameter[255] = {};
 };
 
 #endif

@@ -23,7 +23,7 @@ class RavelCInfoDescriptor : public RavelCDescriptorBase {
   // Null until a parse succeeds.
   const char* GetText() const { return pText; }
 
-  char szLanguageCode[4];
+  char szLanguageCode[4] = {};
   // new[] buffer: the text bytes followed by two 0 bytes.
   char* pText = 0;
 

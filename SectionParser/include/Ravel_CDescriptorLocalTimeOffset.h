@@ -26,7 +26,7 @@ class RavelCCountryCode {
   const char* toString() const { return szCountryCode; }
   const char* GetCountryCode() const { return szCountryCode; }
 
-  char szCountryCode[4];
+  char szCountryCode[4] = {};
 };
 
 // One entry of the loop.

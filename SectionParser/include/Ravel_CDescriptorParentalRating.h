@@ -30,7 +30,7 @@ class RavelCParentalRating {
   unsigned char GetContent() const { return iContent; }
   unsigned char GetMinimumAge() const { return iMinimumAge; }
 
-  char szCountryCode[4];
+  char szCountryCode[4] = {};
   unsigned char iContent = 0;     // Brazil only; left as it is under the Japanese rules
   unsigned char iMinimumAge = 0;
 };

@@ -28,7 +28,7 @@ class RavelCShortEventDescriptor : public RavelCDescriptorBase {
   // The event description under the name the event readers use.
   const char* GetText() const { return pEventDescription; }
 
-  char szLanguageCode[4];
+  char szLanguageCode[4] = {};
   char* pEventName = 0;         // malloc'd
   char* pEventDescription = 0;  // malloc'd
 

@@ -38,8 +38,8 @@ class RavelCSectionData {
   RavelCSectionData& operator=(const RavelCSectionData& other);
   ~RavelCSectionData();
 
-  unsigned char* pSection[RAVEL_MAX_ASSEMBLED_SECTIONS];
-  int iSectionSize[RAVEL_MAX_ASSEMBLED_SECTIONS];  // table_id to the end of the CRC
+  unsigned char* pSection[RAVEL_MAX_ASSEMBLED_SECTIONS] = {};
+  int iSectionSize[RAVEL_MAX_ASSEMBLED_SECTIONS] = {};  // table_id to the end of the CRC
   int iSectionCount = 0;
 
   // Takes ownership of a malloc'ed section that owns the bytes said above. A record already holding five

@@ -40,7 +40,7 @@ int RavelCApplicationDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
   int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
+  RavelCBitInputStream reader = RavelCReadWindow::Reader(raw + 2, iDescriptorLength);
   unsigned char status = 0;
   reader.ReadByte(8, status);  // application_profiles_length: one profile is read whatever it says
   iApplicationProfile = reader.ReadShort(16, status);

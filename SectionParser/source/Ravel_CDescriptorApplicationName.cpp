@@ -39,7 +39,7 @@ int RavelCApplicationNameDescriptor::ParseRawData(unsigned char* raw) {
   Clear();
   int result = ParseHeader(raw, kKind, __LINE__);
   if (result != kRavelOk) return result;
-  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
+  RavelCBitInputStream reader = RavelCReadWindow::Reader(raw + 2, iDescriptorLength);
   unsigned char status = 0;
   reader.GetByteArray(reinterpret_cast<unsigned char*>(szISOLanguageCode), 3);
   // An 8-bit count never exceeds the 255-byte field.

@@ -60,7 +60,7 @@ int RavelCAudioComponentDescriptor::ParseRawData(unsigned char* raw) {
     return result;
   }
   unsigned char status = 0;
-  RavelCBitInputStream reader(raw + 2, RavelCReadWindow::Readable(raw + 2, iDescriptorLength), 0);
+  RavelCBitInputStream reader = RavelCReadWindow::Reader(raw + 2, iDescriptorLength);
   reader.Skip(4);                                      // xxxx....
   iStreamContent = reader.ReadByte(4, status);         // ....xxxx
   iComponentType = reader.ReadByte(8, status);

@@ -17,7 +17,6 @@ const RavelCDescriptorKind RavelCCRC32Descriptor::kKind = {
     false, kRavelTraceSourcePath};
 
 RavelCCRC32Descriptor::RavelCCRC32Descriptor(unsigned char* raw) {
-  std::memset(aCRC32, 0, sizeof(aCRC32));
   ParseRawData(raw);
 }
 

@@ -37,13 +37,11 @@ const RavelCDescriptorKind RavelCExtendedEventDescriptor::kKind = {
 
 RavelCExtendedEventDescriptor::RavelCExtendedEventDescriptor(unsigned char* raw)
     : aItems() {
-  std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   ParseRawData(raw);
 }
 
 RavelCExtendedEventDescriptor::RavelCExtendedEventDescriptor(RavelCExtendedEventDescriptor& other)
     : RavelCDescriptorBase(other), aItems() {
-  std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   *this = other;
 }
 

@@ -86,7 +86,6 @@ int RavelCGeneralEventDescriptor::ParseRawData(unsigned char* raw) {
       break;
     case 3: {
       // The BCD digits sit four bits further on, after 4 reserved bits.
-      std::memset(&cEventMsgRelativeTime, 0, sizeof(cEventMsgRelativeTime));
       unsigned char digits[4];  // bytes 5 to 8
       RavelCReadWindow::Copy(digits, raw + 5, sizeof(digits));
       cEventMsgRelativeTime.iHours = (digits[0] & 0x0F) * 10 + (digits[1] >> 4);

@@ -16,7 +16,6 @@ const RavelCDescriptorKind RavelCGingaAppDescriptor::kKind = {
     "\t=================== Ginga Application Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCGingaAppDescriptor::RavelCGingaAppDescriptor(unsigned char* raw) {
-  std::memset(szParameter, 0, sizeof(szParameter));
   ParseRawData(raw);
 }
 

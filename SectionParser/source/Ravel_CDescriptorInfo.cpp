@@ -18,12 +18,10 @@ const RavelCDescriptorKind RavelCInfoDescriptor::kKind = {
     false, kRavelTraceSourcePath};
 
 RavelCInfoDescriptor::RavelCInfoDescriptor(unsigned char* raw) {
-  std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   ParseRawData(raw);
 }
 
 RavelCInfoDescriptor::RavelCInfoDescriptor(RavelCInfoDescriptor& other) : RavelCDescriptorBase(other) {
-  std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   *this = other;
 }
 

@@ -12,7 +12,6 @@
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorLocalTimeOffset");
 
 RavelCCountryCode::RavelCCountryCode(const char* code) {
-  std::memset(szCountryCode, 0, sizeof(szCountryCode));
   if (code != 0 && std::strlen(code) == 3) std::memcpy(szCountryCode, code, 3);
 }
 

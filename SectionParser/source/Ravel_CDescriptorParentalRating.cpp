@@ -11,11 +11,9 @@
 RAVEL_TRACE_SOURCE("SectionParser/source/Ravel_CDescriptorParentalRating");
 
 RavelCParentalRating::RavelCParentalRating() {
-  std::memset(szCountryCode, 0, sizeof(szCountryCode));
 }
 
 RavelCParentalRating::RavelCParentalRating(unsigned char* raw) {
-  std::memset(szCountryCode, 0, sizeof(szCountryCode));
   ParseRawData(raw);
 }
 

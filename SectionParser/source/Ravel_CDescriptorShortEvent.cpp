@@ -14,13 +14,11 @@ const RavelCDescriptorKind RavelCShortEventDescriptor::kKind = {
     "\t=================== Short Event Descriptor ===================\n", RAVEL_WRONG_TAG_MASK, false, kRavelTraceSourcePath};
 
 RavelCShortEventDescriptor::RavelCShortEventDescriptor(unsigned char* raw) {
-  std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   ParseRawData(raw);
 }
 
 RavelCShortEventDescriptor::RavelCShortEventDescriptor(RavelCShortEventDescriptor& other)
     : RavelCDescriptorBase(other) {
-  std::memset(szLanguageCode, 0, sizeof(szLanguageCode));
   *this = other;
 }
 

@@ -67,7 +67,7 @@ int RavelCModuleInfo::ParseRawData(unsigned char* record) {
   unsigned char* at = record + 8;
   const unsigned char* end = RavelCReadWindow::Clamp(at, at + iModuleInfoLength);
   do {
-    if (RavelCReadWindow::Readable(at, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(at)) break;
     unsigned char tag = at[0];
     switch (tag) {
       case 0x01:
@@ -175,7 +175,7 @@ int RavelCDsmccDII::ParseRawData(unsigned char* data) {
   unsigned char* record = compatibilityEnd + 4;
   for (unsigned short i = 0; i < numberOfModules; ++i) {
     // A count that would carry the loop past the section stops at its end.
-    if (RavelCReadWindow::Readable(record, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(record)) break;
     RavelCModuleInfo* module = new RavelCModuleInfo(record);
     cModuleInfos.Append(module);
     record += 8 + module->iModuleInfoLength;

@@ -60,13 +60,21 @@ int RavelCReadWindow::Readable(const unsigned char* at, int wanted) {
   return left < wanted ? static_cast<int>(left) : wanted;
 }
 
+bool RavelCReadWindow::Unreadable(const unsigned char* at) {
+  return tWindowBegin != 0 && (at < tWindowBegin || at >= tWindowEnd);
+}
+
+RavelCBitInputStream RavelCReadWindow::Reader(const unsigned char* at, int length) {
+  return RavelCBitInputStream(at, static_cast<unsigned int>(Readable(at, length)), 0);
+}
+
 const unsigned char* RavelCReadWindow::Clamp(const unsigned char* at, const unsigned char* end) {
   if (tWindowBegin == 0) return end;
   if (at < tWindowBegin || at >= tWindowEnd) return at;  // nothing of it is readable
   return end > tWindowEnd ? tWindowEnd : end;
 }
 
-unsigned char RavelCReadWindow::Read8(const unsigned char* at) { return Readable(at, 1) == 1 ? at[0] : 0; }
+unsigned char RavelCReadWindow::Read8(const unsigned char* at) { return Unreadable(at) ? 0 : at[0]; }
 
 unsigned short RavelCReadWindow::Read16(const unsigned char* at) {
   if (Readable(at, 2) == 2) return RavelRead16(at);

@@ -82,18 +82,9 @@ int RavelCPktEntry::GetData(unsigned char* destination, int& count) {
 // ---------------------------------------------------------------------------
 // RavelCSectionData
 
-RavelCSectionData::RavelCSectionData() {
-  for (int i = 0; i < RAVEL_MAX_ASSEMBLED_SECTIONS; ++i) {
-    pSection[i] = 0;
-    iSectionSize[i] = 0;
-  }
-}
+RavelCSectionData::RavelCSectionData() {}
 
 RavelCSectionData::RavelCSectionData(const RavelCSectionData& other) {
-  for (int i = 0; i < RAVEL_MAX_ASSEMBLED_SECTIONS; ++i) {
-    pSection[i] = 0;
-    iSectionSize[i] = 0;
-  }
   CopyFrom(other);
 }
 

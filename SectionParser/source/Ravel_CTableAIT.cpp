@@ -112,8 +112,7 @@ int RavelCAIT::ParseRawData(unsigned char* section) {
   // itself is then looked for behind the common descriptors. A section too short
   // for the two lengths reads them as 0.
   int headerLength = static_cast<int>(iSectionLength) - 9;
-  RavelCBitInputStream reader(section + 8, static_cast<unsigned int>(RavelCReadWindow::Readable(section + 8, headerLength)),
-                              0);
+  RavelCBitInputStream reader = RavelCReadWindow::Reader(section + 8, headerLength);
   unsigned char status = 0;
   reader.Skip(4);                                                  // rrrrxxxx
   unsigned short commonDescriptorsLength = reader.ReadShort(12, status);
@@ -125,10 +124,10 @@ int RavelCAIT::ParseRawData(unsigned char* section) {
   unsigned char* position = section + 12 + commonDescriptorsLength;
   const unsigned char* loopEnd = RavelCReadWindow::Clamp(position, position + applicationLoopLength);
   do {
-    if (RavelCReadWindow::Readable(position, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(position)) break;
     GingaAITApplicationType record;
     std::memset(&record, 0, sizeof(record));
-    RavelCBitInputStream entry(position, static_cast<unsigned int>(RavelCReadWindow::Readable(position, applicationLoopLength)), 0);
+    RavelCBitInputStream entry = RavelCReadWindow::Reader(position, applicationLoopLength);
     record.iOrganizationId = entry.ReadInt(32, status);
     record.iApplicationId = entry.ReadShort(16, status);
     record.iApplicationControlCode = entry.ReadByte(8, status);
@@ -142,7 +141,7 @@ int RavelCAIT::ParseRawData(unsigned char* section) {
     if (descriptorsLength >= 1) {
       const unsigned char* descriptorsEnd = RavelCReadWindow::Clamp(position, position + descriptorsLength);
       do {
-        if (RavelCReadWindow::Readable(position, 1) == 0) break;
+        if (RavelCReadWindow::Unreadable(position)) break;
         processDescriptors(position, &record);
         position += RavelCReadWindow::Read8(position + 1) + 2;
       } while (position < descriptorsEnd);

@@ -132,7 +132,7 @@ int RavelCBIT::ParseRawData(unsigned char* section) {
   if (iFirstDescriptorsLength != 0) {
     int end = at + RavelCReadWindow::Readable(section + at, iFirstDescriptorsLength);
     do {
-      if (RavelCReadWindow::Readable(section + at, 1) == 0) break;
+      if (RavelCReadWindow::Unreadable(section + at)) break;
       unsigned char tag = section[at];
       unsigned char length = RavelCReadWindow::Read8(section + at + 1);
       if (tag == 0 || length == 0) {
@@ -152,7 +152,7 @@ int RavelCBIT::ParseRawData(unsigned char* section) {
   if (broadcasterLoopLength == 0) return kRavelOk;
   int end = at + RavelCReadWindow::Readable(section + at, broadcasterLoopLength);
   do {
-    if (RavelCReadWindow::Readable(section + at, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(section + at)) break;
     RavelCBroadcasterDescriptor* broadcaster = new RavelCBroadcasterDescriptor(0);
     if (broadcaster->ParseRawData(section + at) != kRavelOk) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "BIT Info Parsing Fail! Maybe data has been corrupted!\n");

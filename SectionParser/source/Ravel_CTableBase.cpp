@@ -31,7 +31,7 @@ int RavelCTableBase::ParseRawData(unsigned char* section) {
   }
   // A section shorter than its 8 header bytes reads zeros for the rest.
   RavelCReadWindow window(section);
-  RavelCBitInputStream reader(section, static_cast<unsigned int>(RavelCReadWindow::Readable(section, 8)), 0);
+  RavelCBitInputStream reader = RavelCReadWindow::Reader(section, 8);
   unsigned char status = 0;
   iTableId = reader.ReadByte(8, status);
   bSectionSyntaxIndicator = reader.ReadBit(status);

@@ -178,7 +178,7 @@ int RavelCEventInfo::ParseRawData(unsigned char* event) {
   unsigned char* position = event + kEventFixedSize;
   const unsigned char* end = RavelCReadWindow::Clamp(position, position + iDescriptorsLoopLength);
   do {
-    if (RavelCReadWindow::Readable(position, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(position)) break;
     unsigned char tag = position[0];
     unsigned char length = RavelCReadWindow::Read8(position + 1);
     if (tag == 0 || length == 0) {

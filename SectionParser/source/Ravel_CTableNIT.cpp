@@ -82,7 +82,7 @@ int RavelCTSInfo::ParseRawData(unsigned char* entry) {
   unsigned short consumed = 0;
   unsigned char* descriptor = entry + kTSInfoFixedSize;
   do {
-    if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(descriptor)) break;
     unsigned char tag = descriptor[0];
     unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
     if (tag == 0 || length == 0) {
@@ -194,7 +194,7 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
     int end = at + RavelCReadWindow::Readable(section + at, networkDescriptorsLength);
     do {
       unsigned char* descriptor = section + at;
-      if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
+      if (RavelCReadWindow::Unreadable(descriptor)) break;
       unsigned char tag = descriptor[0];
       unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
       // Only the tag is tested here: a descriptor of length 0 goes to its class.
@@ -235,7 +235,7 @@ int RavelCNIT::ParseRawData(unsigned char* section) {
   const int end = at + RavelCReadWindow::Readable(section + at, transportStreamLoopLength);
   at += 2;
   do {
-    if (RavelCReadWindow::Readable(section + at, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(section + at)) break;
     RavelCTSInfo* transportStream = new RavelCTSInfo(0);
     if (transportStream->ParseRawData(section + at) != kRavelOk) {
       RAVEL_TRACE(RAVEL_PARSER_WARNING, "NIT Info Parsing Fail! Maybe data has been corrupted!\n");

@@ -89,7 +89,7 @@ int RavelCMapInfo::ParseRawData(unsigned char* entry) {
   int at = kStreamHeaderSize;
   do {
     unsigned char* descriptor = entry + at;
-    if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(descriptor)) break;
     const unsigned char tag = descriptor[0];
     const unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
     if (length == 0) {
@@ -206,7 +206,7 @@ int RavelCPMT::ParseRawData(unsigned char* section) {
     const int end = at + RavelCReadWindow::Readable(section + at, iProgramInfoLength);
     do {
       unsigned char* descriptor = section + at;
-      if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
+      if (RavelCReadWindow::Unreadable(descriptor)) break;
       const unsigned char tag = descriptor[0];
       const unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
       if (tag == 0 || length == 0) {

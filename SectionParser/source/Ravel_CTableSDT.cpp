@@ -91,7 +91,7 @@ int RavelCServiceDescription::ParseRawData(unsigned char* entry) {
   int at = kServiceHeaderSize;
   do {
     unsigned char* descriptor = entry + at;
-    if (RavelCReadWindow::Readable(descriptor, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(descriptor)) break;
     const unsigned char tag = descriptor[0];
     const unsigned char length = RavelCReadWindow::Read8(descriptor + 1);
     if (tag == 0 || length == 0) {

@@ -78,7 +78,7 @@ int RavelCTOT::ParseRawData(unsigned char* section) {
   unsigned char* position = section + kDescriptorLoopStart;
   const unsigned char* end = RavelCReadWindow::Clamp(position, position + iDescriptorsLoopLength);
   do {
-    if (RavelCReadWindow::Readable(position, 1) == 0) break;
+    if (RavelCReadWindow::Unreadable(position)) break;
     unsigned char tag = position[0];
     if (tag == kTagLocalTimeOffset) {
       // Only the last one of the loop is kept.

@@ -19,6 +19,8 @@
 #ifndef RAVEL_CREADWINDOW_H
 #define RAVEL_CREADWINDOW_H
 
+#include "Ravel_CBitInputStream.h"
+
 class RavelCReadWindow {
  public:
   // Opens the window of the section starting at `section`:
@@ -43,6 +45,11 @@ class RavelCReadWindow {
   // Bytes readable from `at` up to `wanted`: all of them without an open window,
   // none when `at` lies outside the open one.
   static int Readable(const unsigned char* at, int wanted);
+  // True when an open window does not hold the byte at `at`: where a loop
+  // over the parsed bytes stops.
+  static bool Unreadable(const unsigned char* at);
+  // A bit reader over `length` bytes from `at`, cut at the window's end.
+  static RavelCBitInputStream Reader(const unsigned char* at, int length);
   // The nearer of `end` and the open window's end (for the end of a loop).
   static const unsigned char* Clamp(const unsigned char* at, const unsigned char* end);
   // Field reads: zero beyond the window, big-endian like RavelRead16 and co.
