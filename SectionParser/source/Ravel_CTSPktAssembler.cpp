@@ -325,9 +325,9 @@ void RavelCTSPktStore::GetAssembleData(RavelCSectionData& out) {
   }
   // Every collected byte is copied (the last piece may run past the section
   // end); the entry counts only the section. The buffer is never shorter than
-  // the section, and bytes that no piece supplied are cleared.
-  int capacity = iCurBufSize > iSectionLen ? iCurBufSize : iSectionLen;
-  if (capacity < 1) capacity = 1;
+  // the section, and bytes that no piece supplied are cleared. Some byte was
+  // collected, so the buffer is never empty.
+  const int capacity = iCurBufSize > iSectionLen ? iCurBufSize : iSectionLen;
   unsigned char* buffer = static_cast<unsigned char*>(malloc(static_cast<size_t>(capacity)));
   int copied = 0;
   for (int i = 0; i < iPacketArray.iCount; ++i) {

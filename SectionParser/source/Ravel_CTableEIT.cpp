@@ -270,7 +270,7 @@ RavelCEIT::RavelCEIT(RavelCEIT& other)
 }
 
 RavelCEIT& RavelCEIT::operator=(RavelCEIT& other) {
-  if (aEventInfo.iCount > 0) aEventInfo.RemoveAll();
+  aEventInfo.RemoveAll();
   CopyHeader(other);
   iTransportStreamId = other.iTransportStreamId;
   iOriginalNetworkId = other.iOriginalNetworkId;
@@ -312,7 +312,7 @@ RavelCEIT& RavelCEIT::operator+=(RavelCEIT& other) {
 
 int RavelCEIT::ParseRawData(unsigned char* section) {
   RavelCReadWindow window(section);
-  if (aEventInfo.iCount > 0) aEventInfo.RemoveAll();
+  aEventInfo.RemoveAll();
   if (section == 0) {
     ClearFields();
     return kRavelErrInvalidArgument;
