@@ -159,6 +159,14 @@ TEST(TimeTablesParse, ConstructedOverNullOrAForeignSectionHoldsZeros) {
   }
 }
 
+// A TDT whose section_length ends inside its time: the bytes beyond it read as
+// zero, and nothing past the section's own bytes is touched.
+TEST(TimeTablesParse, TimeBeyondTheSectionLengthReadsAsZero) {
+  Bytes cut = {0x70, 0x70, 0x03, 0xE4, 0x89, 0x12};  // MJD 58505, hour 12; minutes and seconds lie beyond
+  RavelCTDT tdt(cut.data());
+  EXPECT_EQ((Ints{0x70, 0, 3, 2019, 1, 22, 12, 0, 0}), Fields(tdt));
+}
+
 TEST(TimeTablesName, BothSettersStoreTheNameAndReturnOne) {
   RavelCTDT tdt(nullptr);
   RavelCTOT tot(nullptr);

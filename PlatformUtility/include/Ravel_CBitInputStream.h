@@ -1,5 +1,6 @@
 // Most-significant-bit-first reader over a byte buffer. It never reads outside
 // the buffer: reads past the end return 0 bits and set the status byte to 1.
+// The parser asks for no more bits than a result holds (8, 16 or 32).
 #ifndef RAVEL_CBITINPUTSTREAM_H
 #define RAVEL_CBITINPUTSTREAM_H
 

@@ -8,7 +8,6 @@ RavelCBitInputStream::RavelCBitInputStream(const unsigned char* buffer, unsigned
 RavelCBitInputStream::~RavelCBitInputStream() {}
 
 unsigned int RavelCBitInputStream::ReadBits(int bitCount, unsigned char& status) {
-  if (bitCount > 32) bitCount = 32;
   unsigned int value = 0;
   const unsigned long long endBit = static_cast<unsigned long long>(iLength) * 8u;
   for (int i = 0; i < bitCount; ++i) {

@@ -23,7 +23,7 @@ class RavelCPktEntry {
   // Copies the piece out once: afterwards it is empty. Gives the count copied.
   int GetData(unsigned char* destination, int& count);
 
-  unsigned char aData[188];
+  unsigned char aData[188] = {};
   unsigned char iDataLen = 0;  // 0 to 188; 0 once consumed
 };
 

@@ -49,12 +49,9 @@ inline void EmitSection(const unsigned char* section, int size, RavelCSectionDat
 // ---------------------------------------------------------------------------
 // RavelCPktEntry
 
-RavelCPktEntry::RavelCPktEntry() { memset(aData, 0, sizeof(aData)); }
+RavelCPktEntry::RavelCPktEntry() {}
 
-RavelCPktEntry::RavelCPktEntry(const unsigned char* data, int len) {
-  if (len >= static_cast<int>(sizeof(aData)) + 1) memset(aData, 0, sizeof(aData));
-  SetData(data, len);
-}
+RavelCPktEntry::RavelCPktEntry(const unsigned char* data, int len) { SetData(data, len); }
 
 void RavelCPktEntry::SetData(const unsigned char* data, int len) {
   if (len >= static_cast<int>(sizeof(aData)) + 1) {
