@@ -252,6 +252,7 @@ TEST(EITEventDescriptors, ReparseReplacesAndFailureReleasesTheAudioList) {
   EXPECT_EQ(nullptr, event.pAudioComponentList);
   EXPECT_EQ(nullptr, event.pShortEventDescriptor);
   EXPECT_EQ(0, event.iEventId);
+  EXPECT_EQ(0, event.iDescriptorsLoopLength);
   EXPECT_EQ(Ints(9, 0), TimeOf(event.cStartTime));
   EXPECT_EQ(nullptr, event.GetAudioComponent(0));
   // Without a list the event still dumps and copies; a copy gets a list of its own.

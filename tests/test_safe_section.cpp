@@ -209,6 +209,10 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
   RavelSectionHeader header;
   ASSERT_TRUE(RavelCSafeSection::ReadHeader(Exactly(sdt, 10).get(), 10, header));
   EXPECT_EQ(0x0421u, header.iStreamIds);
+  // Bytes that end before the message id leave a carousel section unnamed.
+  const Bytes dii = Carousel(0x3B, GoodDii());
+  EXPECT_STREQ("DSM-CC other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 11)));
+  EXPECT_STREQ("DII", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 12)));
 }
 
 TEST(SafeSection, ParsesAsADirectParseWouldAndRefusesEveryTruncatedPrefix) {
