@@ -168,12 +168,15 @@ const char* const kKindNames[kRavelKindCount] = {
     "DSI", "DII", "DDB", "DSM-CC other", "stream descriptors", "other",
 };
 
-// The row of every table_id (-1 for none), made once from the rows: every
+// Where no row applies (a row index is tested with `< 0`).
+const int kNoRow = -1;
+
+// The row of every table_id (kNoRow for none), made once from the rows: every
 // section a receiver reads asks it several times.
 struct TableRowIndex {
   signed char aRow[256];
   TableRowIndex() {
-    for (int tableId = 0; tableId < 256; ++tableId) aRow[tableId] = -1;
+    for (int tableId = 0; tableId < 256; ++tableId) aRow[tableId] = kNoRow;
     for (int i = 0; i < kTableRowCount; ++i) {
       for (int tableId = kTableRows[i].iFirstTableId; tableId <= kTableRows[i].iLastTableId; ++tableId) {
         aRow[tableId] = static_cast<signed char>(i);
@@ -196,7 +199,7 @@ int FindMessageRow(unsigned short messageId) {
   for (int i = 0; i < kMessageRowCount; ++i) {
     if (kMessageRows[i].iMessageId == messageId) return i;
   }
-  return -1;
+  return kNoRow;
 }
 
 RavelSafeRefusal Accepted() {
@@ -209,7 +212,7 @@ RavelSafeRefusal Accepted() {
 const int RavelCSafeSection::kMaxSectionSize;
 
 RavelCSafeSection::RavelCSafeSection()
-    : cRefusal(Accepted()), iRow(-1) {}
+    : cRefusal(Accepted()), iRow(kNoRow) {}
 
 RavelCSafeSection::~RavelCSafeSection() {
   Clear();
@@ -225,7 +228,7 @@ void RavelCSafeSection::Clear() {
   pTOT = 0;
   delete pMessage;
   pMessage = 0;
-  iRow = -1;
+  iRow = kNoRow;
 }
 
 // The buffer is kept; the bytes of the last section are zeroed so that the bytes
@@ -258,7 +261,7 @@ void RavelCSafeSection::Keep(const unsigned char* bytes, int size) {
 RavelCTableBase* RavelCSafeSection::TakeTable() {
   RavelCTableBase* table = pTable;
   pTable = 0;
-  iRow = pMessage != 0 ? iRow : -1;
+  iRow = pMessage != 0 ? iRow : kNoRow;
   return table;
 }
 
@@ -277,7 +280,7 @@ RavelCTOT* RavelCSafeSection::TakeTOT() {
 RavelCDsmccBase* RavelCSafeSection::TakeMessage() {
   RavelCDsmccBase* message = pMessage;
   pMessage = 0;
-  iRow = pTable != 0 ? iRow : -1;
+  iRow = pTable != 0 ? iRow : kNoRow;
   return message;
 }
 

@@ -36,6 +36,9 @@ bool IsCaptionStream(unsigned char type) { return type == 0x06; }
 // it ends, and ends with 0 (or the count of one round) where it would not.
 const int kSelectionIndexRange = 256;
 
+// The index of a stream the selection does not find.
+const int kNoStream = -1;
+
 }  // namespace
 
 // ---------------------------------------------------------------------------
@@ -266,11 +269,11 @@ int RavelCPMT::CountStreams(bool (*matches)(unsigned char streamType)) {
 
 int RavelCPMT::FindStream(bool (*matches)(unsigned char streamType), int n) {
   const int found = CountStreams(matches);
-  if (found == 0) return -1;
+  if (found == 0) return kNoStream;
   if (n >= found) {
     // A short list ends without the n-th match; a long one comes round again
     // and goes on counting from the first match.
-    if (aMapInfoList.iCount < kSelectionIndexRange) return -1;
+    if (aMapInfoList.iCount < kSelectionIndexRange) return kNoStream;
     n %= found;
   }
   for (int i = 0; i < aMapInfoList.iCount; ++i) {
@@ -278,7 +281,7 @@ int RavelCPMT::FindStream(bool (*matches)(unsigned char streamType), int n) {
     if (n == 0) return i;
     --n;
   }
-  return -1;
+  return kNoStream;
 }
 
 unsigned short RavelCPMT::GetVideoPID() {
