@@ -102,6 +102,7 @@ TEST(PMTStreamSelection, PicksVideoAudioAndCaptionsByStreamTypeInTheFirst256Stre
   } cases[] = {
       {"video, two audios, captions", 4, {{0, 0x1B}, {1, 0x0F}, {2, 0x06}, {3, 0x0F}}, {0x1000, 0x1001, 0x1003, 0, 0x1002, 2}, 0},
       {"MPEG-1 audio and MPEG-4 video are not taken", 3, {{0, 0x03}, {1, 0x10}}, {0, 0, 0, 0, 0, 0}, 0},
+      {"captions first", 2, {{0, 0x06}, {1, 0x0F}}, {0, 0x1001, 0, 0, 0x1000, 1}, 0},
       {"MPEG-1 and MPEG-2 video, the first one wins", 3, {{0, 0x01}, {1, 0x02}, {2, 0x1B}}, {0x1000, 0, 0, 0, 0, 0}, 0},
       {"the three audio types are counted in list order", 5, {{0, 0x11}, {1, 0x04}, {2, 0x0F}, {3, 0x06}, {4, 0x06}},
        {0, 0x1000, 0x1001, 0x1002, 0x1003, 3}, 0},
