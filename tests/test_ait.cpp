@@ -239,6 +239,11 @@ TEST(AitParse, ReadsTheLoopLengthsOneAfterTheOther) {
   // A section shorter than the two loop lengths reads them as 0.
   RavelCAIT ait;
   Parsed(ait, Ait(Bytes{0xF0}), 0);
+  // A descriptor loop of one byte still takes a whole descriptor, whose length
+  // byte is the next application's first: that application is read a byte on.
+  RavelCAIT late;
+  Parsed(late, Ait(AitBody({App(1, 1, 1, 0xC, {Bytes{0x02}}), app2})), 2);
+  EXPECT_EQ(0x200u, At(late, 1).iOrganizationId);
 }
 
 TEST(AitParse, SecondSectionReplacesTheListInPlace) {

@@ -183,6 +183,7 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
       {Long(0x42, sb::Cat({sb::U16(0x0421), sb::U8(0xFF)})), "SDT", kRavelSafeOk, 0x0421, 0},
       {Long(0x4E, eitIds), "EIT p/f", kRavelSafeOk, 0x04210422, 0x18},
       {Long(0x46, sb::Cat({sb::U16(0x0421), sb::U8(0xFF)})), "SDT", kRavelSafeOk, 0x0421, 0},
+      {Long(0x41, sb::Cat({sb::Length12(0), sb::Length12(0)})), "NIT", kRavelSafeOk, 0, 0},
       {Long(0x4F, eitIds), "EIT p/f", kRavelSafeOk, 0x04210422, 0x18},
       {Long(0x60, eitIds), "EIT schedule", kRavelSafeOk, 0x04210422, 0x18},
       {Long(0x51, eitIds), "EIT schedule", kRavelSafeUnknownTable, 0x04210422, 0x18},
