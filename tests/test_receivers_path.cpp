@@ -12,6 +12,7 @@
 #include "Ravel_CDescriptorExtendedEvent.h"
 #include "Ravel_CDescriptorShortEvent.h"
 #include "Ravel_CDsmccDDB.h"
+#include "Ravel_CReadWindow.h"
 #include "Ravel_CTSPktAssembler.h"
 #include "Ravel_CTableEIT.h"
 #include "Ravel_CTableTOT.h"
@@ -66,6 +67,21 @@ std::string TextAt(const Bytes& section, const Bytes::const_iterator& at) {
 }
 
 }  // namespace
+
+// A section handed out under a size shorter than its header declares (a stale
+// size) gets a buffer of the declared length, so that its parse stays inside.
+TEST(ReceiversPath, SectionBuffersOwnTheLengthTheirHeaderDeclares) {
+  struct Case {
+    const char* what;
+    Bytes bytes;
+    int size, owned;
+  } cases[] = {
+      {/*what=*/"two bytes declare nothing", /*bytes=*/{0x42, 0xF0}, /*size=*/2, /*owned=*/2},
+      {"three bytes declaring 5 more", {0x42, 0xF0, 0x05}, 3, 8},
+      {"a size above the declared one stays", {0x42, 0xF0, 0x01, 0x00, 0x00, 0x00}, 6, 6},
+  };
+  for (const Case& c : cases) EXPECT_EQ(c.owned, RavelCReadWindow::OwnedSize(c.bytes.data(), c.size)) << c.what;
+}
 
 TEST(ReceiversPath, TotLoopLongerThanItsSectionStopsAtTheSectionEnd) {
   // No CRC_32 check protects the TOT: a loop length of 0xFFF in 14 bytes.
