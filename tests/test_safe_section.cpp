@@ -217,6 +217,7 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
   const Bytes dii = Carousel(0x3B, GoodDii());
   EXPECT_STREQ("DSM-CC other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 11)));
   EXPECT_STREQ("DII", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 12)));
+  EXPECT_STREQ("other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(nullptr, 12)));
 }
 
 TEST(SafeSection, ParsesAsADirectParseWouldAndRefusesEveryTruncatedPrefix) {

@@ -159,12 +159,24 @@ TEST(TimeTablesParse, ConstructedOverNullOrAForeignSectionHoldsZeros) {
   }
 }
 
-// A TDT whose section_length ends inside its time: the bytes beyond it read as
-// zero, and nothing past the section's own bytes is touched.
+// A TDT whose section_length ends inside its date or time reads the bytes
+// beyond it as zero, and touches nothing past the section's own bytes.
 TEST(TimeTablesParse, TimeBeyondTheSectionLengthReadsAsZero) {
-  Bytes cut = {0x70, 0x70, 0x03, 0xE4, 0x89, 0x12};  // MJD 58505, hour 12; minutes and seconds lie beyond
-  RavelCTDT tdt(cut.data());
-  EXPECT_EQ((Ints{0x70, 0, 3, 2019, 1, 22, 12, 0, 0}), Fields(tdt));
+  struct Case {
+    const char* what;
+    Bytes cut;     // exactly the bytes section_length covers
+    Bytes zeroed;  // the whole TDT, its missing bytes 0
+  } cases[] = {
+      {/*what=*/"minutes and seconds beyond", /*cut=*/{0x70, 0x70, 0x03, 0xE4, 0x89, 0x12},
+       /*zeroed=*/{0x70, 0x70, 0x05, 0xE4, 0x89, 0x12, 0x00, 0x00}},
+      {"the date's second byte beyond", {0x70, 0x70, 0x01, 0xE4}, {0x70, 0x70, 0x05, 0xE4, 0x00, 0x00, 0x00, 0x00}},
+  };
+  for (const Case& c : cases) {
+    RavelCTDT cut(const_cast<unsigned char*>(c.cut.data()));
+    RavelCTDT zeroed(const_cast<unsigned char*>(c.zeroed.data()));
+    EXPECT_EQ(DateOf(zeroed), DateOf(cut)) << c.what;
+    EXPECT_EQ(c.cut[2], cut.iSectionLength) << c.what;
+  }
 }
 
 TEST(TimeTablesName, BothSettersStoreTheNameAndReturnOne) {
