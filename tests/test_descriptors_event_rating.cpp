@@ -145,8 +145,11 @@ TEST(LocalTimeOffsetEntry, NullParseClearsEveryField) {
   EXPECT_EQ(kRavelErrInvalidArgument, entry.ParseRawData(nullptr));
   EXPECT_STREQ("", entry.GetCountryCode());
   EXPECT_EQ(std::vector<int>(6, 0), DateOf(entry.GetTimeOfChange()));
-  EXPECT_EQ(std::vector<int>(4, 0), (std::vector<int>{entry.GetCountryRegionId(), entry.GetLocalTimeOffsetPolarity(),
-                                                    entry.GetLocalTimeOffsetHour(), entry.GetNextTimeOffsetHour()}));
+  EXPECT_EQ(std::vector<int>(8, 0),
+            (std::vector<int>{entry.GetCountryRegionId(), entry.GetLocalTimeOffsetPolarity(),
+                              entry.GetLocalTimeOffsetHour(), entry.GetLocalTimeOffsetMinute(),
+                              entry.GetLocalTimeOffsetSecond(), entry.GetNextTimeOffsetHour(),
+                              entry.GetNextTimeOffsetMinute(), entry.GetNextTimeOffsetSecond()}));
 }
 
 // One byte past the whole entries starts one more, read from what follows.

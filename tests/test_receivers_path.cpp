@@ -83,6 +83,18 @@ TEST(ReceiversPath, SectionBuffersOwnTheLengthTheirHeaderDeclares) {
   for (const Case& c : cases) EXPECT_EQ(c.owned, RavelCReadWindow::OwnedSize(c.bytes.data(), c.size)) << c.what;
 }
 
+// A parse inside another's window (a message inside its section) may not read
+// further than the outer window, whatever its own header declares.
+TEST(ReceiversPath, AWindowOpenedInsideAnotherKeepsTheNearerEnd) {
+  const Bytes section = {0x42, 0xF0, 0x09, 1, 2, 3, 4, 5, 6, 7, 8, 9};  // declares all 12 bytes
+  RavelCReadWindow outer(section.data(), section.data() + 6);
+  {
+    RavelCReadWindow inner(section.data());
+    EXPECT_EQ(3, RavelCReadWindow::Readable(section.data() + 3, 9));
+  }
+  EXPECT_EQ(0, RavelCReadWindow::Readable(section.data() + 6, 1));
+}
+
 TEST(ReceiversPath, TotLoopLongerThanItsSectionStopsAtTheSectionEnd) {
   // No CRC_32 check protects the TOT: a loop length of 0xFFF in 14 bytes.
   Bytes section =

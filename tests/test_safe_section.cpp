@@ -288,6 +288,8 @@ TEST(SafeSection, ChecksEveryPartOfADsmccMessageBeforeItsParse) {
       {"DII with more modules than records", shortRecords, kRavelSafeOutsideMessage},
       {"DII module info past the end", longInfo, kRavelSafeOutsideMessage},
       {"DII private data past the end", Message(0x1002, DiiBody(0, {}, 3, {1, 2})), kRavelSafeOutsideMessage},
+      {"DII with a two-byte compatibility descriptor", Message(0x1002, sb::Cat({DiiBody(0, {}, 0, {}, 2), sb::U16(0)})),
+       kRavelSafeOk},
       {"DII compatibility descriptor past the end", Message(0x1002, DiiBody(0, {}, 0, {}, 9)), kRavelSafeOutsideMessage},
       {"DII cut in its download parameters", Message(0x1002, Bytes(17, 0x00)), kRavelSafeOutsideMessage},
       {"DDB", Message(0x1003, DdbBody({1, 2, 3})), kRavelSafeOk},
