@@ -218,6 +218,7 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
   EXPECT_STREQ("DSM-CC other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 11)));
   EXPECT_STREQ("DII", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 12)));
   EXPECT_STREQ("other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(nullptr, 12)));
+  EXPECT_FALSE(RavelCSafeSection::ReadHeader(nullptr, 12, header));
 }
 
 TEST(SafeSection, ParsesAsADirectParseWouldAndRefusesEveryTruncatedPrefix) {
