@@ -224,6 +224,12 @@ TEST(LogoTransmissionDescriptor, DecodesEachTransmissionType) {
     EXPECT_EQ(c.body[0] == 3 ? static_cast<int>(c.body.size()) - 1 : 0, d.GetLogoCharactersLength());
     EXPECT_EQ(Dump(c.lines), BodyLines(d));
   }
+  // Length 0: the type is the byte after the descriptor, and type 3 then holds no characters.
+  Bytes empty = Cat({Descriptor(0xCF, Bytes()), Bytes{0x03}});
+  RavelCLogoTransmissionDescriptor d(empty.data());
+  EXPECT_EQ(3, d.GetLogoTransmissionType());
+  EXPECT_STREQ("", d.GetLogoCharacters());
+  EXPECT_EQ(0, d.GetLogoCharactersLength());
 }
 
 TEST(LogoTransmissionDescriptor, CopiesTheCharactersUpToTheirFirstZeroByte) {

@@ -420,7 +420,9 @@ TEST(DsmccDII, DumpsCopiesDeeplyAndParsesAgainFromScratch) {
 
   RavelCModuleInfo empty(nullptr);
   EXPECT_EQ(At(kCarouselError, {"Module Info Parsing Error. Input Data is NULL!\n"}), recorder.Lines());
-  EXPECT_EQ(0, empty.GetModuleId());
+  EXPECT_EQ((std::vector<unsigned int>{0, 0, 0, 0}), (std::vector<unsigned int>{empty.GetModuleId(), empty.GetModuleSize(),
+                                                                             empty.GetModuleVersion(),
+                                                                             empty.GetModuleInfoLength()}));
   EXPECT_EQ(nullptr, empty.GetNameDescriptor());
 }
 

@@ -98,6 +98,7 @@ TEST(CString, OwnsAndCopiesItsText) {
   a = b;
   EXPECT_STREQ("SDT", a.GetString());
   EXPECT_EQ(0, RavelPGL_StrCaseCompare("GingaAZ", "gINGAaz"));
+  EXPECT_EQ(0, RavelPGL_StrCaseCompare("gINGAaz", "GingaAZ"));
   EXPECT_LT(RavelPGL_StrCaseCompare("a", "B"), 0);
 }
 
@@ -138,6 +139,18 @@ TEST(TraceSink, FormatsOnlyForListenersAndPassesLocation) {
   std::string bufferSized(1024, 'b');  // one more than the local buffer holds with its NUL
   RavelPGL_TraceOut(0x10000020u, "%s", bufferSized.c_str());
   EXPECT_EQ(bufferSized, recorder.Records()[2].text);
+}
+
+TEST(TraceSink, WithoutAListenerOnlyEnabledLevelsReachStandardError) {
+  const unsigned int levels = RavelPGL_GetTraceMask();
+  RavelPGL_SetTraceMask(0x80000000u);
+  gszRavelDbgFilePath = "SectionParser/source/Ravel_CTablePAT";
+  gRavelDbgLineNum = 42;
+  testing::internal::CaptureStderr();
+  EXPECT_EQ(0, RavelPGL_TraceOut(0x10000020u, "dump\n"));
+  EXPECT_EQ(6, RavelPGL_TraceOut(0x80000020u, "error\n"));
+  EXPECT_EQ("[80000020] SectionParser/source/Ravel_CTablePAT:42: error\n", testing::internal::GetCapturedStderr());
+  RavelPGL_SetTraceMask(levels);
 }
 
 struct Item {

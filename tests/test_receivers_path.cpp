@@ -95,6 +95,19 @@ TEST(ReceiversPath, AWindowOpenedInsideAnotherKeepsTheNearerEnd) {
   EXPECT_EQ(0, RavelCReadWindow::Readable(section.data() + 6, 1));
 }
 
+// The store's buffer goes on after a section with what followed it; a field cut
+// by the section end reads zeros for its missing bytes, not those.
+TEST(ReceiversPath, AFieldCutByTheSectionEndReadsZerosForItsMissingBytes) {
+  // A carousel section whose section_length (11) ends halfway through the
+  // message's transactionId (bytes 12 to 15).
+  const Bytes buffer = {0x3C, 0xB0, 0x0B, 0x00, 0x07, 0xC1, 0x00, 0x00, 0x11, 0x03, 0x10, 0x03,
+                        0xAA, 0xBB, 0xCC, 0xDD, 0xFF, 0x00, 0x00, 0x20};
+  TraceRecorder quiet;
+  RavelCDsmccBase header(MessageOf(const_cast<unsigned char*>(buffer.data())));
+  EXPECT_EQ(0xAABB0000u, header.GetTransactionId());
+  EXPECT_EQ(0, header.GetMessageLength());
+}
+
 TEST(ReceiversPath, TotLoopLongerThanItsSectionStopsAtTheSectionEnd) {
   // No CRC_32 check protects the TOT: a loop length of 0xFFF in 14 bytes.
   Bytes section =
