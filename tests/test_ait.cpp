@@ -244,6 +244,10 @@ TEST(AitParse, ReadsTheLoopLengthsOneAfterTheOther) {
   RavelCAIT late;
   Parsed(late, Ait(AitBody({App(1, 1, 1, 0xC, {Bytes{0x02}}), app2})), 2);
   EXPECT_EQ(0x200u, At(late, 1).iOrganizationId);
+  // An application loop of one byte still gives an application, read as zeros past that byte.
+  RavelCAIT single;
+  Parsed(single, Ait(AitBody({Bytes{0x00}})), 1);
+  EXPECT_EQ(0u, At(single, 0).iOrganizationId);
 }
 
 TEST(AitParse, SecondSectionReplacesTheListInPlace) {

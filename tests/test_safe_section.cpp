@@ -74,6 +74,13 @@ Bytes GoodDii() {
   return Message(0x1002, DiiBody(2, {descriptors, {}}, 0, {}));
 }
 
+// A DII without modules that ends right after numberOfModules.
+Bytes DiiWithoutPrivateDataLength() {
+  Bytes body = DiiBody(0, {}, 0, {});
+  body.resize(body.size() - 2);
+  return body;
+}
+
 // A carousel section around a message: table_id 0x3B or 0x3C, then the CRC_32.
 Bytes Carousel(uint8_t tableId, const Bytes& message) { return Long(tableId, message, 0x0007); }
 
@@ -329,6 +336,7 @@ TEST(SafeSection, RefusesEveryTruncatedMessageAndAMessageRunningIntoTheCrc) {
       const RavelSafeResult expected = count < 12 ? kRavelSafeTooShort : kRavelSafeLengthMismatch;
       ASSERT_EQ(expected, safe.ParseMessage(bytes.get(), static_cast<int>(count))) << count;
       ASSERT_EQ(expected, safe.ParseMessageInto(bytes.get(), static_cast<int>(count), ddb)) << count;
+      ASSERT_EQ(expected, RavelCSafeSection::CheckMessage(bytes.get(), static_cast<int>(count))) << count;
       EXPECT_TRUE(recorder.Records().empty()) << count;
     }
   }
@@ -394,6 +402,8 @@ TEST(SafeSection, TheStructureWalkRefusesLoopsPastTheirParentSayingWhere) {
        Long(0x51, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51), sb::U16(1), sb::UtcTime(2013, 5, 10, 1, 0, 0),
                            sb::U8(0), sb::U8(0), sb::U8(0), sb::U16(0x8000 | 60)})),
        kRavelSafeMalformed, "loop entry runs past its loop's end", 14},
+      {"DII ending after its module count", Carousel(0x3B, Message(0x1002, DiiWithoutPrivateDataLength())),
+       kRavelSafeOutsideMessage, "DII private data length cut", 40},
       {"EIT schedule without a class, well formed", Long(0x51, sb::Cat({sb::U16(1), sb::U16(1), sb::U8(0), sb::U8(0x51)})),
        kRavelSafeUnknownTable, "no class for this table_id", 0},
   };
