@@ -81,6 +81,11 @@ Bytes DiiWithoutPrivateDataLength() {
   return body;
 }
 
+// The name of the kind the safe layer tells from the first `count` bytes.
+const char* KindName(const unsigned char* bytes, int count) {
+  return RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(bytes, count));
+}
+
 // A carousel section around a message: table_id 0x3B or 0x3C, then the CRC_32.
 Bytes Carousel(uint8_t tableId, const Bytes& message) { return Long(tableId, message, 0x0007); }
 
@@ -206,7 +211,7 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
     SCOPED_TRACE(c.kind);
     std::unique_ptr<unsigned char[]> bytes = Exactly(c.section, c.section.size());
     const int count = static_cast<int>(c.section.size());
-    EXPECT_STREQ(c.kind, RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(bytes.get(), count)));
+    EXPECT_STREQ(c.kind, KindName(bytes.get(), count));
     RavelSectionHeader header;
     ASSERT_TRUE(RavelCSafeSection::ReadHeader(bytes.get(), count, header));
     EXPECT_EQ(c.streamIds, header.iStreamIds);
@@ -222,9 +227,9 @@ TEST(SafeSection, TellsEachKindOfSectionApartByItsHeader) {
   EXPECT_EQ(0x0421u, header.iStreamIds);
   // Bytes that end before the message id leave a carousel section unnamed.
   const Bytes dii = Carousel(0x3B, GoodDii());
-  EXPECT_STREQ("DSM-CC other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 11)));
-  EXPECT_STREQ("DII", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(dii.data(), 12)));
-  EXPECT_STREQ("other", RavelCSafeSection::GetKindName(RavelCSafeSection::GetKind(nullptr, 12)));
+  EXPECT_STREQ("DSM-CC other", KindName(dii.data(), 11));
+  EXPECT_STREQ("DII", KindName(dii.data(), 12));
+  EXPECT_STREQ("other", KindName(nullptr, 12));
   EXPECT_FALSE(RavelCSafeSection::ReadHeader(nullptr, 12, header));
 }
 

@@ -10,6 +10,9 @@ namespace {
 thread_local const unsigned char* tWindowBegin = 0;
 thread_local const unsigned char* tWindowEnd = 0;
 
+// Whether a window is open and holds the byte at `at`.
+bool WindowHolds(const unsigned char* at) { return tWindowBegin != 0 && at >= tWindowBegin && at < tWindowEnd; }
+
 const int kSectionHeaderBytes = 3;        // table_id to section_length
 const int kDsmccMessageOffset = 8;        // a DSM-CC message follows the long section header
 
@@ -28,8 +31,7 @@ RavelCReadWindow::RavelCReadWindow(const unsigned char* begin, const unsigned ch
 }
 
 void RavelCReadWindow::Open(const unsigned char* begin, const unsigned char* end) {
-  const bool nested = tWindowBegin != 0 && begin >= tWindowBegin && begin < tWindowEnd;
-  if (nested && end > tWindowEnd) end = tWindowEnd;
+  if (WindowHolds(begin) && end > tWindowEnd) end = tWindowEnd;
   tWindowBegin = begin;
   tWindowEnd = end;
 }
@@ -41,8 +43,7 @@ RavelCReadWindow::~RavelCReadWindow() {
 
 const unsigned char* RavelCReadWindow::SectionOfMessage(const unsigned char* message) {
   if (message == 0) return 0;
-  const bool heldAlone = tWindowBegin != 0 && message >= tWindowBegin && message < tWindowEnd &&
-                         message - tWindowBegin < kDsmccMessageOffset;
+  const bool heldAlone = WindowHolds(message) && message - tWindowBegin < kDsmccMessageOffset;
   return heldAlone ? 0 : message - kDsmccMessageOffset;
 }
 
@@ -55,14 +56,12 @@ int RavelCReadWindow::OwnedSize(const unsigned char* section, int size) {
 int RavelCReadWindow::Readable(const unsigned char* at, int wanted) {
   if (wanted <= 0) return 0;
   if (tWindowBegin == 0) return wanted;
-  if (at < tWindowBegin || at >= tWindowEnd) return 0;
+  if (!WindowHolds(at)) return 0;
   const long left = static_cast<long>(tWindowEnd - at);
   return left < wanted ? static_cast<int>(left) : wanted;
 }
 
-bool RavelCReadWindow::Unreadable(const unsigned char* at) {
-  return tWindowBegin != 0 && (at < tWindowBegin || at >= tWindowEnd);
-}
+bool RavelCReadWindow::Unreadable(const unsigned char* at) { return tWindowBegin != 0 && !WindowHolds(at); }
 
 RavelCBitInputStream RavelCReadWindow::Reader(const unsigned char* at, int length) {
   return RavelCBitInputStream(at, static_cast<unsigned int>(Readable(at, length)), 0);
@@ -70,7 +69,7 @@ RavelCBitInputStream RavelCReadWindow::Reader(const unsigned char* at, int lengt
 
 const unsigned char* RavelCReadWindow::Clamp(const unsigned char* at, const unsigned char* end) {
   if (tWindowBegin == 0) return end;
-  if (at < tWindowBegin || at >= tWindowEnd) return at;  // nothing of it is readable
+  if (!WindowHolds(at)) return at;  // nothing of it is readable
   return end > tWindowEnd ? tWindowEnd : end;
 }
 
