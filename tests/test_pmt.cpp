@@ -210,6 +210,7 @@ TEST(PMTProgramInfoLoop, FailsOnAMalformedDescriptorAndKeepsTheLastParentalRatin
     EXPECT_EQ(c.result == kRavelOk ? 2 : 0, pmt.GetMapInfoCount());
     EXPECT_EQ(c.minimumAge, RatingAge(pmt));
     EXPECT_EQ(c.result == kRavelOk ? 0x01FF : 0, pmt.GetPCRPID());
+    if (c.result != kRavelOk) { EXPECT_EQ(0, pmt.iProgramInfoLength); }
   }
 }
 
